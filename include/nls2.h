@@ -1,0 +1,194 @@
+/* nls2.h - the interface of libzelnls2: text in many languages and code pages.
+ *
+ * Conventions. They hold for every function unless its comment says otherwise.
+ *
+ *  1. Lengths. Byte strings are measured in bytes, UTF-16 text in 16-bit units; each comment says
+ *     which. Lengths are signed 32-bit unless typed otherwise. A terminator is not counted.
+ *  2. A length of -1 means that the text is null-terminated. The end of a byte string is then its
+ *     first zero byte, whatever the code page.
+ *  3. Code pages are numbers: CCSIDs (37, 819, 930, 1208 ...), and the private numbers from 57352
+ * up that NLS2_MapCodepageIdToName lists. They are not checked before ICU sees them.
+ *  4. Language ids are numbers: a country number in the upper 16 bits (ISO 3166 numeric, with
+ *     exceptions) and the library's language number in the lower 16. localeMap holds them all.
+ *  5. A status is a signed 32-bit word: 0 is success, a positive value a failure, a negative value
+ * a warning of ICU's and so a success. Values 32 and 36 to 39 are this library's (NLS2_ERR_*), all
+ *     others are ICU's UErrorCode, passed on unchanged; u_errorName() names those.
+ *  6. A status comes back in one of two ways: stored through a last argument pStatus, with a result
+ *     of 0 or null on failure; or as the result itself.
+ *  7. Outputs on failure are as they were, except where "partial output" is noted.
+ *  8. No pointer argument is tested for null. Null is undefined behaviour where not noted.
+ *  9. Buffers without a length argument, or with one that is "traced only", are written without a
+ *     bound: the comment says how much room is needed.
+ * 10. Handles that a function returns belong to the caller, who closes them as its comment says.
+ * 11. Threads. Every function may be called from any thread at any time. One object or handle must
+ *     not be used by two threads while one of them changes or closes it.
+ * 12. The library reads no environment and no configuration, and has no state but its list of live
+ *     locale objects. Every call is traced through the host's facility (trc1.h); tracing changes no
+ *     result where not noted.
+ */
+#ifndef NLS2_H
+#define NLS2_H
+
+#include <stdint.h>
+
+#include <unicode/utypes.h>
+
+#ifdef __cplusplus
+extern "C" {
+#endif
+
+#if defined(__GNUC__)
+#define NLS2_API __attribute__((visibility("default")))
+#else
+#define NLS2_API
+#endif
+
+struct UConverter; /* <unicode/ucnv.h> */
+
+/* ---- Status codes ---------------------------------------------------------------------------- */
+
+enum {
+  NLS2_ERR_NO_MEMORY = 32,         /* a heap allocation failed */
+  NLS2_ERR_INVALID_OPTION = 36,    /* an option set that names no action */
+  NLS2_ERR_INVALID_PARAMETER = 37, /* a bad argument, or a name or record not found */
+  NLS2_ERR_INVALID_LOCALE = 38,    /* no live locale object, or no locale record matches */
+  NLS2_ERR_LANGUAGE_NOT_FOUND = 39 /* a language id that localeMap does not hold */
+};
+
+/* ---- Locales --------------------------------------------------------------------------------- */
+
+/* One record of localeMap, 276 bytes. Names are null-terminated and padded with zero bytes. */
+typedef struct LocaleMapEntry {
+  uint32_t languageId;
+  uint32_t asciiCcsid;  /* default code page of the ASCII family */
+  uint32_t ebcdicCcsid; /* default EBCDIC code page */
+  char localeName[132]; /* as ICU spells it: "en_US", "zh_Hant" */
+  char shortName[132];  /* short POSIX name; equal to localeName in all but five records */
+} LocaleMapEntry;
+
+enum {
+  NLS2_LOCALE_MAP_RECORDS = 162, /* 161 locales and the terminator */
+  NLS2_LANGUAGE_ID_END = 0xFF    /* language id of the terminator, never a locale's */
+};
+
+/* The locales that the library knows. The order is part of the interface: every search runs from
+ * record 0 and takes the first match, and some ids and names stand in two records. */
+extern NLS2_API const LocaleMapEntry localeMap[NLS2_LOCALE_MAP_RECORDS];
+
+/* The first record of localeMap with this language id; null when there is none, also for 0xFF. */
+NLS2_API const LocaleMapEntry *NLS2_GetLocaleMapEntry(uint32_t languageId);
+
+/* ---- Code pages ------------------------------------------------------------------------------ */
+
+/* One record of ccsidMap, 136 bytes. The name is null-terminated and padded with zero bytes. */
+typedef struct CcsidMapEntry {
+  char name[132];
+  uint32_t ccsid;
+} CcsidMapEntry;
+
+enum {
+  NLS2_CCSID_MAP_RECORDS = 12, /* 11 names and the terminator */
+  NLS2_CCSID_MAP_END = 255     /* ccsid of the terminator */
+};
+
+/* Windows code-page names and their code pages, in the order in which they are searched. */
+extern NLS2_API const CcsidMapEntry ccsidMap[NLS2_CCSID_MAP_RECORDS];
+
+/* Opens ICU's converter for a code page. The caller closes it with ucnv_close().
+ *
+ * These numbers are opened by name (ucnv_open), every other as a CCSID (ucnv_openCCSID); T marks
+ * those for which *twoNullTerminator becomes 1, because their strings end in two zero bytes:
+ *
+ *     874 windows-874    57352 utf-8         57362 hz                57368 utf-16 T
+ *     932 shift-jis      57355 sbcs          57363 scsu              57369 utf-32
+ *     936 windows-936    57356 dbcs          57365 iscii,version=0   57370 cesu-8
+ *     949 windows-949    57357 mbcs          57366 utf-7             57371 gb18030
+ *     950 windows-950    57358 utf-16be T    57367 bocu1             57372 ucs-2
+ *    1200 utf-16be T     57359 utf-16le T
+ *    1208 utf-8          57360 utf-32be      57361 utf-32le
+ *
+ * Result: the converter, or null. *twoNullTerminator: 0 or 1, always stored, from the number alone.
+ * *status: always stored; 0; a warning of ICU's as it is (U_AMBIGUOUS_ALIAS_WARNING, -122, where a
+ * name means several tables); or ICU's failure, U_FILE_ACCESS_ERROR (4) for a number or name that
+ * this ICU has no converter for (57355 to 57357 with ICU's standard data, and 57364).
+ *
+ * Surprises: 57372 opens ICU's UTF-16 with a signature, and it, 57360, 57361 and 57369 leave the
+ * flag at 0 although their strings end in more than one zero byte. */
+NLS2_API struct UConverter *NLS2_MapCodepageIdToName(int32_t codepage, int32_t *twoNullTerminator,
+                                                     int32_t *status);
+
+/* The code page of a Windows code-page name.
+ *
+ * Result: the ccsid of the first record of ccsidMap whose name occurs anywhere in `name` (bytes,
+ * case and all), else 0. *status: 0, or NLS2_ERR_INVALID_PARAMETER when no record's name occurs in
+ * it.
+ *
+ * Surprises: "windows-9501" is found as windows-950; "big5" and "Windows-936" are not found. */
+NLS2_API uint32_t NLS2_MapWindowsNameToCCSID(const char *name, int32_t *status);
+
+/* ---- Conversion ------------------------------------------------------------------------------ */
+
+/* Options of NLS2_TranslateString. */
+enum {
+  NLS2_STRING_TERMINATE = 0x0008, /* end the output in a null, and count it */
+  NLS2_STRING_FILL = 0x0100,      /* pad with blanks to destLen */
+  NLS2_STRING_TRAILING = 0x0200,  /* restore the source's trailing blanks as far as they fit */
+  NLS2_STRING_STRIP_TRAILING =
+      0x4000 /* drop the source's trailing blanks; wins over the two above */
+};
+
+/* Translates a field from one code page to another and, on request, shapes the output as a field.
+ *
+ *   destCodePage, sourceCodePage  not 0
+ *   dest, destLen    output buffer and its size in bytes; 0 only with an empty source
+ *   source, sourceLen  input in bytes; negative: null-terminated
+ *   pSourceConsumed  receives the bytes consumed with options 0 or TERMINATE alone, else 0
+ *   options          0, or at least one of the bits above; other bits beside them are ignored
+ *
+ * Options 0 and TERMINATE alone translate the source as it is. The result is the number of bytes
+ * written, plus the terminator's (1; 2 for a page with a two-null terminator) where one was asked
+ * for by TERMINATE or by a sourceLen of exactly -1, and had room. An output that fills dest to the
+ * last byte is a success without a terminator. The terminator's second zero byte is stored without
+ * a look at destLen: a two-null page needs a buffer of destLen + 1 bytes.
+ *
+ * With any other option the trailing blanks (u_isblank: tabs and all space separators) and nulls
+ * are cut off, and so is everything from the first remaining null on; the rest, the text, must fit
+ * in destLen less the terminator's 1 or 2 bytes. Then, by the option: STRIP_TRAILING  The text
+ * alone. The result is its length in UTF-16 units, not bytes, plus 1 or 2 with TERMINATE, which
+ * however stores no null of its own (ICU stores one zero byte behind the text where there is room).
+ *   TRAILING        The text and as many U+0020 as the source had trailing blanks, as fit.
+ *   FILL            The text and U+0020 up to destLen; wins over TRAILING.
+ * TRAILING and FILL return destLen, whatever was written, and store the terminator at its end;
+ * bytes between a shorter output and that end are as they were. destLen is compared with counts of
+ * UTF-16 units there, which is right only while a blank is one byte. Into a page where it is not
+ * (1200, 57358 to 57361, 57368, 57369, 57372) FILL writes a wrong field with status 0: the two
+ * bytes 41 42
+ * ("AB") from 819 to 57359 with destLen 10 give 41 00 and nothing more, the second letter is lost.
+ * Strip into such a page, and append the blanks yourself.
+ *
+ * Result: the count told above; 0 on failure and for an empty source. *pStatus:
+ *   0   done, or sourceLen 0 (nothing is written); ICU's warnings count as 0
+ *   15  U_BUFFER_OVERFLOW_ERROR: dest is too small for the text; partial output with options 0 or
+ *       TERMINATE alone, and where blanks could not be made to fit
+ *   32  NLS2_ERR_NO_MEMORY: no work buffer of 2 * max(destLen, UTF-16 units of the source) + 2
+ * bytes 36  NLS2_ERR_INVALID_OPTION: TERMINATE with other bits, but none of the three paddings.
+ * This failure leaks the work buffer and two converters 37  NLS2_ERR_INVALID_PARAMETER: options
+ * without an accepted bit, destLen negative, destLen 0 with a source, or a code page 0 other  ICU's
+ * failure to open a converter (4: unknown page) or to convert; partial output Bytes that do not
+ * convert are no failure: ICU's default callbacks put the target page's substitution character for
+ * them. */
+NLS2_API int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t destLen,
+                                      int32_t sourceCodePage, const char *source, int32_t sourceLen,
+                                      int32_t *pSourceConsumed, uint32_t options, int32_t *pStatus);
+
+/* ---- Build stamp ----------------------------------------------------------------------------- */
+
+/* How the library was built: compiler and version, options, build host and date, one static line.
+ * A reproducible build (SOURCE_DATE_EPOCH set) names no host. */
+NLS2_API const char *NLS2_BuildStamp(void);
+
+#ifdef __cplusplus
+}
+#endif
+
+#endif

@@ -1,0 +1,236 @@
+// The padding path of NLS2_TranslateString: fields with their trailing blanks kept, filled or cut.
+
+#include "convert/translation.h"
+#include "trace/memory.h"
+
+#include <algorithm>
+#include <cstring>
+#include <unicode/uchar.h>
+#include <unicode/ustring.h>
+#include <unicode/utf16.h>
+
+namespace nls2::convert {
+
+namespace {
+
+constexpr UChar fillCharacter = 0x0020;
+
+// The source as UTF-16 and what the steps find out about it.
+struct Field {
+  trace::Block<UChar> units; // ends in a zero unit
+  int32_t sourceLength = 0;  // units of the whole source
+  int32_t textLength = 0;    // units up to the first null, trailing blanks cut off
+  int32_t trailingBlanks = 0;
+};
+
+bool isFailedPreflight(UErrorCode status) {
+  return status > U_ZERO_ERROR && status != U_BUFFER_OVERFLOW_ERROR;
+}
+
+// ICU takes -1 for a null-terminated text and refuses every other negative length.
+int32_t lengthForIcu(const Translation &call) { return std::max(call.sourceLen, -1); }
+
+bool measureSource(const Translation &call, Field &field) {
+  UErrorCode status = U_ZERO_ERROR;
+  field.sourceLength = ucnv_toUChars(call.sourceConverter.getAlias(), nullptr, 0, call.source,
+                                     lengthForIcu(call), &status);
+  if (isFailedPreflight(status)) {
+    NLS2_TRACE(call.frame, "Error pre-flighting source to UChars %d", status);
+    return call.fail(status);
+  }
+  return true;
+}
+
+// Room for the source and for a destination of one unit a byte, and a zero unit behind either.
+bool allocateUnits(const Translation &call, Field &field) {
+  NLS2_TRACE(call.frame, "Allocate memory to hold entire utf16 string.");
+  const auto units = static_cast<uint64_t>(std::max(call.destLen, field.sourceLength)) + 1;
+  field.units = trace::allocate<UChar>(call.frame, units * sizeof(UChar));
+  if (!field.units) {
+    NLS2_TRACE(call.frame, "Could not allocate memory.");
+    return call.fail(NLS2_ERR_NO_MEMORY);
+  }
+  std::memset(field.units.get(), 0, units * sizeof(UChar));
+  return true;
+}
+
+bool convertSource(const Translation &call, Field &field) {
+  NLS2_TRACE(call.frame, "Convert source to UChars.");
+  UErrorCode status = U_ZERO_ERROR;
+  ucnv_toUChars(call.sourceConverter.getAlias(), field.units.get(), field.sourceLength, call.source,
+                lengthForIcu(call), &status);
+  if (Translation::failed(status)) {
+    NLS2_TRACE(call.frame, "Error converting source to UChars %d.", status);
+    return call.fail(status);
+  }
+  return true;
+}
+
+// Clears the blanks and nulls at the end; nulls among them are not counted as blanks. A null that
+// is left cuts the text where it stands.
+void trim(const Translation &call, Field &field) {
+  UChar *units = field.units.get();
+  int32_t i = field.sourceLength;
+  while (i > 0) {
+    UChar32 character = 0;
+    U16_PREV(units, 0, i, character);
+    if (character != 0 && !u_isblank(character)) {
+      break;
+    }
+    units[i] = 0;
+    field.trailingBlanks += character != 0 ? 1 : 0;
+  }
+  NLS2_TRACE(call.frame, "There were %d trailing blanks in source string.", field.trailingBlanks);
+  field.textLength = u_strlen(units);
+  NLS2_TRACE(call.frame, "Resulting non-space filled string length is %d.", field.textLength);
+}
+
+// Sets destLen to what is left beside the terminator; the text must fit in it whatever the options.
+bool fitText(Translation &call, const Field &field) {
+  UErrorCode status = U_ZERO_ERROR;
+  const int32_t needed = ucnv_fromUChars(call.destConverter.getAlias(), nullptr, 0,
+                                         field.units.get(), field.textLength, &status);
+  if (isFailedPreflight(status)) {
+    NLS2_TRACE(call.frame, "Error pre-flighting temp buffer to destination cp %d.", status);
+    return call.fail(status);
+  }
+  if (call.has(NLS2_STRING_TERMINATE)) {
+    call.destLen -= call.terminatorLength();
+  }
+  if (needed > call.destLen) {
+    NLS2_TRACE(call.frame, "Destination buffer must be at least %d bytes in length.", needed);
+    return call.fail(U_BUFFER_OVERFLOW_ERROR);
+  }
+  return true;
+}
+
+// Writes the first `length` units into the destination; the result is the bytes that they take.
+int32_t writeUnits(const Translation &call, const Field &field, int32_t length,
+                   UErrorCode &status) {
+  status = U_ZERO_ERROR;
+  return ucnv_fromUChars(call.destConverter.getAlias(), call.dest, call.destLen, field.units.get(),
+                         length, &status);
+}
+
+void release(Translation &call, Field &field) {
+  field.units.reset();
+  call.closeConverters();
+}
+
+// The count is of units, not bytes, and may therefore be more than was written.
+int32_t writeStripped(Translation &call, Field &field) {
+  NLS2_TRACE(call.frame,
+             "STRIP TRAILING option is specified, convert string to destination codepage.");
+  UErrorCode status = U_ZERO_ERROR;
+  writeUnits(call, field, field.textLength, status);
+  release(call, field);
+  if (Translation::failed(status)) {
+    NLS2_TRACE(call.frame, "Error converting to destination %d.", status);
+    return call.fail(status);
+  }
+  return field.textLength + (call.has(NLS2_STRING_TERMINATE) ? call.terminatorLength() : 0);
+}
+
+// This path has always left its buffer and both converters behind, and callers' leak accounting
+// knows it: TERMINATE beside bits that mean nothing is a mistake to mend in the caller.
+int32_t refuseOptionAndLeak(Translation &call, Field &field) {
+  NLS2_TRACE(call.frame, "Invalid option specified.");
+  static_cast<void>(field.units.release());
+  call.sourceConverter.orphan();
+  call.destConverter.orphan();
+  return call.fail(NLS2_ERR_INVALID_OPTION);
+}
+
+// How many units the padded field has. It is set against destLen, a count of bytes: exact for a
+// page in which every unit of the field takes one byte.
+int32_t paddedLength(const Translation &call, const Field &field) {
+  NLS2_TRACE(call.frame, "Option is string file and or strip trailing.");
+  int32_t maximumBufferLength = 0;
+  if (call.has(NLS2_STRING_TRAILING)) {
+    NLS2_TRACE(call.frame, "NLS2_STRING_TRAILING set.");
+    maximumBufferLength = std::min(field.textLength + field.trailingBlanks, call.destLen);
+    NLS2_TRACE(call.frame, "maximumBufferLength is adjusted to %d.", maximumBufferLength);
+  }
+  if (call.has(NLS2_STRING_FILL)) {
+    NLS2_TRACE(call.frame, "NLS2_STRING_FILL set.");
+    maximumBufferLength = call.destLen;
+    NLS2_TRACE(call.frame, "maximumBufferLength is adjusted to %d.", maximumBufferLength);
+  }
+  return maximumBufferLength;
+}
+
+void appendBlanks(Field &field, int32_t maximumBufferLength) {
+  for (int32_t i = field.textLength; i < maximumBufferLength; ++i) {
+    field.units[i] = fillCharacter;
+  }
+}
+
+// Where text of several bytes a unit leaves too little room for all blanks, one more attempt drops
+// as many units as there are bytes too many: exact while a blank is one byte.
+bool writePadded(const Translation &call, const Field &field, int32_t maximumBufferLength) {
+  UErrorCode status = U_ZERO_ERROR;
+  const int32_t written = writeUnits(call, field, maximumBufferLength, status);
+  if (status == U_BUFFER_OVERFLOW_ERROR) {
+    NLS2_TRACE(call.frame, "Overflowed buffer because of blanks, possible problem.");
+    const int32_t excess = written - call.destLen;
+    NLS2_TRACE(call.frame, "Reduce amount to convert by %d.characters to fit", excess);
+    writeUnits(call, field, maximumBufferLength - excess, status);
+  }
+  if (Translation::failed(status)) {
+    NLS2_TRACE(call.frame, "Error converting from UChars to destination codepage %d.", status);
+    return call.fail(status);
+  }
+  return true;
+}
+
+int32_t storeTerminator(const Translation &call) {
+  int32_t amountWritten = call.destLen;
+  if (call.has(NLS2_STRING_TERMINATE)) {
+    for (int32_t i = 0; i < call.terminatorLength(); ++i) {
+      call.dest[amountWritten++] = 0;
+    }
+  }
+  return amountWritten;
+}
+
+int32_t writeField(Translation &call, Field &field) {
+  const int32_t maximumBufferLength = paddedLength(call, field);
+  appendBlanks(field, maximumBufferLength);
+  if (!writePadded(call, field, maximumBufferLength)) {
+    return 0;
+  }
+  release(call, field);
+  return storeTerminator(call);
+}
+
+} // namespace
+
+int32_t translateWithPadding(Translation &call) {
+  NLS2_TRACE(call.frame, "Converting with options %X.", call.options);
+  const int32_t bufferLength = call.destLen;
+  Field field;
+  if (!measureSource(call, field) || !allocateUnits(call, field) || !convertSource(call, field)) {
+    return 0;
+  }
+  trim(call, field);
+  if (!fitText(call, field)) {
+    return 0;
+  }
+  int32_t amountWritten = 0;
+  if (call.has(NLS2_STRING_STRIP_TRAILING)) {
+    amountWritten = writeStripped(call, field);
+  } else if (call.has(NLS2_STRING_FILL | NLS2_STRING_TRAILING)) {
+    amountWritten = writeField(call, field);
+  } else {
+    amountWritten = refuseOptionAndLeak(call, field);
+  }
+  if (*call.pStatus != U_ZERO_ERROR) {
+    return 0;
+  }
+  NLS2_TRACE(call.frame, "Output parameters. destLen %d,amountWritten %d", call.destLen,
+             amountWritten);
+  call.frame.dump(call.dest, static_cast<uint32_t>(std::min(amountWritten, bufferLength)));
+  return amountWritten;
+}
+
+} // namespace nls2::convert

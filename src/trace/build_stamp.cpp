@@ -1,0 +1,9 @@
+// NLS2_BuildStamp: how the library was built.
+
+#include "nls2.h"
+
+const char *NLS2_BuildStamp() {
+  return
+#include "build_stamp.inc" // a string literal, written when the build is configured
+      ;
+}

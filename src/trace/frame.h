@@ -1,0 +1,102 @@
+// The trace frame that every function of the library runs in.
+#pragma once
+
+#include "trc1.h"
+
+#include <cstddef>
+#include <cstdint>
+
+namespace nls2::trace {
+
+// One unit block and one sync word serve the whole library.
+extern TRC1_UnitBlock unit;
+extern uint32_t syncWord;
+
+// The anchor of the function that opens on the calling line; keep it in a static constinit
+// variable.
+template <std::size_t Size>
+consteval TRC1_EntryBlock anchorOf(const char (&name)[Size],
+                                   uint32_t attributes = TRC1_ENTRY_EXPORTED,
+                                   uint32_t line = __builtin_LINE()) {
+  return {&unit, name, static_cast<uint32_t>(Size - 1), line, &syncWord, attributes, 0, 0, {0, 0}};
+}
+
+// What an event or a `%X` carries of a pointer.
+inline uint32_t low32(const void *pointer) {
+  return static_cast<uint32_t>(reinterpret_cast<std::uintptr_t>(pointer));
+}
+
+inline uint32_t exitValue(const void *pointer) { return low32(pointer); }
+inline uint32_t exitValue(uint32_t value) { return value; }
+inline uint32_t exitValue(int32_t value) { return static_cast<uint32_t>(value); }
+
+// One call of one function: the entry event, the flags that hold for the whole call, and exactly
+// one exit event. The exit event is emitted by the destructor, so it follows the release of
+// everything that was declared after the frame.
+class Frame {
+public:
+  explicit Frame(TRC1_EntryBlock &anchor) : anchor_(anchor), flags_(currentFlags(anchor)) {
+    if (events()) [[unlikely]] {
+      TRC1_Event(&anchor_, anchor_.entryLine, TRC1_EVENT_ENTRY);
+    }
+  }
+  ~Frame() {
+    if (events()) [[unlikely]] {
+      leave();
+    }
+  }
+  Frame(const Frame &) = delete;
+  Frame &operator=(const Frame &) = delete;
+
+  // The exit event will carry this value; without a call of `result` it carries none.
+  template <class Value>
+  Value result(Value value, uint32_t line = __builtin_LINE()) {
+    if (events()) [[unlikely]] {
+      exitKind_ = TRC1_EVENT_EXIT_VALUE;
+      exitValue_ = exitValue(value);
+      exitLine_ = line;
+    }
+    return value;
+  }
+
+  bool detail() const { return (flags_ & TRC1_FLAG_DETAIL) != 0; }
+  TRC1_EntryBlock *anchor() const { return &anchor_; }
+
+  // A detail line that takes no arguments and stands in a table.
+  void line(const char *text, uint32_t line = __builtin_LINE()) const;
+  void dump(const void *address, uint32_t length, uint32_t line = __builtin_LINE()) const {
+    if (detail()) [[unlikely]] {
+      TRC1_Dump(&anchor_, line, address, length, 0);
+    }
+  }
+
+private:
+  // The anchor's cached words and the sync word are shared by all threads and written by the host.
+  static uint32_t currentFlags(TRC1_EntryBlock &anchor) {
+    uint32_t *sync = __atomic_load_n(&anchor.sync, __ATOMIC_RELAXED);
+    if (__atomic_load_n(sync, __ATOMIC_RELAXED) ==
+        __atomic_load_n(&anchor.cachedSync, __ATOMIC_RELAXED)) [[likely]] {
+      return __atomic_load_n(&anchor.cachedFlags, __ATOMIC_RELAXED);
+    }
+    return TRC1_Sync(&anchor);
+  }
+  bool events() const { return (flags_ & TRC1_FLAG_EVENTS) != 0; }
+  void leave() const;
+
+  TRC1_EntryBlock &anchor_;
+  const uint32_t flags_;
+  uint32_t exitKind_ = TRC1_EVENT_EXIT;
+  uint32_t exitValue_ = 0;
+  uint32_t exitLine_ = anchor_.entryLine;
+};
+
+} // namespace nls2::trace
+
+// One detail line. A macro, so that the compiler checks the arguments against the format and
+// computes none of them while detail tracing is off.
+#define NLS2_TRACE(frame, format, ...)                                                             \
+  do {                                                                                             \
+    if ((frame).detail()) [[unlikely]] {                                                           \
+      TRC1_Printf((frame).anchor(), __LINE__, format "\n" __VA_OPT__(, ) __VA_ARGS__);             \
+    }                                                                                              \
+  } while (false)

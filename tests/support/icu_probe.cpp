@@ -1,0 +1,81 @@
+// The probe on ICU's converters.
+
+#include "support/icu_probe.h"
+
+#include "support/recording_host.h"
+
+#include <atomic>
+#include <dlfcn.h>
+#include <unicode/ucnv.h>
+
+namespace {
+
+std::atomic<int> opened{0};
+std::atomic<int> closed{0};
+std::atomic<bool> marking{false};
+std::atomic<int> failure{U_ZERO_ERROR};
+
+template <class Function>
+Function next(Function /*type*/, const char *name) {
+  return reinterpret_cast<Function>(dlsym(RTLD_NEXT, name));
+}
+
+// ICU's exported names carry its version.
+#define TEXT_OF(symbol) #symbol
+#define NAME_OF(symbol) TEXT_OF(symbol)
+#define NEXT(function) next(&function, NAME_OF(function))
+
+bool refuse(UErrorCode *error) {
+  if (failure == U_ZERO_ERROR) {
+    return false;
+  }
+  *error = static_cast<UErrorCode>(failure.load());
+  return true;
+}
+
+UConverter *count(UConverter *converter) {
+  if (converter != nullptr) {
+    ++opened;
+    if (marking) {
+      support::mark("+ucnv");
+    }
+  }
+  return converter;
+}
+
+} // namespace
+
+namespace support {
+
+int openConverters() { return opened - closed; }
+int closedConverters() { return closed; }
+
+ConverterMarks::ConverterMarks() { marking = true; }
+ConverterMarks::~ConverterMarks() { marking = false; }
+
+FailingOpens::FailingOpens(UErrorCode error) { failure = error; }
+FailingOpens::~FailingOpens() { failure = U_ZERO_ERROR; }
+
+} // namespace support
+
+extern "C" UConverter *ucnv_open(const char *name, UErrorCode *error) {
+  static const auto original = NEXT(ucnv_open);
+  return refuse(error) ? nullptr : count(original(name, error));
+}
+
+extern "C" UConverter *ucnv_openCCSID(int32_t ccsid, UConverterPlatform platform,
+                                      UErrorCode *error) {
+  static const auto original = NEXT(ucnv_openCCSID);
+  return refuse(error) ? nullptr : count(original(ccsid, platform, error));
+}
+
+extern "C" void ucnv_close(UConverter *converter) {
+  static const auto original = NEXT(ucnv_close);
+  if (converter != nullptr) {
+    ++closed;
+    if (marking) {
+      support::mark("-ucnv");
+    }
+  }
+  original(converter);
+}

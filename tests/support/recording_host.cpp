@@ -1,0 +1,157 @@
+// The recording host.
+
+#include "support/recording_host.h"
+
+#include "sys1.h"
+#include "trc1.h"
+
+#include <atomic>
+#include <cstdarg>
+#include <cstdio>
+#include <mutex>
+
+namespace {
+
+std::mutex recordMutex;
+std::vector<std::string> recorded;
+bool recording = false;
+
+// Every change of the flags changes this word, which anchors are pointed at by their first sync.
+std::atomic<uint32_t> currentFlags{0};
+uint32_t hostSync = 2;
+
+std::mutex listMutex;
+std::atomic<unsigned> lockCallCount{0};
+std::atomic<bool> held{false};
+
+std::string nameOf(const TRC1_EntryBlock *anchor) {
+  return {anchor->functionName, anchor->functionNameLength};
+}
+
+void setFlags(uint32_t flags) {
+  currentFlags = flags;
+  __atomic_add_fetch(&hostSync, 1, __ATOMIC_RELAXED);
+}
+
+} // namespace
+
+namespace support {
+
+Recording::Recording(TraceFlags flags) {
+  const std::lock_guard<std::mutex> guard(recordMutex);
+  recorded.clear();
+  recording = true;
+  setFlags(flags);
+}
+
+Recording::~Recording() {
+  const std::lock_guard<std::mutex> guard(recordMutex);
+  recording = false;
+  setFlags(traceOff);
+}
+
+std::vector<std::string> Recording::lines() const {
+  const std::lock_guard<std::mutex> guard(recordMutex);
+  return recorded;
+}
+
+std::vector<std::string> Recording::details(const std::string &function) const {
+  std::vector<std::string> texts;
+  for (const std::string &line : lines()) {
+    if (line.rfind(function + ": ", 0) == 0) {
+      texts.push_back(line.substr(function.size() + 2));
+    }
+  }
+  return texts;
+}
+
+void mark(const std::string &line) {
+  const std::lock_guard<std::mutex> guard(recordMutex);
+  if (recording) {
+    recorded.push_back(line);
+  }
+}
+
+uint32_t low32(const void *pointer) {
+  return static_cast<uint32_t>(reinterpret_cast<uintptr_t>(pointer));
+}
+
+std::string hex(const void *pointer) {
+  char text[9];
+  std::snprintf(text, sizeof text, "%X", low32(pointer));
+  return text;
+}
+
+std::string exitValue(const void *pointer) {
+  return std::to_string(static_cast<int32_t>(low32(pointer)));
+}
+
+unsigned lockCalls() { return lockCallCount; }
+bool lockHeld() { return held; }
+
+} // namespace support
+
+uint32_t TRC1_Sync(TRC1_EntryBlock *anchor) {
+  __atomic_store_n(&anchor->sync, &hostSync, __ATOMIC_RELAXED);
+  const uint32_t sync = __atomic_load_n(&hostSync, __ATOMIC_RELAXED);
+  const uint32_t flags = currentFlags;
+  __atomic_store_n(&anchor->cachedFlags, flags, __ATOMIC_RELAXED);
+  __atomic_store_n(&anchor->cachedSync, sync, __ATOMIC_RELAXED);
+  return flags;
+}
+
+void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t /*line*/, uint32_t kind, ...) {
+  std::string text = nameOf(anchor) + (kind == TRC1_EVENT_ENTRY ? "> entry" : "=");
+  if (kind == TRC1_EVENT_EXIT_VALUE) {
+    va_list arguments;
+    va_start(arguments, kind);
+    text += " " + std::to_string(static_cast<int32_t>(va_arg(arguments, uint32_t)));
+    va_end(arguments);
+  }
+  support::mark(text);
+}
+
+void TRC1_Printf(TRC1_EntryBlock *anchor, uint32_t /*line*/, const char *format, ...) {
+  va_list arguments;
+  va_start(arguments, format);
+  va_list again;
+  va_copy(again, arguments);
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wformat-nonliteral"
+  std::string text(static_cast<size_t>(std::vsnprintf(nullptr, 0, format, again)) + 1, '\0');
+  std::vsnprintf(text.data(), text.size(), format, arguments);
+#pragma GCC diagnostic pop
+  va_end(again);
+  va_end(arguments);
+  text.pop_back();
+  if (text.empty() || text.back() != '\n') {
+    text += "(no newline)\n";
+  }
+  text.pop_back();
+  support::mark(nameOf(anchor) + ": " + text);
+}
+
+void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t /*line*/, const void *address, uint32_t length,
+               uint32_t zero) {
+  std::string text = nameOf(anchor) + "#";
+  for (uint32_t i = 0; i < length; ++i) {
+    char digits[4];
+    std::snprintf(digits, sizeof digits, " %02X", static_cast<const unsigned char *>(address)[i]);
+    text += digits;
+  }
+  support::mark(zero == 0 ? text : text + " (last argument not 0)");
+}
+
+void SYS1_GetLock(void *lock) {
+  listMutex.lock();
+  ++lockCallCount;
+  held = true;
+  support::mark("lock " + support::hex(lock));
+}
+
+void SYS1_ReleaseLock(void *lock) {
+  held = false;
+  ++lockCallCount;
+  support::mark("unlock " + support::hex(lock));
+  listMutex.unlock();
+}

@@ -1,0 +1,49 @@
+// A host of the library's that records what it is asked. Linking it into a program replaces the
+// default host, since the program's own definitions win.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace support {
+
+enum TraceFlags : uint32_t {
+  traceOff = 0,
+  traceDetail = 0x10,
+  traceEvents = 0x40,
+  traceAll = 0x50
+};
+
+// Sets the flags that the library's functions see from here on and collects what they trace, until
+// it goes out of scope; outside of every Recording tracing is off. One at a time.
+//
+// A line is one trace call, written as
+//   NLS2_Name> entry            NLS2_Name= 37        NLS2_Name=
+//   NLS2_Name: detail text      NLS2_Name# C1 C2     (a dump)
+// with exit values as signed numbers. Marks of other probes stand between, in their order in time.
+class Recording {
+public:
+  explicit Recording(TraceFlags flags);
+  ~Recording();
+  Recording(const Recording &) = delete;
+  Recording &operator=(const Recording &) = delete;
+
+  std::vector<std::string> lines() const;
+  // The lines of one function, its name and the sign cut off for detail lines: "detail text".
+  std::vector<std::string> details(const std::string &function) const;
+};
+
+// Adds a line to the recording that is open, if any; for probes that watch ICU or the heap.
+void mark(const std::string &line);
+
+// How a pointer prints under "%X" and what an exit event carries of it.
+uint32_t low32(const void *pointer);
+std::string hex(const void *pointer);
+std::string exitValue(const void *pointer);
+
+// Calls of the lock service since the program began; `lockHeld` is true between a pair of them.
+unsigned lockCalls();
+bool lockHeld();
+
+} // namespace support
