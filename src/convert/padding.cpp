@@ -1,6 +1,6 @@
 // The padding path of NLS2_TranslateString: fields with their trailing blanks kept, filled or cut.
 
-#include "convert/translation.h"
+#include "convert/padding.h"
 #include "trace/memory.h"
 
 #include <algorithm>
@@ -17,50 +17,52 @@ constexpr UChar fillCharacter = 0x0020;
 
 // The source as UTF-16 and what the steps find out about it.
 struct Field {
-  trace::Block<UChar> units; // ends in a zero unit
-  int32_t sourceLength = 0;  // units of the whole source
-  int32_t textLength = 0;    // units up to the first null, trailing blanks cut off
+  nls2::trace::Block<UChar> units; // ends in a zero unit
+  int32_t sourceLength = 0;        // units of the whole source
+  int32_t textLength = 0;          // units up to the first null, trailing blanks cut off
   int32_t trailingBlanks = 0;
 };
 
+bool failed(UErrorCode status) { return status > U_ZERO_ERROR; }
+
 bool isFailedPreflight(UErrorCode status) {
-  return status > U_ZERO_ERROR && status != U_BUFFER_OVERFLOW_ERROR;
+  return failed(status) && status != U_BUFFER_OVERFLOW_ERROR;
 }
 
 // ICU takes -1 for a null-terminated text and refuses every other negative length.
-int32_t lengthForIcu(const Translation &call) { return std::max(call.sourceLen, -1); }
+int32_t lengthForIcu(const PaddedTranslation &call) { return std::max(call.buffers.sourceLen, -1); }
 
-bool measureSource(const Translation &call, Field &field) {
+bool measureSource(const PaddedTranslation &call, Field &field) {
   UErrorCode status = U_ZERO_ERROR;
-  field.sourceLength = ucnv_toUChars(call.sourceConverter.getAlias(), nullptr, 0, call.source,
-                                     lengthForIcu(call), &status);
+  field.sourceLength = ucnv_toUChars(call.sourceConverter.getAlias(), nullptr, 0,
+                                     call.buffers.source, lengthForIcu(call), &status);
   if (isFailedPreflight(status)) {
-    NLS2_TRACE(call.frame, "Error pre-flighting source to UChars %d", status);
+    NLS2_TRACE(call.trace, "Error pre-flighting source to UChars %d", status);
     return call.fail(status);
   }
   return true;
 }
 
 // Room for the source and for a destination of one unit a byte, and a zero unit behind either.
-bool allocateUnits(const Translation &call, Field &field) {
-  NLS2_TRACE(call.frame, "Allocate memory to hold entire utf16 string.");
-  const auto units = static_cast<uint64_t>(std::max(call.destLen, field.sourceLength)) + 1;
-  field.units = trace::allocate<UChar>(call.frame, units * sizeof(UChar));
+bool allocateUnits(const PaddedTranslation &call, Field &field) {
+  NLS2_TRACE(call.trace, "Allocate memory to hold entire utf16 string.");
+  const auto units = static_cast<uint64_t>(std::max(call.buffers.destLen, field.sourceLength)) + 1;
+  field.units = nls2::trace::allocate<UChar>(call.trace, units * sizeof(UChar));
   if (!field.units) {
-    NLS2_TRACE(call.frame, "Could not allocate memory.");
+    NLS2_TRACE(call.trace, "Could not allocate memory.");
     return call.fail(NLS2_ERR_NO_MEMORY);
   }
   std::memset(field.units.get(), 0, units * sizeof(UChar));
   return true;
 }
 
-bool convertSource(const Translation &call, Field &field) {
-  NLS2_TRACE(call.frame, "Convert source to UChars.");
+bool convertSource(const PaddedTranslation &call, Field &field) {
+  NLS2_TRACE(call.trace, "Convert source to UChars.");
   UErrorCode status = U_ZERO_ERROR;
-  ucnv_toUChars(call.sourceConverter.getAlias(), field.units.get(), field.sourceLength, call.source,
-                lengthForIcu(call), &status);
-  if (Translation::failed(status)) {
-    NLS2_TRACE(call.frame, "Error converting source to UChars %d.", status);
+  ucnv_toUChars(call.sourceConverter.getAlias(), field.units.get(), field.sourceLength,
+                call.buffers.source, lengthForIcu(call), &status);
+  if (failed(status)) {
+    NLS2_TRACE(call.trace, "Error converting source to UChars %d.", status);
     return call.fail(status);
   }
   return true;
@@ -68,7 +70,7 @@ bool convertSource(const Translation &call, Field &field) {
 
 // Clears the blanks and nulls at the end; nulls among them are not counted as blanks. A null that
 // is left cuts the text where it stands.
-void trim(const Translation &call, Field &field) {
+void trim(const PaddedTranslation &call, Field &field) {
   UChar *units = field.units.get();
   int32_t i = field.sourceLength;
   while (i > 0) {
@@ -80,52 +82,52 @@ void trim(const Translation &call, Field &field) {
     units[i] = 0;
     field.trailingBlanks += character != 0 ? 1 : 0;
   }
-  NLS2_TRACE(call.frame, "There were %d trailing blanks in source string.", field.trailingBlanks);
+  NLS2_TRACE(call.trace, "There were %d trailing blanks in source string.", field.trailingBlanks);
   field.textLength = u_strlen(units);
-  NLS2_TRACE(call.frame, "Resulting non-space filled string length is %d.", field.textLength);
+  NLS2_TRACE(call.trace, "Resulting non-space filled string length is %d.", field.textLength);
 }
 
 // Sets destLen to what is left beside the terminator; the text must fit in it whatever the options.
-bool fitText(Translation &call, const Field &field) {
+bool fitText(PaddedTranslation &call, const Field &field) {
   UErrorCode status = U_ZERO_ERROR;
   const int32_t needed = ucnv_fromUChars(call.destConverter.getAlias(), nullptr, 0,
                                          field.units.get(), field.textLength, &status);
   if (isFailedPreflight(status)) {
-    NLS2_TRACE(call.frame, "Error pre-flighting temp buffer to destination cp %d.", status);
+    NLS2_TRACE(call.trace, "Error pre-flighting temp buffer to destination cp %d.", status);
     return call.fail(status);
   }
   if (call.has(NLS2_STRING_TERMINATE)) {
-    call.destLen -= call.terminatorLength();
+    call.buffers.destLen -= call.terminatorLength();
   }
-  if (needed > call.destLen) {
-    NLS2_TRACE(call.frame, "Destination buffer must be at least %d bytes in length.", needed);
+  if (needed > call.buffers.destLen) {
+    NLS2_TRACE(call.trace, "Destination buffer must be at least %d bytes in length.", needed);
     return call.fail(U_BUFFER_OVERFLOW_ERROR);
   }
   return true;
 }
 
 // Writes the first `length` units into the destination; the result is the bytes that they take.
-int32_t writeUnits(const Translation &call, const Field &field, int32_t length,
+int32_t writeUnits(const PaddedTranslation &call, const Field &field, int32_t length,
                    UErrorCode &status) {
   status = U_ZERO_ERROR;
-  return ucnv_fromUChars(call.destConverter.getAlias(), call.dest, call.destLen, field.units.get(),
-                         length, &status);
+  return ucnv_fromUChars(call.destConverter.getAlias(), call.buffers.dest, call.buffers.destLen,
+                         field.units.get(), length, &status);
 }
 
-void release(Translation &call, Field &field) {
+void release(PaddedTranslation &call, Field &field) {
   field.units.reset();
   call.closeConverters();
 }
 
 // The count is of units, not bytes, and may therefore be more than was written.
-int32_t writeStripped(Translation &call, Field &field) {
-  NLS2_TRACE(call.frame,
+int32_t writeStripped(PaddedTranslation &call, Field &field) {
+  NLS2_TRACE(call.trace,
              "STRIP TRAILING option is specified, convert string to destination codepage.");
   UErrorCode status = U_ZERO_ERROR;
   writeUnits(call, field, field.textLength, status);
   release(call, field);
-  if (Translation::failed(status)) {
-    NLS2_TRACE(call.frame, "Error converting to destination %d.", status);
+  if (failed(status)) {
+    NLS2_TRACE(call.trace, "Error converting to destination %d.", status);
     return call.fail(status);
   }
   return field.textLength + (call.has(NLS2_STRING_TERMINATE) ? call.terminatorLength() : 0);
@@ -133,8 +135,8 @@ int32_t writeStripped(Translation &call, Field &field) {
 
 // This path has always left its buffer and both converters behind, and callers' leak accounting
 // knows it: TERMINATE beside bits that mean nothing is a mistake to mend in the caller.
-int32_t refuseOptionAndLeak(Translation &call, Field &field) {
-  NLS2_TRACE(call.frame, "Invalid option specified.");
+int32_t refuseOptionAndLeak(PaddedTranslation &call, Field &field) {
+  NLS2_TRACE(call.trace, "Invalid option specified.");
   static_cast<void>(field.units.release());
   call.sourceConverter.orphan();
   call.destConverter.orphan();
@@ -143,18 +145,18 @@ int32_t refuseOptionAndLeak(Translation &call, Field &field) {
 
 // How many units the padded field has. It is set against destLen, a count of bytes: exact for a
 // page in which every unit of the field takes one byte.
-int32_t paddedLength(const Translation &call, const Field &field) {
-  NLS2_TRACE(call.frame, "Option is string file and or strip trailing.");
+int32_t paddedLength(const PaddedTranslation &call, const Field &field) {
+  NLS2_TRACE(call.trace, "Option is string file and or strip trailing.");
   int32_t maximumBufferLength = 0;
   if (call.has(NLS2_STRING_TRAILING)) {
-    NLS2_TRACE(call.frame, "NLS2_STRING_TRAILING set.");
-    maximumBufferLength = std::min(field.textLength + field.trailingBlanks, call.destLen);
-    NLS2_TRACE(call.frame, "maximumBufferLength is adjusted to %d.", maximumBufferLength);
+    NLS2_TRACE(call.trace, "NLS2_STRING_TRAILING set.");
+    maximumBufferLength = std::min(field.textLength + field.trailingBlanks, call.buffers.destLen);
+    NLS2_TRACE(call.trace, "maximumBufferLength is adjusted to %d.", maximumBufferLength);
   }
   if (call.has(NLS2_STRING_FILL)) {
-    NLS2_TRACE(call.frame, "NLS2_STRING_FILL set.");
-    maximumBufferLength = call.destLen;
-    NLS2_TRACE(call.frame, "maximumBufferLength is adjusted to %d.", maximumBufferLength);
+    NLS2_TRACE(call.trace, "NLS2_STRING_FILL set.");
+    maximumBufferLength = call.buffers.destLen;
+    NLS2_TRACE(call.trace, "maximumBufferLength is adjusted to %d.", maximumBufferLength);
   }
   return maximumBufferLength;
 }
@@ -167,33 +169,33 @@ void appendBlanks(Field &field, int32_t maximumBufferLength) {
 
 // Where text of several bytes a unit leaves too little room for all blanks, one more attempt drops
 // as many units as there are bytes too many: exact while a blank is one byte.
-bool writePadded(const Translation &call, const Field &field, int32_t maximumBufferLength) {
+bool writePadded(const PaddedTranslation &call, const Field &field, int32_t maximumBufferLength) {
   UErrorCode status = U_ZERO_ERROR;
   const int32_t written = writeUnits(call, field, maximumBufferLength, status);
   if (status == U_BUFFER_OVERFLOW_ERROR) {
-    NLS2_TRACE(call.frame, "Overflowed buffer because of blanks, possible problem.");
-    const int32_t excess = written - call.destLen;
-    NLS2_TRACE(call.frame, "Reduce amount to convert by %d.characters to fit", excess);
+    NLS2_TRACE(call.trace, "Overflowed buffer because of blanks, possible problem.");
+    const int32_t excess = written - call.buffers.destLen;
+    NLS2_TRACE(call.trace, "Reduce amount to convert by %d.characters to fit", excess);
     writeUnits(call, field, maximumBufferLength - excess, status);
   }
-  if (Translation::failed(status)) {
-    NLS2_TRACE(call.frame, "Error converting from UChars to destination codepage %d.", status);
+  if (failed(status)) {
+    NLS2_TRACE(call.trace, "Error converting from UChars to destination codepage %d.", status);
     return call.fail(status);
   }
   return true;
 }
 
-int32_t storeTerminator(const Translation &call) {
-  int32_t amountWritten = call.destLen;
+int32_t storeTerminator(const PaddedTranslation &call) {
+  int32_t amountWritten = call.buffers.destLen;
   if (call.has(NLS2_STRING_TERMINATE)) {
     for (int32_t i = 0; i < call.terminatorLength(); ++i) {
-      call.dest[amountWritten++] = 0;
+      call.buffers.dest[amountWritten++] = 0;
     }
   }
   return amountWritten;
 }
 
-int32_t writeField(Translation &call, Field &field) {
+int32_t writeField(PaddedTranslation &call, Field &field) {
   const int32_t maximumBufferLength = paddedLength(call, field);
   appendBlanks(field, maximumBufferLength);
   if (!writePadded(call, field, maximumBufferLength)) {
@@ -205,9 +207,9 @@ int32_t writeField(Translation &call, Field &field) {
 
 } // namespace
 
-int32_t translateWithPadding(Translation &call) {
-  NLS2_TRACE(call.frame, "Converting with options %X.", call.options);
-  const int32_t bufferLength = call.destLen;
+int32_t translateWithPadding(PaddedTranslation &call) {
+  NLS2_TRACE(call.trace, "Converting with options %X.", call.options);
+  const int32_t bufferLength = call.buffers.destLen;
   Field field;
   if (!measureSource(call, field) || !allocateUnits(call, field) || !convertSource(call, field)) {
     return 0;
@@ -227,9 +229,9 @@ int32_t translateWithPadding(Translation &call) {
   if (*call.pStatus != U_ZERO_ERROR) {
     return 0;
   }
-  NLS2_TRACE(call.frame, "Output parameters. destLen %d,amountWritten %d", call.destLen,
+  NLS2_TRACE(call.trace, "Output parameters. destLen %d,amountWritten %d", call.buffers.destLen,
              amountWritten);
-  call.frame.dump(call.dest, static_cast<uint32_t>(std::min(amountWritten, bufferLength)));
+  call.trace.dump(call.buffers.dest, static_cast<uint32_t>(std::min(amountWritten, bufferLength)));
   return amountWritten;
 }
 

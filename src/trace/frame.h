@@ -30,19 +30,56 @@ inline uint32_t exitValue(const void *pointer) { return low32(pointer); }
 inline uint32_t exitValue(uint32_t value) { return value; }
 inline uint32_t exitValue(int32_t value) { return static_cast<uint32_t>(value); }
 
+// Where the detail lines of one call go, if anywhere. Two words, to be handed on by value: a frame
+// whose address nobody takes stays in registers.
+class Trace {
+public:
+  Trace(TRC1_EntryBlock &anchor, uint32_t flags) : anchor_(&anchor), flags_(flags) {}
+
+  bool detail() const { return (flags_ & TRC1_FLAG_DETAIL) != 0; }
+  TRC1_EntryBlock *anchor() const { return anchor_; }
+
+  // A detail line that takes no arguments and stands in a table.
+  void line(const char *text, uint32_t line = __builtin_LINE()) const {
+    if (detail()) [[unlikely]] {
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wformat-security"
+#pragma GCC diagnostic ignored "-Wformat-nonliteral"
+      TRC1_Printf(anchor_, line, text);
+#pragma GCC diagnostic pop
+    }
+  }
+  void dump(const void *address, uint32_t length, uint32_t line = __builtin_LINE()) const {
+    if (detail()) [[unlikely]] {
+      TRC1_Dump(anchor_, line, address, length, 0);
+    }
+  }
+
+protected:
+  bool events() const { return (flags_ & TRC1_FLAG_EVENTS) != 0; }
+
+private:
+  TRC1_EntryBlock *anchor_;
+  uint32_t flags_;
+};
+
 // One call of one function: the entry event, the flags that hold for the whole call, and exactly
 // one exit event. The exit event is emitted by the destructor, so it follows the release of
 // everything that was declared after the frame.
-class Frame {
+class Frame : public Trace {
 public:
-  explicit Frame(TRC1_EntryBlock &anchor) : anchor_(anchor), flags_(currentFlags(anchor)) {
+  explicit Frame(TRC1_EntryBlock &anchor) : Trace(anchor, currentFlags(anchor)) {
     if (events()) [[unlikely]] {
-      TRC1_Event(&anchor_, anchor_.entryLine, TRC1_EVENT_ENTRY);
+      TRC1_Event(&anchor, anchor.entryLine, TRC1_EVENT_ENTRY);
     }
   }
   ~Frame() {
     if (events()) [[unlikely]] {
-      leave();
+      if (exitKind_ == TRC1_EVENT_EXIT_VALUE) {
+        TRC1_Event(anchor(), exitLine_, TRC1_EVENT_EXIT_VALUE, exitValue_);
+      } else {
+        TRC1_Event(anchor(), anchor()->entryLine, TRC1_EVENT_EXIT);
+      }
     }
   }
   Frame(const Frame &) = delete;
@@ -51,23 +88,10 @@ public:
   // The exit event will carry this value; without a call of `result` it carries none.
   template <class Value>
   Value result(Value value, uint32_t line = __builtin_LINE()) {
-    if (events()) [[unlikely]] {
-      exitKind_ = TRC1_EVENT_EXIT_VALUE;
-      exitValue_ = exitValue(value);
-      exitLine_ = line;
-    }
+    exitKind_ = TRC1_EVENT_EXIT_VALUE;
+    exitValue_ = exitValue(value);
+    exitLine_ = line;
     return value;
-  }
-
-  bool detail() const { return (flags_ & TRC1_FLAG_DETAIL) != 0; }
-  TRC1_EntryBlock *anchor() const { return &anchor_; }
-
-  // A detail line that takes no arguments and stands in a table.
-  void line(const char *text, uint32_t line = __builtin_LINE()) const;
-  void dump(const void *address, uint32_t length, uint32_t line = __builtin_LINE()) const {
-    if (detail()) [[unlikely]] {
-      TRC1_Dump(&anchor_, line, address, length, 0);
-    }
   }
 
 private:
@@ -80,23 +104,19 @@ private:
     }
     return TRC1_Sync(&anchor);
   }
-  bool events() const { return (flags_ & TRC1_FLAG_EVENTS) != 0; }
-  void leave() const;
 
-  TRC1_EntryBlock &anchor_;
-  const uint32_t flags_;
   uint32_t exitKind_ = TRC1_EVENT_EXIT;
   uint32_t exitValue_ = 0;
-  uint32_t exitLine_ = anchor_.entryLine;
+  uint32_t exitLine_ = 0;
 };
 
 } // namespace nls2::trace
 
 // One detail line. A macro, so that the compiler checks the arguments against the format and
 // computes none of them while detail tracing is off.
-#define NLS2_TRACE(frame, format, ...)                                                             \
+#define NLS2_TRACE(trace, format, ...)                                                             \
   do {                                                                                             \
-    if ((frame).detail()) [[unlikely]] {                                                           \
-      TRC1_Printf((frame).anchor(), __LINE__, format "\n" __VA_OPT__(, ) __VA_ARGS__);             \
+    if ((trace).detail()) [[unlikely]] {                                                           \
+      TRC1_Printf((trace).anchor(), __LINE__, format "\n" __VA_OPT__(, ) __VA_ARGS__);             \
     }                                                                                              \
   } while (false)

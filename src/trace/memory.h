@@ -22,12 +22,12 @@ void *realloc_mem(TRC1_EntryBlock *caller, uint32_t line, void *old, uint32_t si
 
 // A new block of `bytes` bytes, not cleared; null also for a size that 32 bits cannot carry.
 template <class Unit>
-Block<Unit> allocate(const Frame &frame, uint64_t bytes, uint32_t line = __builtin_LINE()) {
+Block<Unit> allocate(Trace trace, uint64_t bytes, uint32_t line = __builtin_LINE()) {
   if (bytes > UINT32_MAX) {
     return nullptr;
   }
   return Block<Unit>(static_cast<Unit *>(
-      realloc_mem(frame.anchor(), line, nullptr, static_cast<uint32_t>(bytes))));
+      realloc_mem(trace.anchor(), line, nullptr, static_cast<uint32_t>(bytes))));
 }
 
 } // namespace nls2::trace

@@ -1,4 +1,4 @@
-// The trace unit block, the sync word and the cold half of the frame.
+// The trace unit block and the sync word.
 
 #include "trace/frame.h"
 
@@ -25,23 +25,5 @@ constinit TRC1_UnitBlock unit = {
 };
 
 constinit uint32_t syncWord = 1;
-
-void Frame::line(const char *text, uint32_t line) const {
-  if (detail()) {
-#pragma GCC diagnostic push
-#pragma GCC diagnostic ignored "-Wformat-security"
-#pragma GCC diagnostic ignored "-Wformat-nonliteral"
-    TRC1_Printf(&anchor_, line, text);
-#pragma GCC diagnostic pop
-  }
-}
-
-void Frame::leave() const {
-  if (exitKind_ == TRC1_EVENT_EXIT_VALUE) {
-    TRC1_Event(&anchor_, exitLine_, TRC1_EVENT_EXIT_VALUE, exitValue_);
-  } else {
-    TRC1_Event(&anchor_, exitLine_, TRC1_EVENT_EXIT);
-  }
-}
 
 } // namespace nls2::trace
