@@ -78,6 +78,134 @@ extern NLS2_API const LocaleMapEntry localeMap[NLS2_LOCALE_MAP_RECORDS];
 /* The first record of localeMap with this language id; null when there is none, also for 0xFF. */
 NLS2_API const LocaleMapEntry *NLS2_GetLocaleMapEntry(uint32_t languageId);
 
+/* A locale object: a language and a code page. Callers hold a pointer to it from the function that
+ * makes it to NLS2_ReleaseLocale; in between it is valid, which means: on the list of live objects.
+ * Every function that takes one refuses a pointer that is not on the list, without looking at it.
+ */
+typedef struct NLS2_Locale {
+  uint32_t languageId;       /* of a record of localeMap */
+  uint32_t codepage;         /* as given, not checked against anything */
+  char icuLocale[136];       /* null-terminated, at most 131 characters */
+  struct NLS2_Locale *pNext; /* the library's */
+} NLS2_Locale;
+
+/* The live objects in order of creation, linked by pNext; null when there is none. For debuggers:
+ * the list changes under LocaleObjectList_Lock, 28 bytes that belong to the host's lock service. */
+extern NLS2_API NLS2_Locale *pLocaleObjectList;
+extern NLS2_API uint32_t LocaleObjectList_Lock[7];
+
+/* A new object for the process's default locale and code page, as ICU reports them
+ * (uloc_getDefault, ucnv_getDefaultName). Null on failure. *pStatus: 0; NLS2_ERR_NO_MEMORY; or
+ * NLS2_initLocaleObject's. */
+NLS2_API NLS2_Locale *NLS2_allocateLocale(int32_t *pStatus);
+
+/* Fills a zeroed object from the process's defaults, as NLS2_allocateLocale does; the object need
+ * not be on the list. An empty default locale counts as "en_US"; the language id is that of the
+ * first record of localeMap whose name occurs anywhere in the default's base name
+ * (uloc_getBaseName). Without a default code page it is US EBCDIC (37).
+ *
+ * Status as the result: 0; NLS2_ERR_INVALID_PARAMETER when no record matches or ICU gives no base
+ * name (more than 132 characters); or that of NLS2_GetCodepageId for the default code page's name.
+ * The object is then partly filled.
+ *
+ * Surprises: a default locale that the table does not hold, such as "en" or "nb_NO", makes every
+ * creation of an object fail with NLS2_ERR_INVALID_PARAMETER. Short names match inside longer ones:
+ * the default locale "ses_ML" (Koyraboro Senni) is found as "es". */
+NLS2_API int32_t NLS2_initLocaleObject(NLS2_Locale *pLocale);
+
+/* Status as the result: 0 when the object is live, NLS2_ERR_INVALID_LOCALE otherwise, also for
+ * null. Any pointer will do; it is compared, not followed. Takes no lock. */
+NLS2_API int32_t NLS2_ValidateLocale(const NLS2_Locale *pLocale);
+
+/* Gives an object back. Status as the result: 0, or NLS2_ERR_INVALID_PARAMETER (not INVALID_LOCALE
+ * as elsewhere) when it is not live. Of two threads that release the same object at once one gets
+ * 0, the other either. Waits for validations that other threads are in the middle of. */
+NLS2_API int32_t NLS2_ReleaseLocale(NLS2_Locale *pNLS2_Locale);
+
+/* Starts ICU (u_init). Nothing here depends on it. ICU's status as the result. */
+NLS2_API int32_t NLS2_Init(void);
+
+/* Options: of NLS2_GetLocale and NLS2_ConvertNativeLocale, of NLS2_SetLocaleFromNative. */
+enum { NLS2_LOCALE_DEFAULT = 0x4, NLS2_THREAD_LOCALE = 0x1 };
+
+/* A new object for a language and a code page; for the process's defaults when both are 0.
+ *
+ *   languageId  of a record of localeMap, or 0
+ *   codepage    stored as it is, unchecked; 0: the process's default
+ *   options     0, or NLS2_LOCALE_DEFAULT (bit 0x2 does the same): the object keeps the defaults,
+ * though the table search must still succeed. Ignored when both numbers are 0
+ *
+ * The record that counts is the first with this id or with this code page in both its columns. Null
+ * on failure. *pStatus: 0; NLS2_ERR_INVALID_PARAMETER when there is no such record; or
+ * NLS2_allocateLocale's.
+ *
+ * Surprises: hr_HR is the one record with a code page in both columns, so code page 912 makes an
+ * hr_HR object for every language whose record stands behind hr_HR's, such as pl_PL. Since every
+ * object starts from the defaults, what fails NLS2_initLocaleObject fails this. */
+NLS2_API NLS2_Locale *NLS2_GetLocale(uint32_t languageId, uint32_t codepage, uint32_t options,
+                                     int32_t *pStatus);
+
+/* NLS2_GetLocale(0, 0, 0) without a status: null on failure. There is no locale of a thread's own;
+ * each call makes a new object. */
+NLS2_API NLS2_Locale *NLS2_GetThreadLocale(void);
+
+/* Selectors of NLS2_GetLocaleNumInfo and NLS2_SetLocaleNumInfo. */
+enum { NLS2_ATTRIBUTE_LANGUAGE_ID = 1, NLS2_ATTRIBUTE_CODEPAGE = 9 };
+
+/* A number of an object; 0 on failure. *pStatus: 0; NLS2_ERR_INVALID_LOCALE; or
+ * NLS2_ERR_INVALID_PARAMETER for a type that is no selector. */
+NLS2_API uint32_t NLS2_GetLocaleNumInfo(const NLS2_Locale *pLocale, uint32_t type,
+                                        int32_t *pStatus);
+
+/* Changes a number of an object. A new language id brings its record's locale name with it and
+ * leaves the code page; a new code page is not checked. A value of 255 changes nothing and is a
+ * success. `options` is traced only.
+ *
+ * Status as the result: 0, or NLS2_ERR_INVALID_LOCALE: the object is not live, localeMap does not
+ * hold the language id, or the attribute is no selector (which NLS2_GetLocaleNumInfo calls an
+ * INVALID_PARAMETER). */
+NLS2_API int32_t NLS2_SetLocaleNumInfo(NLS2_Locale *pLocaleToChange, uint32_t attribute,
+                                       uint32_t value, uint32_t options);
+
+/* An object's code page; 0 on failure. *pStatus: 0 or NLS2_ERR_INVALID_LOCALE. */
+NLS2_API uint32_t NLS2_GetLocaleCodepageId(const NLS2_Locale *pLocale, int32_t *pStatus);
+
+/* Tells whether a POSIX locale name, such as "en_US.UTF-8", is known: whether the name of a record
+ * of localeMap occurs anywhere in its first 131 characters. "C" stands for ICU's default locale.
+ *
+ * Status as the result: 0, or NLS2_ERR_INVALID_LOCALE when no record's name occurs. With
+ * NLS2_THREAD_LOCALE also NLS2_ERR_INVALID_LOCALE when no object can be made, and the status of
+ * NLS2_GetCodepageId for the process's default code page.
+ *
+ * Surprise: NLS2_THREAD_LOCALE applies the record and the default code page to a new object of
+ * NLS2_GetThreadLocale that nobody gets to know. It stays on the list for good. */
+NLS2_API int32_t NLS2_SetLocaleFromNative(const char *pPosixID, uint32_t options);
+
+/* NLS2_allocateLocale under another name. `pNativeLocale` is not read; `options` must have
+ * NLS2_LOCALE_DEFAULT. Null on failure. *pStatus: 0, or NLS2_ERR_INVALID_PARAMETER without that
+ * option.
+ *
+ * Surprise: where the object cannot be made, the result is null and *pStatus is 0. */
+NLS2_API NLS2_Locale *NLS2_ConvertNativeLocale(const void *pNativeLocale, uint32_t options,
+                                               int32_t *pStatus);
+
+/* ---- Names of languages ---------------------------------------------------------------------- */
+
+/* The ISO 639 code of a language id ("en"), as uloc_getLanguage writes it: cut and terminated by
+ * ICU's rules. bufferLength is in bytes. Status as the result: 0, also where only the terminator
+ * had no room; NLS2_ERR_LANGUAGE_NOT_FOUND; or ICU's, 15 for a buffer that is too small. */
+NLS2_API int32_t NLS2_GetLanguageName(uint32_t languageId, char *nameBuffer, int32_t bufferLength);
+
+/* The short POSIX name of a language id ("en_US"), from the first record that has it. bufferLength
+ * is traced only: 8 bytes hold every name. Status as the result: 0 or NLS2_ERR_LANGUAGE_NOT_FOUND.
+ */
+NLS2_API int32_t NLS2_GetShortPosixName(uint32_t languageId, char *nameBuffer,
+                                        int32_t bufferLength);
+
+/* The language id of the first record with this short POSIX name, case and all; 0 when there is
+ * none. *status: 0, or NLS2_ERR_INVALID_PARAMETER when there is none. */
+NLS2_API uint32_t NLS2_LanguageIDFromShortPosixName(const char *pShortPosixName, int32_t *status);
+
 /* ---- Code pages ------------------------------------------------------------------------------ */
 
 /* One record of ccsidMap, 136 bytes. The name is null-terminated and padded with zero bytes. */
@@ -125,6 +253,22 @@ NLS2_API struct UConverter *NLS2_MapCodepageIdToName(int32_t codepage, int32_t *
  *
  * Surprises: "windows-9501" is found as windows-950; "big5" and "Windows-936" are not found. */
 NLS2_API uint32_t NLS2_MapWindowsNameToCCSID(const char *name, int32_t *status);
+
+/* ICU's canonical name of a code page's converter: "UTF-8" for 1208. bufferLength is traced only:
+ * UCNV_MAX_CONVERTER_NAME_LENGTH (60) bytes hold every name. Status as the result: 0; that of
+ * NLS2_MapCodepageIdToName when it fails; ICU's when it gives no name, 2 (U_MISSING_RESOURCE_ERROR)
+ * where it has none.
+ *
+ * Surprise: with detail tracing on, the converter's CCSID is asked for too, and a failure of that
+ * is the result. */
+NLS2_API int32_t NLS2_GetCodepageName(int32_t codepageId, char *nameBuffer, uint32_t bufferLength);
+
+/* The CCSID of a converter name, by ICU's rules for names (aliases, any case, null for the
+ * process's default); 0 on failure. Where ICU has the converter but no CCSID for it,
+ * NLS2_MapWindowsNameToCCSID is asked. *status: 0; ICU's when the converter does not open (4 for a
+ * name it does not know); or NLS2_ERR_INVALID_PARAMETER where the converter has no number: that
+ * failure leaks a converter. */
+NLS2_API uint32_t NLS2_GetCodepageId(const char *codepageName, int32_t *status);
 
 /* ---- Conversion ------------------------------------------------------------------------------ */
 

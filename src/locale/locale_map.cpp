@@ -1,9 +1,12 @@
 // localeMap, the table of known locales, and NLS2_GetLocaleMapEntry.
 
+#include "locale/locale_map.h"
+
 #include "nls2.h"
 #include "trace/frame.h"
 
 #include <cstddef>
+#include <cstring>
 
 static_assert(sizeof(LocaleMapEntry) == 276);
 static_assert(offsetof(LocaleMapEntry, asciiCcsid) == 4);
@@ -192,17 +195,20 @@ constexpr LocaleMapEntry localeMap[NLS2_LOCALE_MAP_RECORDS] = {
 };
 // clang-format on
 
+const LocaleMapEntry *nls2::locale::findNameInside(const char *text) {
+  return findEntry(
+      [=](const LocaleMapEntry &entry) { return std::strstr(text, entry.localeName) != nullptr; });
+}
+
 const LocaleMapEntry *NLS2_GetLocaleMapEntry(uint32_t languageId) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_GetLocaleMapEntry");
   nls2::trace::Frame frame(anchor);
   NLS2_TRACE(frame, "Locate the language id in the table.");
-  for (const LocaleMapEntry *entry = localeMap; entry->languageId != NLS2_LANGUAGE_ID_END;
-       ++entry) {
-    if (entry->languageId == languageId) {
-      NLS2_TRACE(frame, "Language ID %d found in table.", languageId);
-      return frame.result(entry);
-    }
+  const LocaleMapEntry *entry = nls2::locale::findLanguage(languageId);
+  if (entry == nullptr) {
+    NLS2_TRACE(frame, "Language ID %d not found in table.", languageId);
+    return nullptr;
   }
-  NLS2_TRACE(frame, "Language ID %d not found in table.", languageId);
-  return nullptr;
+  NLS2_TRACE(frame, "Language ID %d found in table.", languageId);
+  return frame.result(entry);
 }

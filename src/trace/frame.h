@@ -26,6 +26,9 @@ inline uint32_t low32(const void *pointer) {
   return static_cast<uint32_t>(reinterpret_cast<std::uintptr_t>(pointer));
 }
 
+// A null text prints as "(null)" on every host.
+inline const char *text(const char *string) { return string != nullptr ? string : "(null)"; }
+
 inline uint32_t exitValue(const void *pointer) { return low32(pointer); }
 inline uint32_t exitValue(uint32_t value) { return value; }
 inline uint32_t exitValue(int32_t value) { return static_cast<uint32_t>(value); }

@@ -1,0 +1,133 @@
+// The registry of live locale objects, and the list's exported head and lock.
+
+#include "locale/registry.h"
+
+#include "locale/walkers.h"
+#include "sys1.h"
+
+#include <cstddef>
+#include <cstdlib>
+
+static_assert(sizeof(NLS2_Locale) == 144 + sizeof(void *));
+static_assert(offsetof(NLS2_Locale, codepage) == 4);
+static_assert(offsetof(NLS2_Locale, icuLocale) == 8);
+static_assert(offsetof(NLS2_Locale, pNext) == 144);
+static_assert(sizeof(LocaleObjectList_Lock) == SYS1_LOCK_SIZE);
+
+NLS2_Locale *pLocaleObjectList = nullptr;
+uint32_t LocaleObjectList_Lock[7] = {};
+
+namespace nls2::locale {
+
+namespace {
+
+// Links are read by walks that take no lock. Their order against the counts of walkers.h is what
+// makes a removal see every walk that can still see the removed object, hence sequential
+// consistency, which costs a load nothing on the machines that matter.
+NLS2_Locale *next(NLS2_Locale *const &link) { return __atomic_load_n(&link, __ATOMIC_SEQ_CST); }
+
+void set(NLS2_Locale *&link, NLS2_Locale *object) {
+  __atomic_store_n(&link, object, __ATOMIC_SEQ_CST);
+}
+
+class ListLock {
+public:
+  explicit ListLock(trace::Trace trace, const char *releaseLine)
+      : trace_(trace), releaseLine_(releaseLine) {
+    NLS2_TRACE(trace_, "Acquire lock on linked-list.");
+    SYS1_GetLock(&LocaleObjectList_Lock);
+  }
+  ~ListLock() {
+    trace_.line(releaseLine_);
+    SYS1_ReleaseLock(&LocaleObjectList_Lock);
+  }
+  ListLock(const ListLock &) = delete;
+  ListLock &operator=(const ListLock &) = delete;
+
+private:
+  trace::Trace trace_;
+  const char *releaseLine_;
+};
+
+// Where an object stands: `current` is the object, or null at the list's end.
+struct Position {
+  NLS2_Locale *previous;
+  NLS2_Locale *current;
+};
+
+Position locate(trace::Trace trace, NLS2_Locale *head, const NLS2_Locale *object) {
+  NLS2_TRACE(trace, "Locate %X on linked-list", trace::low32(object));
+  Position at{head, head};
+  while (at.current != nullptr && at.current != object) {
+    at.previous = at.current;
+    at.current = next(at.current->pNext);
+    NLS2_TRACE(trace, "Set the following: Previous %X,  Current %X,  Next %X.",
+               trace::low32(at.previous), trace::low32(at.current),
+               trace::low32(at.current != nullptr ? next(at.current->pNext) : nullptr));
+  }
+  return at;
+}
+
+// The removed object keeps its own link, for walks that stand on it.
+void unlink(trace::Trace trace, Position at) {
+  NLS2_Locale *following = next(at.current->pNext);
+  if (at.current == next(pLocaleObjectList)) {
+    NLS2_TRACE(trace, "Head of link-list.");
+    set(pLocaleObjectList, following);
+    return;
+  }
+  NLS2_TRACE(trace, "Is this the end of the linked-list?");
+  if (following != nullptr) {
+    NLS2_TRACE(trace, "No, Remove this locale from middle.");
+  } else {
+    NLS2_TRACE(trace, "Yes. Remove this locale from end.");
+  }
+  NLS2_TRACE(trace, "pPrevious->pNext = %X.", trace::low32(following));
+  set(at.previous->pNext, following);
+}
+
+} // namespace
+
+void append(trace::Trace trace, NLS2_Locale *object) {
+  NLS2_TRACE(trace, "Place locale object on linked list.");
+  const ListLock lock(trace, "Linked-list modification complete, release lock.\n");
+  NLS2_Locale *last = next(pLocaleObjectList);
+  if (last == nullptr) {
+    NLS2_TRACE(trace, "List is empty, add as first node.");
+    set(pLocaleObjectList, object);
+    return;
+  }
+  NLS2_TRACE(trace, "List has entries, Attach to end of list.");
+  while (NLS2_Locale *following = next(last->pNext)) {
+    last = following;
+  }
+  set(last->pNext, object);
+}
+
+void remove(trace::Trace trace, NLS2_Locale *object) {
+  const ListLock lock(trace, "Release lock on linked-list.\n");
+  NLS2_Locale *head = next(pLocaleObjectList);
+  if (head == nullptr) {
+    return;
+  }
+  NLS2_TRACE(trace, "Linked-list has entries");
+  const Position at = locate(trace, head, object);
+  if (at.current == nullptr) {
+    return;
+  }
+  unlink(trace, at);
+  NLS2_TRACE(trace, "Locale structure removed from list.");
+  waitForWalkers();
+  std::free(at.current);
+}
+
+bool contains(const NLS2_Locale *object) {
+  const Walk walk;
+  const NLS2_Locale *node = next(pLocaleObjectList);
+  while (node != nullptr && node != object) {
+    node = next(node->pNext);
+  }
+  return node != nullptr;
+}
+
+} // namespace nls2::locale
