@@ -325,6 +325,134 @@ NLS2_API int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t 
                                       int32_t sourceCodePage, const char *source, int32_t sourceLen,
                                       int32_t *pSourceConsumed, uint32_t options, int32_t *pStatus);
 
+/* What the six functions below share. pLocale is a live object, whose code page is the other end of
+ * the conversion. A length of -1 means null-terminated input. The result is the output's length,
+ * without the terminator that ICU adds where there is room; 0 on failure. *status: 0   done 38
+ * NLS2_ERR_INVALID_LOCALE 15  the output is too small; partial output. The length needed is not
+ * told other  ICU's failure: 4 for a code page that does not open Bytes or characters that do not
+ * convert are replaced by ICU's substitutes and are no failure. */
+
+/* Code page to UTF-8. sourceLength and targetLength in bytes. */
+NLS2_API int32_t NLS2_toUTF8(const NLS2_Locale *pLocale, const char *pSource, int32_t sourceLength,
+                             char *pTarget, int32_t targetLength, int32_t *status);
+
+/* UTF-8 to code page. Lengths in bytes.
+ *
+ * Surprises: the output comes before the input; *status is set on failure only, so preset it to 0.
+ */
+NLS2_API int32_t NLS2_fromUTF8(const NLS2_Locale *pLocale, char *pTarget, int32_t targetLength,
+                               const char *pSource, int32_t sourceLength, int32_t *status);
+
+/* Code page to UTF-16 in the machine's byte order. sourceLength in bytes, targetLength and the
+ * result in units. */
+NLS2_API int32_t NLS2_toUTF16(const NLS2_Locale *pLocale, const char *pSource, int32_t sourceLength,
+                              UChar *pTarget, int32_t targetLength, int32_t *status);
+
+/* UTF-16 in the machine's byte order to code page. sourceLength in units, targetLength and the
+ * result in bytes.
+ *
+ * Surprise: the output's capacity is the third argument and the input's length the fifth. */
+NLS2_API int32_t NLS2_fromUTF16(const NLS2_Locale *pLocale, const UChar *pSource,
+                                int32_t targetLength, char *pTarget, int32_t sourceLength,
+                                int32_t *status);
+
+/* Code page to UTF-8, in place. The number of the code page goes to ICU as a CCSID: the private
+ * numbers fail (4), and 874, 932, 936, 949 and 950 are other tables than NLS2_MapCodepageIdToName
+ * opens. dlen and slen in bytes, neither may be -1.
+ *
+ * Surprises: the output is written from src on, over the input, and may go on to dest + dlen. Only
+ * one layout works: src and dest are in one buffer, dest at or behind src, with dest + dlen its
+ * end, and no character grows, since output overtakes input otherwise. The result is the output's
+ * end minus the input's end, so -2 where two bytes fewer were written, and no length. Use
+ * NLS2_toUTF8. Other *status: 1 (U_ILLEGAL_ARGUMENT_ERROR) where dest + dlen lies before src. */
+NLS2_API int32_t NLS2_StringToUnicode(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
+                                      const char *src, int32_t slen, int32_t *status);
+
+/* UTF-8 to code page, in place. Like NLS2_StringToUnicode, but the other way. Use NLS2_fromUTF8. */
+NLS2_API int32_t NLS2_UnicodeToString(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
+                                      const char *src, int32_t slen, int32_t *status);
+
+/* ---- Lengths --------------------------------------------------------------------------------- */
+
+/* How many bytes of the destination's code page to reserve for a byte of the source's, from ICU's
+ * largest character sizes D and S (ucnv_getMaxCharSize): 1 for one and the same page, D where S
+ * divides D, else the least multiple of S above D. Never too small for a byte; usually too large.
+ * *pStatus: 0; NLS2_ERR_INVALID_LOCALE (result 0); or ICU's for a code page that does not open
+ * (result 1, not 0). */
+NLS2_API int32_t NLS2_ConversionRatio(const NLS2_Locale *pDestinationLocale,
+                                      const NLS2_Locale *pSourceLocale, int32_t *pStatus);
+
+/* The UTF-16 units of a null-terminated string in the object's code page, up to its first null
+ * character. `ignored` is not read. 0 on failure. The code page goes to ICU as a CCSID, so the
+ * private numbers fail. *pStatus: NLS2_ERR_INVALID_LOCALE; NLS2_ERR_NO_MEMORY; or ICU's. On success
+ * it is not set: preset it to 0. */
+NLS2_API int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t ignored,
+                             int32_t *pStatus);
+
+/* The bytes of a UTF-8 character, 1 to 4, told by its first byte alone, whatever the object's code
+ * page. A byte that is no lead byte counts 1, C0 and C1 count 2; what follows is neither read nor
+ * checked. *pStatus: 0 or NLS2_ERR_INVALID_LOCALE (result 0). */
+NLS2_API int32_t NLS2_ByteLength(const NLS2_Locale *pLocale, const char *pCharacter,
+                                 int32_t *pStatus);
+
+/* Reserved: always 0, nothing is read. */
+NLS2_API double NLS2_StringToDouble(const void *ignored1, const void *ignored2);
+
+/* ---- Comparison, search and case ------------------------------------------------------------- */
+
+/* Options of NLS2_Strcoll; they combine. */
+enum {
+  CHARBASED = 0x80,             /* count each string's bytes by its UTF-8 characters first */
+  SORT_IGNORETRAILING = 0x20000 /* trailing blanks (u_isblank) do not count */
+};
+
+/* Compares two strings in the object's code page by the rules of its language, at tertiary strength
+ * (case and accents count, punctuation too). Lengths are in bytes, signed 16-bit; -1 means
+ * null-terminated.
+ *
+ * Result: -1 when string 1 sorts first, 1 when string 2 does, 0 when they are equal, and 0 on every
+ * failure. *pStatus: 0; NLS2_ERR_INVALID_LOCALE; NLS2_ERR_NO_MEMORY; or ICU's, 1 for a length below
+ * -1.
+ *
+ * With CHARBASED a negative length means null-terminated, and a character that begins before a
+ * given length counts whole. Warnings: the walk believes lead bytes, whatever the code page; one
+ * just before the end of a string takes it past the terminator or the given length, so the bytes
+ * there must be readable. A walked length wraps at 16 bits: 32,768 bytes and more fail with status
+ * 1, or compare too little. */
+NLS2_API int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t String1Length,
+                              const char *pString2, int16_t String2Length, uint32_t options,
+                              int32_t *pStatus);
+
+/* Option of NLS2_Findstr. */
+enum { IGNORECASE = 0x40 /* lower-case both strings by the language's rules first */ };
+
+/* Whether string 2 occurs in string 1, both in the object's code page, unit for unit in UTF-16
+ * (u_strstr). Lengths in bytes. Both end at their first null character; an empty string 2 occurs
+ * everywhere.
+ *
+ * Result: 1 when it does, 0 when not, -1 on any failure: no live object, a code page that does not
+ * open, bad lengths, no memory.
+ *
+ * Surprises: with IGNORECASE a string that grows in lower case ("\u0130" outside Turkish) is a
+ * failure. A failure to measure or to store string 2 leaks a buffer. */
+NLS2_API int32_t NLS2_Findstr(const NLS2_Locale *pLocale, const char *pString1, int32_t len1,
+                              const char *pString2, int32_t len2, uint32_t options);
+
+/* Options of NLS2_MapString; exactly one. */
+enum { NLS2_MAP_FOLDCASE = 0x10, NLS2_MAP_UPPERCASE = 0x400, NLS2_MAP_LOWERCASE = 0x800 };
+
+/* Reserved for case mapping, and of no use for it: every text that is not empty ends with 15
+ * (U_BUFFER_OVERFLOW_ERROR) and an untouched dest, whatever the options. Only an empty src, which
+ * must be null-terminated (slen is traced only), is mapped, into two null characters of the code
+ * page.
+ *
+ * Result: the bytes written, or a status: 15; NLS2_ERR_INVALID_LOCALE; NLS2_ERR_NO_MEMORY; or
+ * ICU's, 4 for a code page that as a CCSID does not open, 15 where dlen is too small (partial
+ * output). Lengths and statuses share the numbers. On a 16-bit page any ASCII text is empty, for
+ * its first byte is zero. */
+NLS2_API int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
+                                const char *src, int32_t slen, uint32_t options);
+
 /* ---- Build stamp ----------------------------------------------------------------------------- */
 
 /* How the library was built: compiler and version, options, build host and date, one static line.

@@ -1,13 +1,14 @@
 // The padding path of NLS2_TranslateString: fields with their trailing blanks kept, filled or cut.
 
 #include "convert/padding.h"
+
+#include "codepage/utf16_text.h"
 #include "trace/memory.h"
 
 #include <algorithm>
 #include <cstring>
 #include <unicode/uchar.h>
 #include <unicode/ustring.h>
-#include <unicode/utf16.h>
 
 namespace nls2::convert {
 
@@ -72,16 +73,11 @@ bool convertSource(const PaddedTranslation &call, Field &field) {
 // is left cuts the text where it stands.
 void trim(const PaddedTranslation &call, Field &field) {
   UChar *units = field.units.get();
-  int32_t i = field.sourceLength;
-  while (i > 0) {
-    UChar32 character = 0;
-    U16_PREV(units, 0, i, character);
-    if (character != 0 && !u_isblank(character)) {
-      break;
-    }
-    units[i] = 0;
-    field.trailingBlanks += character != 0 ? 1 : 0;
-  }
+  codepage::clearTrailing(units, field.sourceLength, [&field](UChar32 character) {
+    const bool blank = u_isblank(character);
+    field.trailingBlanks += blank ? 1 : 0;
+    return blank || character == 0;
+  });
   NLS2_TRACE(call.trace, "There were %d trailing blanks in source string.", field.trailingBlanks);
   field.textLength = u_strlen(units);
   NLS2_TRACE(call.trace, "Resulting non-space filled string length is %d.", field.textLength);

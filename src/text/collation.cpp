@@ -1,0 +1,188 @@
+// NLS2_Strcoll: two strings compared by the rules of a language.
+
+#include "codepage/utf16_text.h"
+#include "nls2.h"
+#include "trace/bounded_text.h"
+#include "trace/frame.h"
+
+#include <cstring>
+#include <unicode/localpointer.h>
+#include <unicode/uchar.h>
+#include <unicode/ucnv.h>
+#include <unicode/ucol.h>
+#include <unicode/ustring.h>
+
+namespace {
+
+using icu::LocalUCollatorPointer;
+using icu::LocalUConverterPointer;
+using nls2::codepage::Utf16Text;
+using nls2::trace::BoundedText;
+using nls2::trace::Frame;
+using nls2::trace::Trace;
+
+// Which of the two strings a line speaks of.
+enum class Which { First, Second };
+
+// One more character of a walk: its size, asked for once for the step and once for the sum. Its
+// status is not looked at, since the object is known to be live.
+void walkOn(const NLS2_Locale *pLoc, const char *string, int64_t &offset, int32_t &sum) {
+  int32_t ignored = U_ZERO_ERROR;
+  const int32_t step = NLS2_ByteLength(pLoc, string + offset, &ignored);
+  sum += NLS2_ByteLength(pLoc, string + offset, &ignored);
+  offset += step;
+}
+
+// The byte length by whole characters: to the null where `given` is negative, else to the first
+// character that ends at or behind `given`. It wraps at 16 bits.
+template <Which which>
+int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, int16_t given) {
+  int64_t offset = 0;
+  int32_t sum = 0;
+  if (given < 0) {
+    if constexpr (which == Which::First) {
+      NLS2_TRACE(trace, "Determine length of string 1 by looking for null.");
+    } else {
+      NLS2_TRACE(trace, "Determine length of string 2 by looking for null.");
+    }
+    while (string[offset] != 0) {
+      walkOn(pLoc, string, offset, sum);
+    }
+    NLS2_TRACE(trace, "Cumulative byte length determined is %d.", static_cast<int16_t>(sum));
+  } else {
+    if constexpr (which == Which::First) {
+      NLS2_TRACE(trace, "String 1 is not null terminated, search for last character.");
+    } else {
+      NLS2_TRACE(trace, "String 2 is not null terminated, search for last character.");
+    }
+    while (offset < given) {
+      walkOn(pLoc, string, offset, sum);
+    }
+    NLS2_TRACE(trace, "Cumulative byte length determined to be %d.", static_cast<int16_t>(sum));
+  }
+  return static_cast<int16_t>(sum);
+}
+
+// Both passes, into a cleared block. Without room for string 2 the converter goes first, then
+// string 1.
+template <Which which>
+bool convertString(Trace trace, LocalUConverterPointer &converter, Utf16Text &text,
+                   const char *string, int16_t length, int32_t *pStatus) {
+  constexpr bool first = which == Which::First;
+  UErrorCode error = nls2::codepage::measure(text, converter.getAlias(), string, length);
+  if (error > U_ZERO_ERROR) {
+    if constexpr (first) {
+      NLS2_TRACE(trace, "Error pre-flighting String 1 to UChars %d", error);
+    } else {
+      NLS2_TRACE(trace, "Error pre-flighting String 2 to UChars");
+    }
+    *pStatus = error;
+    converter.adoptInstead(nullptr);
+    return false;
+  }
+  if (!nls2::codepage::allocate(text, trace)) {
+    NLS2_TRACE(trace, "Error allocating memory");
+    *pStatus = NLS2_ERR_NO_MEMORY;
+    converter.adoptInstead(nullptr);
+    return false;
+  }
+  std::memset(text.units.get(), 0, text.size());
+  error = nls2::codepage::convert(text, converter.getAlias(), string, length);
+  if (error > U_ZERO_ERROR) {
+    if constexpr (first) {
+      NLS2_TRACE(trace, "Error converting String 1 to UChars");
+    } else {
+      NLS2_TRACE(trace, "Error converting String 2 to UChars %d", error);
+    }
+    *pStatus = error;
+    return false;
+  }
+  return true;
+}
+
+// Blanks become nulls, which the collator ignores; its lengths stay.
+void trim(Utf16Text &text) {
+  UChar *units = text.units.get();
+  nls2::codepage::clearTrailing(units, u_strlen(units),
+                                [](UChar32 character) { return u_isblank(character) != 0; });
+}
+
+int32_t compare(Trace trace, const NLS2_Locale *pLoc, Utf16Text &text1, Utf16Text &text2,
+                uint32_t options, int32_t *pStatus) {
+  NLS2_TRACE(trace, "Preparing to open collator using locale %s", pLoc->icuLocale);
+  UErrorCode error = U_ZERO_ERROR;
+  const LocalUCollatorPointer collator(ucol_open(pLoc->icuLocale, &error));
+  if (error > U_ZERO_ERROR) {
+    NLS2_TRACE(trace, "Error %d opening collator for locale %s", error, pLoc->icuLocale);
+    *pStatus = error;
+    return 0;
+  }
+  NLS2_TRACE(trace, "Setting collation strength to UCOL_TERTIARY.");
+  ucol_setStrength(collator.getAlias(), UCOL_TERTIARY);
+  if ((options & SORT_IGNORETRAILING) != 0) {
+    NLS2_TRACE(trace, "SORT_IGNORETRAILING option specified.");
+    NLS2_TRACE(trace, "Remove trailing blanks from String 1 ");
+    trim(text1);
+    NLS2_TRACE(trace, "Remove trailing blanks from String 2.");
+    trim(text2);
+  }
+  NLS2_TRACE(trace, "Collation ready with dest1Cap %d and dest2Cap %d", text1.length, text2.length);
+  const UCollationResult order = ucol_strcoll(collator.getAlias(), text1.units.get(), text1.length,
+                                              text2.units.get(), text2.length);
+  NLS2_TRACE(trace, "Collator has processed the text buffers with results equal to %d.", order);
+  text1.units.reset();
+  text2.units.reset();
+  return order == UCOL_LESS ? -1 : order == UCOL_GREATER ? 1 : 0;
+}
+
+} // namespace
+
+int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t String1Length,
+                     const char *pString2, int16_t String2Length, uint32_t options,
+                     int32_t *pStatus) {
+  static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_Strcoll");
+  Frame frame(anchor);
+  NLS2_TRACE(frame,
+             "Input parameters: pLoc %X, pString1 %s, String1Length %d, pString2 %s, "
+             "String2Length %d, options %x.",
+             nls2::trace::low32(pLoc), BoundedText(pString1, String1Length).c_str(), String1Length,
+             BoundedText(pString2, String2Length).c_str(), String2Length, options);
+  *pStatus = U_ZERO_ERROR;
+  if ((options & SORT_IGNORETRAILING) != 0) {
+    NLS2_TRACE(frame, "SORT_IGNORETRAILING Option specified %X", options);
+  }
+  if ((options & CHARBASED) != 0) {
+    NLS2_TRACE(frame, "CHARBASED Option specified %X", options);
+  }
+  if (NLS2_ValidateLocale(pLoc) != U_ZERO_ERROR) {
+    NLS2_TRACE(frame, "Invalid locale.");
+    *pStatus = NLS2_ERR_INVALID_LOCALE;
+    return frame.result(0);
+  }
+  NLS2_TRACE(frame, "Acquire Converter for CodePage %d.", pLoc->codepage);
+  int32_t twoNull = 0;
+  int32_t status = U_ZERO_ERROR;
+  LocalUConverterPointer converter(
+      NLS2_MapCodepageIdToName(static_cast<int32_t>(pLoc->codepage), &twoNull, &status));
+  if (status > U_ZERO_ERROR) {
+    NLS2_TRACE(frame, "Error %d acquiring Converter.", status);
+    *pStatus = status;
+    return frame.result(0);
+  }
+  int16_t length1 = String1Length;
+  int16_t length2 = String2Length;
+  if ((options & CHARBASED) != 0) {
+    NLS2_TRACE(frame, "CHARBASED option selected.");
+    length1 = walkedLength<Which::First>(frame, pLoc, pString1, length1);
+    NLS2_TRACE(frame, "Computing length of string 2");
+    length2 = walkedLength<Which::Second>(frame, pLoc, pString2, length2);
+  }
+  Utf16Text text1;
+  Utf16Text text2;
+  if (!convertString<Which::First>(frame, converter, text1, pString1, length1, pStatus) ||
+      !convertString<Which::Second>(frame, converter, text2, pString2, length2, pStatus)) {
+    return frame.result(0);
+  }
+  converter.adoptInstead(nullptr);
+  return frame.result(compare(frame, pLoc, text1, text2, options, pStatus));
+}

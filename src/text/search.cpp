@@ -1,0 +1,206 @@
+// NLS2_Findstr: whether one string occurs in another.
+
+#include "codepage/utf16_text.h"
+#include "nls2.h"
+#include "trace/bounded_text.h"
+#include "trace/frame.h"
+
+#include <cstring>
+#include <unicode/localpointer.h>
+#include <unicode/ucnv.h>
+#include <unicode/ustring.h>
+
+namespace {
+
+using icu::LocalUConverterPointer;
+using nls2::codepage::Utf16Text;
+using nls2::trace::BoundedText;
+using nls2::trace::Frame;
+using nls2::trace::Trace;
+
+constexpr int32_t searchFailed = -1;
+
+// Which of the two strings a line speaks of.
+enum class Which { First, Second };
+
+// What a call holds. Release before a line or after it: callers' traces know which.
+struct Search {
+  Trace trace;
+  const NLS2_Locale *pLocale;
+  LocalUConverterPointer converter{};
+  Utf16Text text1{};
+  Utf16Text text2{};
+  Utf16Text lower1{};
+  Utf16Text lower2{};
+
+  void release() {
+    text1.units.reset();
+    text2.units.reset();
+    lower1.units.reset();
+    lower2.units.reset();
+    converter.adoptInstead(nullptr);
+  }
+
+  // Where string 2 cannot be measured or has no room, the first string's block has always been left
+  // behind, and callers' leak accounting knows it.
+  void releaseAllButText1() {
+    converter.adoptInstead(nullptr);
+    static_cast<void>(text1.units.release());
+  }
+};
+
+bool openConverter(Search &search) {
+  NLS2_TRACE(search.trace, "Opening converter for codepage %d.", search.pLocale->codepage);
+  int32_t twoNull = 0;
+  int32_t status = U_ZERO_ERROR;
+  search.converter.adoptInstead(
+      NLS2_MapCodepageIdToName(static_cast<int32_t>(search.pLocale->codepage), &twoNull, &status));
+  if (status > U_ZERO_ERROR) {
+    NLS2_TRACE(search.trace, "Could not map Codepage ID %d to Name", search.pLocale->codepage);
+    return false;
+  }
+  NLS2_TRACE(search.trace, "Converter opened.");
+  return true;
+}
+
+bool convertString1(Search &search, const char *string, int32_t length) {
+  const Trace trace = search.trace;
+  UConverter *converter = search.converter.getAlias();
+  NLS2_TRACE(trace, "Pre-flight string1 to determine size of output needed.");
+  UErrorCode error = nls2::codepage::measure(search.text1, converter, string, length);
+  if (error > U_ZERO_ERROR) {
+    NLS2_TRACE(trace, "Could not pre-flight first string to UChars");
+    return false;
+  }
+  NLS2_TRACE(trace, "Buffer size of %d bytes needed, allocate memory.", search.text1.length);
+  if (!nls2::codepage::allocate(search.text1, trace)) {
+    NLS2_TRACE(trace, "Could not allocate memory.");
+    return false;
+  }
+  NLS2_TRACE(trace, "Convert string1 to UChars.");
+  error = nls2::codepage::convert(search.text1, converter, string, length);
+  if (error > U_ZERO_ERROR) {
+    search.release();
+    NLS2_TRACE(trace, "Could convert string1 to UChars %d", error);
+    return false;
+  }
+  return true;
+}
+
+bool convertString2(Search &search, const char *string, int32_t length) {
+  const Trace trace = search.trace;
+  UConverter *converter = search.converter.getAlias();
+  NLS2_TRACE(trace, "Pre-flight string2 to determine buffer size needed.");
+  UErrorCode error = nls2::codepage::measure(search.text2, converter, string, length);
+  if (error > U_ZERO_ERROR) {
+    search.releaseAllButText1();
+    NLS2_TRACE(trace, "Could not pre-flight string2 to UChars %d", error);
+    return false;
+  }
+  NLS2_TRACE(trace, "Buffer size %d bytes needed, allocate memory.", search.text2.length);
+  if (!nls2::codepage::allocate(search.text2, trace)) {
+    search.releaseAllButText1();
+    NLS2_TRACE(trace, "Could not allocate memory.");
+    return false;
+  }
+  NLS2_TRACE(trace, "Convert string2 to UChars.");
+  error = nls2::codepage::convert(search.text2, converter, string, length);
+  if (error > U_ZERO_ERROR) {
+    search.release();
+    NLS2_TRACE(trace, "Could convert string 2 to UChars %d", error);
+    return false;
+  }
+  return true;
+}
+
+// The lower-case form gets as many units as its source has and no more, so one that grows fails.
+// The source ends at its first null.
+UErrorCode toLower(const Search &search, const Utf16Text &source, Utf16Text &lower) {
+  std::memset(lower.units.get(), 0, lower.size());
+  UErrorCode error = U_ZERO_ERROR;
+  u_strToLower(lower.units.get(), lower.length, source.units.get(), u_strlen(source.units.get()),
+               search.pLocale->icuLocale, &error);
+  return error;
+}
+
+template <Which which>
+bool lowerString(Search &search, const Utf16Text &source, Utf16Text &lower) {
+  const Trace trace = search.trace;
+  constexpr bool first = which == Which::First;
+  lower.length = u_strlen(source.units.get());
+  const auto bytes = static_cast<int32_t>(lower.size());
+  if constexpr (first) {
+    NLS2_TRACE(trace, "Buffer size for string1 to allocate is %d  bytes.", bytes);
+  } else {
+    NLS2_TRACE(trace, "Buffer size for string2 to allocate is %d  bytes.", bytes);
+  }
+  NLS2_TRACE(trace, "Allocate memory to hold converted string.");
+  if (!nls2::codepage::allocate(lower, trace)) {
+    search.release();
+    NLS2_TRACE(trace, "Could not allocate memory.");
+    return false;
+  }
+  NLS2_TRACE(trace, "Memory allocated.");
+  trace.line(first ? "Convert string1 to lower.\n" : "Convert string2 to lower.\n");
+  const UErrorCode error = toLower(search, source, lower);
+  if (error > U_ZERO_ERROR) {
+    search.release();
+    if constexpr (first) {
+      NLS2_TRACE(trace, "Could not convert to lower case %d", error);
+    } else {
+      NLS2_TRACE(trace, "Could convert to lower case %d", error);
+    }
+    return false;
+  }
+  if constexpr (first) {
+    NLS2_TRACE(trace, "String1 converted to lower case.");
+  }
+  return true;
+}
+
+int32_t answer(Search &search, const UChar *found) {
+  if (found == nullptr) {
+    NLS2_TRACE(search.trace, "Did not find occurence of string2 in string1.");
+  } else {
+    NLS2_TRACE(search.trace, "Found occurence of string2 in string1.");
+  }
+  search.release();
+  return found != nullptr ? 1 : 0;
+}
+
+int32_t find(Search &search, uint32_t options) {
+  if ((options & IGNORECASE) == 0) {
+    NLS2_TRACE(search.trace, "Locate string2 within string1");
+    return answer(search, u_strstr(search.text1.units.get(), search.text2.units.get()));
+  }
+  NLS2_TRACE(search.trace, "IGNORECASE option detected");
+  if (!lowerString<Which::First>(search, search.text1, search.lower1) ||
+      !lowerString<Which::Second>(search, search.text2, search.lower2)) {
+    return searchFailed;
+  }
+  NLS2_TRACE(search.trace, "Look for string2 in string1.");
+  return answer(search, u_strstr(search.lower1.units.get(), search.lower2.units.get()));
+}
+
+} // namespace
+
+int32_t NLS2_Findstr(const NLS2_Locale *pLocale, const char *pString1, int32_t len1,
+                     const char *pString2, int32_t len2, uint32_t options) {
+  static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_Findstr");
+  Frame frame(anchor);
+  NLS2_TRACE(frame,
+             "Input parameters: pLocale %X, pString1 %s, len1 %d, pString2 %s, len2 %d, "
+             "options %x.",
+             nls2::trace::low32(pLocale), BoundedText(pString1, len1).c_str(), len1,
+             BoundedText(pString2, len2).c_str(), len2, options);
+  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+    NLS2_TRACE(frame, "Invalid locale object.");
+    return frame.result(searchFailed);
+  }
+  Search search{frame, pLocale};
+  if (!openConverter(search) || !convertString1(search, pString1, len1) ||
+      !convertString2(search, pString2, len2)) {
+    return frame.result(searchFailed);
+  }
+  return frame.result(find(search, options));
+}
