@@ -1,0 +1,22 @@
+// How a command gives up: with a message for standard error and an exit code.
+#pragma once
+
+#include <stdexcept>
+
+namespace nls2::tool {
+
+enum ExitCode : int {
+  exitDone = 0,
+  exitFailed = 1, // a record that cannot be translated, or input or output that fails
+  exitUsage = 2   // the command line asks for something that cannot be
+};
+
+struct Failure : std::runtime_error {
+  using std::runtime_error::runtime_error;
+};
+
+struct UsageError : std::runtime_error {
+  using std::runtime_error::runtime_error;
+};
+
+} // namespace nls2::tool

@@ -1,0 +1,31 @@
+// Where a command reads from: a file or standard input.
+#pragma once
+
+#include <cstddef>
+#include <string>
+
+namespace nls2::tool {
+
+class InputFile {
+public:
+  // "-" is standard input. Throws Failure.
+  explicit InputFile(const std::string &path);
+  ~InputFile();
+  InputFile(const InputFile &) = delete;
+  InputFile &operator=(const InputFile &) = delete;
+
+  // Up to `length` bytes, as many as are there at once; 0 at the end, and when `wakeFd` becomes
+  // readable before any are. Throws Failure.
+  std::size_t read(char *buffer, std::size_t length, int wakeFd);
+
+  int fd() const { return fd_; }
+  const std::string &name() const { return name_; }
+
+private:
+  [[noreturn]] void fail() const;
+
+  std::string name_;
+  int fd_ = -1;
+};
+
+} // namespace nls2::tool
