@@ -15,11 +15,13 @@
 namespace nls2::tool {
 
 // A record as UTF-16, little-endian: its text, how many blanks stood behind it, and the bytes that
-// the text takes in the destination page.
+// the text takes in the destination page, alone and with one blank. That blank may bring a
+// signature or a shift with it; every further one takes its own bytes only.
 struct RecordTranslator::WideField {
   std::string text;
   std::size_t blanks = 0;
   std::size_t textBytes = 0;
+  std::size_t blankedBytes = 0;
   int32_t status = U_ZERO_ERROR;
 };
 
@@ -147,7 +149,7 @@ RecordTranslator::Refusal RecordTranslator::translateAsItIs(std::string_view rec
 RecordTranslator::Refusal RecordTranslator::fill(std::string_view record, OutputBuffer &out) const {
   const bool done =
       blank_.bytes.size() == 1 ? fillAtOnce(record, out) : stripAndAppend(record, out);
-  return done ? Refusal() : fillThroughUtf16(record, out);
+  return done ? Refusal() : padThroughUtf16(record, out);
 }
 
 // The library counts the field in UTF-16 units. Where that made it shorter than the bytes asked
@@ -190,7 +192,7 @@ bool RecordTranslator::stripAndAppend(std::string_view record, OutputBuffer &out
 RecordTranslator::Refusal RecordTranslator::keepBlanks(std::string_view record,
                                                        OutputBuffer &out) const {
   if (blank_.bytes.size() != 1) {
-    return keepThroughUtf16(record, out);
+    return padThroughUtf16(record, out);
   }
   const std::size_t length = std::max(ampleLength(record), outLength_ + 1);
   char *dest = out.room(length);
@@ -203,7 +205,7 @@ RecordTranslator::Refusal RecordTranslator::keepBlanks(std::string_view record,
     return {};
   }
   out.scrub(length);
-  return whole ? fill(record, out) : keepThroughUtf16(record, out);
+  return whole ? fill(record, out) : padThroughUtf16(record, out);
 }
 
 RecordTranslator::WideField RecordTranslator::widen(std::string_view record) const {
@@ -221,45 +223,37 @@ RecordTranslator::WideField RecordTranslator::widen(std::string_view record) con
     field.text.resize(field.text.size() - wideBlank.size());
     ++field.blanks;
   }
-  field.textBytes = field.text.empty()
-                        ? blank_.signatureLength
-                        : translateText(options_.to, utf16lePage, field.text, field.status).size();
+  const auto lengthOf = [&](const std::string &text) {
+    return translateText(options_.to, utf16lePage, text, field.status).size();
+  };
+  field.blankedBytes = lengthOf(field.text + std::string(wideBlank));
+  field.textBytes = lengthOf(field.text);
   return field;
 }
 
-RecordTranslator::Refusal RecordTranslator::fillThroughUtf16(std::string_view record,
-                                                             OutputBuffer &out) const {
+// How many blanks fit behind the text.
+std::size_t RecordTranslator::roomForBlanks(const WideField &field) const {
+  if (outLength_ < field.blankedBytes) {
+    return 0;
+  }
+  return (outLength_ - field.blankedBytes) / blank_.bytes.size() + 1;
+}
+
+RecordTranslator::Refusal RecordTranslator::padThroughUtf16(std::string_view record,
+                                                            OutputBuffer &out) const {
   const WideField field = widen(record);
   if (field.status != U_ZERO_ERROR) {
     return refuse(field.status, record);
+  }
+  if (outLength_ == 0) {
+    return narrow(field, field.blanks, out);
   }
   if (field.textBytes > outLength_) {
     return overflow(field.textBytes);
   }
-  const std::size_t rest = outLength_ - field.textBytes;
-  if (rest % blank_.bytes.size() != 0) {
-    return fmt::format("{} bytes are left to fill, and a blank of code page {} takes {}; give "
-                       "another --out-length",
-                       rest, options_.to, blank_.bytes.size());
-  }
-  return narrow(field, rest / blank_.bytes.size(), out);
-}
-
-RecordTranslator::Refusal RecordTranslator::keepThroughUtf16(std::string_view record,
-                                                             OutputBuffer &out) const {
-  const WideField field = widen(record);
-  if (field.status != U_ZERO_ERROR) {
-    return refuse(field.status, record);
-  }
-  std::size_t blanks = field.blanks;
-  if (outLength_ != 0) {
-    if (field.textBytes > outLength_ && !field.text.empty()) {
-      return overflow(field.textBytes);
-    }
-    const std::size_t rest = outLength_ - std::min(field.textBytes, outLength_);
-    blanks = std::min(blanks, rest / blank_.bytes.size());
-  }
-  return narrow(field, blanks, out);
+  const std::size_t room = roomForBlanks(field);
+  return narrow(field, options_.padding == Padding::fill ? room : std::min(field.blanks, room),
+                out);
 }
 
 RecordTranslator::Refusal RecordTranslator::narrow(const WideField &field, std::size_t blanks,
@@ -273,13 +267,10 @@ RecordTranslator::Refusal RecordTranslator::narrow(const WideField &field, std::
   if (status != U_ZERO_ERROR) {
     return fmt::format("{}: {}", statusName(status), statusAdvice(status));
   }
-  const bool fits = options_.padding == Padding::fill
-                        ? bytes.size() == outLength_
-                        : outLength_ == 0 || bytes.size() <= outLength_;
-  if (!fits) {
-    return fmt::format("the text and its blanks cannot be made {} bytes long in code page {}; give "
-                       "another --out-length, or --strip",
-                       outLength_, options_.to);
+  if (options_.padding == Padding::fill && bytes.size() != outLength_) {
+    return fmt::format("with blanks of {} bytes it can be {} bytes long, but not {}; give another "
+                       "--out-length",
+                       blank_.bytes.size(), bytes.size(), outLength_);
   }
   out.append(bytes);
   return {};

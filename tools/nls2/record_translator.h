@@ -49,8 +49,8 @@ private:
 
   // The slow way, by UTF-16 and with the blanks counted here. It is right for every page: for those
   // whose blanks are wider than a byte, that shift, that put a signature before the text.
-  Refusal fillThroughUtf16(std::string_view record, OutputBuffer &out) const;
-  Refusal keepThroughUtf16(std::string_view record, OutputBuffer &out) const;
+  Refusal padThroughUtf16(std::string_view record, OutputBuffer &out) const;
+  std::size_t roomForBlanks(const WideField &field) const;
   WideField widen(std::string_view record) const;
   Refusal narrow(const WideField &field, std::size_t blanks, OutputBuffer &out) const;
 

@@ -69,7 +69,7 @@ Json codepageAsJson(int32_t number) {
   UErrorCode nameStatus = U_ZERO_ERROR;
   const char *name = converter.isNull() ? nullptr : ucnv_getName(converter.getAlias(), &nameStatus);
   return {{"codepage", number},
-          {"opens", converter.isValid()},
+          {"opens", !converter.isNull()},
           {"converter", name != nullptr ? Json(name) : Json()},
           {"twoNullTerminator", twoNull != 0},
           {"status", status},

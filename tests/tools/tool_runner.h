@@ -1,0 +1,61 @@
+// Runs the built nls2 as a user does.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <sys/types.h>
+#include <vector>
+
+namespace tools {
+
+// A directory of its own, removed with all that is in it.
+class TempDir {
+public:
+  TempDir();
+  ~TempDir();
+  TempDir(const TempDir &) = delete;
+  TempDir &operator=(const TempDir &) = delete;
+
+  std::string path(const std::string &name) const { return path_ + "/" + name; }
+  std::vector<std::string> names() const; // sorted
+
+private:
+  std::string path_;
+};
+
+void writeFile(const std::string &path, std::string_view bytes);
+std::string readFile(const std::string &path);
+
+// "--from 37 --strip" as arguments.
+std::vector<std::string> words(const std::string &line);
+
+struct Result {
+  int exitCode = -1; // the negative signal number where a signal ended it
+  std::string out;
+  std::string err;
+};
+
+// Standard input is `input`, standard output a file that is read back.
+Result runTool(const std::vector<std::string> &arguments, std::string_view input = "");
+Result runTool(const std::string &line, std::string_view input = "");
+
+// A nls2 that is running, its standard input a pipe from here.
+class RunningTool {
+public:
+  // Standard output goes to `outputPath`.
+  RunningTool(const std::vector<std::string> &arguments, const std::string &outputPath,
+              const std::string &errorPath);
+  ~RunningTool();
+  RunningTool(const RunningTool &) = delete;
+  RunningTool &operator=(const RunningTool &) = delete;
+
+  pid_t pid() const { return pid_; }
+  bool feed(std::string_view bytes); // false when it reads no more
+  int wait();                        // closes its input; the exit code
+
+private:
+  pid_t pid_ = -1;
+  int input_ = -1;
+};
+
+} // namespace tools
