@@ -7,12 +7,12 @@
  *  2. A length of -1 means that the text is null-terminated. The end of a byte string is then its
  *     first zero byte, whatever the code page.
  *  3. Code pages are numbers: CCSIDs (37, 819, 930, 1208 ...), and the private numbers from 57352
- * up that NLS2_MapCodepageIdToName lists. They are not checked before ICU sees them.
+ *     up that NLS2_MapCodepageIdToName lists. They are not checked before ICU sees them.
  *  4. Language ids are numbers: a country number in the upper 16 bits (ISO 3166 numeric, with
  *     exceptions) and the library's language number in the lower 16. localeMap holds them all.
  *  5. A status is a signed 32-bit word: 0 is success, a positive value a failure, a negative value
- * a warning of ICU's and so a success. Values 32 and 36 to 39 are this library's (NLS2_ERR_*), all
- *     others are ICU's UErrorCode, passed on unchanged; u_errorName() names those.
+ *     a warning of ICU's and so a success. Values 32 and 36 to 39 are this library's (NLS2_ERR_*),
+ *     all others are ICU's UErrorCode, passed on unchanged; u_errorName() names those.
  *  6. A status comes back in one of two ways: stored through a last argument pStatus, with a result
  *     of 0 or null on failure; or as the result itself.
  *  7. Outputs on failure are as they were, except where "partial output" is noted.
@@ -274,11 +274,10 @@ NLS2_API uint32_t NLS2_GetCodepageId(const char *codepageName, int32_t *status);
 
 /* Options of NLS2_TranslateString. */
 enum {
-  NLS2_STRING_TERMINATE = 0x0008, /* end the output in a null, and count it */
-  NLS2_STRING_FILL = 0x0100,      /* pad with blanks to destLen */
-  NLS2_STRING_TRAILING = 0x0200,  /* restore the source's trailing blanks as far as they fit */
-  NLS2_STRING_STRIP_TRAILING =
-      0x4000 /* drop the source's trailing blanks; wins over the two above */
+  NLS2_STRING_TERMINATE = 0x0008,     /* end the output in a null, and count it */
+  NLS2_STRING_FILL = 0x0100,          /* pad with blanks to destLen */
+  NLS2_STRING_TRAILING = 0x0200,      /* restore the source's trailing blanks as far as they fit */
+  NLS2_STRING_STRIP_TRAILING = 0x4000 /* drop them; wins over the two above */
 };
 
 /* Translates a field from one code page to another and, on request, shapes the output as a field.
@@ -297,30 +296,33 @@ enum {
  *
  * With any other option the trailing blanks (u_isblank: tabs and all space separators) and nulls
  * are cut off, and so is everything from the first remaining null on; the rest, the text, must fit
- * in destLen less the terminator's 1 or 2 bytes. Then, by the option: STRIP_TRAILING  The text
- * alone. The result is its length in UTF-16 units, not bytes, plus 1 or 2 with TERMINATE, which
- * however stores no null of its own (ICU stores one zero byte behind the text where there is room).
+ * in destLen less the terminator's 1 or 2 bytes. Then, by the option:
+ *   STRIP_TRAILING  The text alone. The result is its length in UTF-16 units, not bytes, plus 1 or
+ *                   2 with TERMINATE, which however stores no null of its own (ICU stores one zero
+ *                   byte behind the text where there is room).
  *   TRAILING        The text and as many U+0020 as the source had trailing blanks, as fit.
  *   FILL            The text and U+0020 up to destLen; wins over TRAILING.
  * TRAILING and FILL return destLen, whatever was written, and store the terminator at its end;
  * bytes between a shorter output and that end are as they were. destLen is compared with counts of
- * UTF-16 units there, which is right only while a blank is one byte. Into a page where it is not
- * (1200, 57358 to 57361, 57368, 57369, 57372) FILL writes a wrong field with status 0: the two
- * bytes 41 42
- * ("AB") from 819 to 57359 with destLen 10 give 41 00 and nothing more, the second letter is lost.
- * Strip into such a page, and append the blanks yourself.
+ * UTF-16 units there, which is right only while a blank is one byte. Into a page where it is not,
+ * FILL clears the field's first byte and reports status 0 (1200, 57358, 57359), or fails with
+ * status 1 (57360, 57361, 57368, 57369, 57372). So the two bytes 41 42 ("AB") from 819 to 57359
+ * with destLen 10 give 00 00 42 00 20 00 20 00 20 00: the first letter is lost. Strip into such a
+ * page, and append the blanks yourself.
  *
  * Result: the count told above; 0 on failure and for an empty source. *pStatus:
  *   0   done, or sourceLen 0 (nothing is written); ICU's warnings count as 0
  *   15  U_BUFFER_OVERFLOW_ERROR: dest is too small for the text; partial output with options 0 or
  *       TERMINATE alone, and where blanks could not be made to fit
  *   32  NLS2_ERR_NO_MEMORY: no work buffer of 2 * max(destLen, UTF-16 units of the source) + 2
- * bytes 36  NLS2_ERR_INVALID_OPTION: TERMINATE with other bits, but none of the three paddings.
- * This failure leaks the work buffer and two converters 37  NLS2_ERR_INVALID_PARAMETER: options
- * without an accepted bit, destLen negative, destLen 0 with a source, or a code page 0 other  ICU's
- * failure to open a converter (4: unknown page) or to convert; partial output Bytes that do not
- * convert are no failure: ICU's default callbacks put the target page's substitution character for
- * them. */
+ *       bytes
+ *   36  NLS2_ERR_INVALID_OPTION: TERMINATE with other bits, but none of the three paddings. This
+ *       failure leaks the work buffer and two converters
+ *   37  NLS2_ERR_INVALID_PARAMETER: options without an accepted bit, destLen negative, destLen 0
+ *       with a source, or a code page 0
+ *   other  ICU's failure to open a converter (4: unknown page) or to convert; partial output
+ * Bytes that do not convert are no failure: ICU's default callbacks put the target page's
+ * substitution character for them. */
 NLS2_API int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t destLen,
                                       int32_t sourceCodePage, const char *source, int32_t sourceLen,
                                       int32_t *pSourceConsumed, uint32_t options, int32_t *pStatus);
