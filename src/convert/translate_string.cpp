@@ -63,7 +63,8 @@ void traceSource(Trace trace, const char *source, int32_t sourceLen) {
 int32_t countTerminator(Trace trace, char *dest, int32_t amountWritten, bool twoNull) {
   if (twoNull) {
     dest[amountWritten + 1] = 0;
-    amountWritten += 2;
+    // Unsigned, since an output of 2 GB less 2 bytes leaves no room for the sum.
+    amountWritten = static_cast<int32_t>(static_cast<uint32_t>(amountWritten) + 2U);
     NLS2_TRACE(trace, "Amount written includes utf-16 nulls %d.", amountWritten);
   } else {
     amountWritten += 1;
