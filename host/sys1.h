@@ -12,13 +12,21 @@
 extern "C" {
 #endif
 
+/* Keeps a host's definitions visible to the library in a program whose symbols are hidden by
+ * default. */
+#if defined(__GNUC__)
+#define SYS1_API __attribute__((visibility("default")))
+#else
+#define SYS1_API
+#endif
+
 enum { SYS1_LOCK_SIZE = 28 };
 
 /* Blocks until the caller holds the lock. Not recursive. */
-void SYS1_GetLock(void *lock);
+SYS1_API void SYS1_GetLock(void *lock);
 
 /* Releases a lock that the caller holds. */
-void SYS1_ReleaseLock(void *lock);
+SYS1_API void SYS1_ReleaseLock(void *lock);
 
 #ifdef __cplusplus
 }

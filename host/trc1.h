@@ -26,9 +26,13 @@
 extern "C" {
 #endif
 
+/* TRC1_API keeps a host's definitions visible to the library in a program whose symbols are hidden
+ * by default. */
 #if defined(__GNUC__)
+#define TRC1_API __attribute__((visibility("default")))
 #define TRC1_FORMAT(text, first) __attribute__((format(printf, text, first)))
 #else
+#define TRC1_API
 #define TRC1_FORMAT(text, first)
 #endif
 
@@ -80,17 +84,18 @@ typedef struct TRC1_EntryBlock {
 } TRC1_EntryBlock;
 
 /* The anchor's current flags. Stores them, with the sync word's current value, in the anchor. */
-uint32_t TRC1_Sync(TRC1_EntryBlock *anchor);
+TRC1_API uint32_t TRC1_Sync(TRC1_EntryBlock *anchor);
 
 /* An entry or exit event. A kind of 1 is followed by one uint32_t. */
-void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t line, uint32_t kind, ...);
+TRC1_API void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t line, uint32_t kind, ...);
 
 /* One detail line; the format ends in a newline. */
-void TRC1_Printf(TRC1_EntryBlock *anchor, uint32_t line, const char *format, ...) TRC1_FORMAT(3, 4);
+TRC1_API void TRC1_Printf(TRC1_EntryBlock *anchor, uint32_t line, const char *format, ...)
+    TRC1_FORMAT(3, 4);
 
 /* A memory area of `length` bytes. `zero` is always 0. */
-void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t line, const void *address, uint32_t length,
-               uint32_t zero);
+TRC1_API void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t line, const void *address,
+                        uint32_t length, uint32_t zero);
 
 #ifdef __cplusplus
 }
