@@ -6,6 +6,7 @@
 
 #include <atomic>
 #include <dlfcn.h>
+#include <string>
 #include <unicode/ucnv.h>
 
 namespace {
@@ -14,6 +15,18 @@ std::atomic<int> opened{0};
 std::atomic<int> closed{0};
 std::atomic<bool> marking{false};
 std::atomic<int> failure{U_ZERO_ERROR};
+
+std::string failingFunction;
+int callsToFailure = 0;
+UErrorCode conversionFailure = U_ZERO_ERROR;
+
+bool refuse(const char *function, UErrorCode *error) {
+  if (function != failingFunction || --callsToFailure != 0) {
+    return false;
+  }
+  *error = conversionFailure;
+  return true;
+}
 
 template <class Function>
 Function next(Function /*type*/, const char *name) {
@@ -56,6 +69,13 @@ ConverterMarks::~ConverterMarks() { marking = false; }
 FailingOpens::FailingOpens(UErrorCode error) { failure = error; }
 FailingOpens::~FailingOpens() { failure = U_ZERO_ERROR; }
 
+FailingConversion::FailingConversion(const char *function, int call, UErrorCode error) {
+  failingFunction = function;
+  callsToFailure = call;
+  conversionFailure = error;
+}
+FailingConversion::~FailingConversion() { failingFunction.clear(); }
+
 } // namespace support
 
 extern "C" UConverter *ucnv_open(const char *name, UErrorCode *error) {
@@ -67,6 +87,22 @@ extern "C" UConverter *ucnv_openCCSID(int32_t ccsid, UConverterPlatform platform
                                       UErrorCode *error) {
   static const auto original = NEXT(ucnv_openCCSID);
   return refuse(error) ? nullptr : count(original(ccsid, platform, error));
+}
+
+extern "C" int32_t ucnv_toUChars(UConverter *converter, UChar *dest, int32_t capacity,
+                                 const char *source, int32_t length, UErrorCode *error) {
+  static const auto original = NEXT(ucnv_toUChars);
+  return refuse("ucnv_toUChars", error)
+             ? 0
+             : original(converter, dest, capacity, source, length, error);
+}
+
+extern "C" int32_t ucnv_fromUChars(UConverter *converter, char *dest, int32_t capacity,
+                                   const UChar *source, int32_t length, UErrorCode *error) {
+  static const auto original = NEXT(ucnv_fromUChars);
+  return refuse("ucnv_fromUChars", error)
+             ? 0
+             : original(converter, dest, capacity, source, length, error);
 }
 
 extern "C" void ucnv_close(UConverter *converter) {

@@ -30,4 +30,14 @@ public:
   FailingOpens &operator=(const FailingOpens &) = delete;
 };
 
+// While it lives, the nth call (from 1) of ucnv_toUChars or ucnv_fromUChars, whichever is named,
+// fails with `error`.
+class FailingConversion {
+public:
+  FailingConversion(const char *function, int call, UErrorCode error);
+  ~FailingConversion();
+  FailingConversion(const FailingConversion &) = delete;
+  FailingConversion &operator=(const FailingConversion &) = delete;
+};
+
 } // namespace support

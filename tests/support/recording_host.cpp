@@ -8,6 +8,7 @@
 #include <atomic>
 #include <cstdarg>
 #include <cstdio>
+#include <map>
 #include <mutex>
 
 namespace {
@@ -15,6 +16,8 @@ namespace {
 std::mutex recordMutex;
 std::vector<std::string> recorded;
 bool recording = false;
+
+std::map<std::string, support::SeenFunction> seenFunctions;
 
 // Every change of the flags changes this word, which anchors are pointed at by their first sync.
 std::atomic<uint32_t> currentFlags{0};
@@ -55,6 +58,20 @@ std::vector<std::string> Recording::lines() const {
   return recorded;
 }
 
+std::string
+Recording::text(std::initializer_list<std::pair<const char *, const char *>> shortNames) const {
+  std::string all;
+  for (std::string line : lines()) {
+    for (const auto &[name, shortName] : shortNames) {
+      if (line.rfind(name, 0) == 0) {
+        line.replace(0, std::string(name).size(), shortName);
+      }
+    }
+    all += line + "\n";
+  }
+  return all;
+}
+
 std::vector<std::string> Recording::details(const std::string &function) const {
   std::vector<std::string> texts;
   for (const std::string &line : lines()) {
@@ -64,6 +81,13 @@ std::vector<std::string> Recording::details(const std::string &function) const {
   }
   return texts;
 }
+
+SeenFunction seen(const std::string &function) {
+  const std::lock_guard<std::mutex> guard(recordMutex);
+  return seenFunctions[function];
+}
+
+void changeSyncWord() { setFlags(currentFlags); }
 
 void mark(const std::string &line) {
   const std::lock_guard<std::mutex> guard(recordMutex);
@@ -92,6 +116,15 @@ bool lockHeld() { return held; }
 } // namespace support
 
 uint32_t TRC1_Sync(TRC1_EntryBlock *anchor) {
+  {
+    const std::lock_guard<std::mutex> guard(recordMutex);
+    support::SeenFunction &function = seenFunctions[nameOf(anchor)];
+    if (function.syncs++ == 0) {
+      function.anchor = anchor;
+      function.atFirstSync = *anchor;
+      function.wordAtFirstSync = *anchor->sync;
+    }
+  }
   __atomic_store_n(&anchor->sync, &hostSync, __ATOMIC_RELAXED);
   const uint32_t sync = __atomic_load_n(&hostSync, __ATOMIC_RELAXED);
   const uint32_t flags = currentFlags;
@@ -100,7 +133,11 @@ uint32_t TRC1_Sync(TRC1_EntryBlock *anchor) {
   return flags;
 }
 
-void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t /*line*/, uint32_t kind, ...) {
+void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t line, uint32_t kind, ...) {
+  if (kind == TRC1_EVENT_ENTRY) {
+    const std::lock_guard<std::mutex> guard(recordMutex);
+    seenFunctions[nameOf(anchor)].entryEventLine = line;
+  }
   std::string text = nameOf(anchor) + (kind == TRC1_EVENT_ENTRY ? "> entry" : "=");
   if (kind == TRC1_EVENT_EXIT_VALUE) {
     va_list arguments;

@@ -2,8 +2,12 @@
 // default host, since the program's own definitions win.
 #pragma once
 
+#include "trc1.h"
+
 #include <cstdint>
+#include <initializer_list>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace support {
@@ -30,9 +34,23 @@ public:
   Recording &operator=(const Recording &) = delete;
 
   std::vector<std::string> lines() const;
+  // All lines, each ended by a newline, with function names put shorter: {"NLS2_Name", "N"}.
+  std::string text(std::initializer_list<std::pair<const char *, const char *>> shortNames) const;
   // The lines of one function, its name and the sign cut off for detail lines: "detail text".
   std::vector<std::string> details(const std::string &function) const;
 };
+
+// What the host has seen of one function; all zero before its first sync.
+struct SeenFunction {
+  TRC1_EntryBlock *anchor;
+  TRC1_EntryBlock atFirstSync; // the anchor as the library handed it over
+  uint32_t wordAtFirstSync;    // what its sync pointer then pointed at
+  unsigned syncs;
+  uint32_t entryEventLine;
+};
+SeenFunction seen(const std::string &function);
+// Changes the word that the anchors' sync pointers were moved to; the flags stay.
+void changeSyncWord();
 
 // Adds a line to the recording that is open, if any; for probes that watch ICU or the heap.
 void mark(const std::string &line);

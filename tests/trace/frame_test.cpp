@@ -1,0 +1,206 @@
+// The trace frame as a host sees it: anchors, syncs, events and their flags.
+
+#include "nls2.h"
+#include "support/recording_host.h"
+
+#include <algorithm>
+#include <cstring>
+#include <functional>
+#include <gtest/gtest.h>
+#include <unicode/ucnv.h>
+
+namespace {
+
+using support::Recording;
+using support::seen;
+using support::SeenFunction;
+
+constexpr auto translateString = "NLS2_TranslateString";
+
+int32_t translate(uint32_t options, int32_t destCodePage = 1208, char *dest = nullptr) {
+  char output[16] = {};
+  int32_t consumed = 0;
+  int32_t status = 0;
+  const int32_t written =
+      NLS2_TranslateString(destCodePage, dest != nullptr ? dest : output, sizeof output, 37,
+                           "\xC1\xC2\x40", 3, &consumed, options, &status);
+  return written * 100 + status;
+}
+
+int32_t openConverter(int32_t codepage) {
+  int32_t twoNull = 0;
+  int32_t status = 0;
+  ucnv_close(NLS2_MapCodepageIdToName(codepage, &twoNull, &status));
+  return status;
+}
+
+int32_t findWindowsName(const char *name) {
+  int32_t status = 0;
+  return static_cast<int32_t>(NLS2_MapWindowsNameToCCSID(name, &status)) + status;
+}
+
+int32_t findLocale(uint32_t id) {
+  const LocaleMapEntry *entry = NLS2_GetLocaleMapEntry(id);
+  return entry != nullptr ? static_cast<int32_t>(entry - localeMap) : -1;
+}
+
+// Every function on its ways out, each call with the number of function calls that it makes.
+struct Call {
+  const char *reason;
+  std::function<int32_t()> run;
+  int functions;
+};
+const Call calls[] = {
+    {"locale found", [] { return findLocale(0x03480001); }, 1},
+    {"locale not found", [] { return findLocale(0xFF); }, 1},
+    {"page opened by name", [] { return openConverter(1200); }, 1},
+    {"page opened as a CCSID", [] { return openConverter(37); }, 1},
+    {"page not opened", [] { return openConverter(57364); }, 1},
+    {"Windows name found", [] { return findWindowsName("windows-950"); }, 1},
+    {"Windows name not found", [] { return findWindowsName("windows-1252"); }, 1},
+    {"direct translation", [] { return translate(0); }, 3},
+    {"filled translation", [] { return translate(NLS2_STRING_FILL); }, 4},
+    {"stripped translation", [] { return translate(NLS2_STRING_STRIP_TRAILING); }, 4},
+    {"option refused", [] { return translate(1); }, 1},
+    {"page refused", [] { return translate(0, 0); }, 1},
+    {"destination not opened", [] { return translate(0, 57364); }, 3},
+};
+
+void callAll() {
+  for (const Call &call : calls) {
+    call.run();
+  }
+}
+
+TEST(Frame, AnchorsAreAsTheLibraryDescribesItself) {
+  const Recording recording(support::traceEvents);
+  callAll();
+  const struct {
+    const char *name;
+    uint32_t attributes;
+  } rows[] = {
+      {"NLS2_GetLocaleMapEntry", 0x200},
+      {"NLS2_MapCodepageIdToName", 0x200},
+      {"NLS2_MapWindowsNameToCCSID", 0x200},
+      {translateString, 0x200},
+      {"realloc_mem", 0x800},
+  };
+  const TRC1_UnitBlock *unit = seen(translateString).atFirstSync.unit;
+  for (const auto &row : rows) {
+    SCOPED_TRACE(row.name);
+    const SeenFunction function = seen(row.name);
+    const TRC1_EntryBlock &anchor = function.atFirstSync;
+    ASSERT_GT(function.syncs, 0U);
+    EXPECT_EQ(anchor.unit, unit);
+    EXPECT_STREQ(anchor.functionName, row.name);
+    EXPECT_EQ(anchor.functionNameLength, std::strlen(row.name));
+    EXPECT_EQ(anchor.attributes, row.attributes);
+    EXPECT_EQ(anchor.entryLine, function.entryEventLine);
+    EXPECT_GT(anchor.entryLine, 0U);
+    EXPECT_EQ(function.wordAtFirstSync, 1U);
+    EXPECT_EQ(anchor.cachedFlags | anchor.cachedSync | anchor.reserved[0] | anchor.reserved[1], 0U);
+  }
+}
+
+TEST(Frame, UnitBlockTellsTheLibrary) {
+  callAll();
+  const TRC1_UnitBlock &unit = *seen(translateString).atFirstSync.unit;
+  EXPECT_EQ(unit.formatVersion, 400U);
+  EXPECT_EQ(unit.attributes, 0x30000000U);
+  const struct {
+    const char *reason;
+    const char *text;
+    uint32_t length;
+    const char *expected;
+  } texts[] = {
+      {"file", unit.fileName, unit.fileNameLength, "nls2.cpp"},
+      {"date, with two blanks", unit.buildDate, unit.buildDateLength, "Mar  9 2007"},
+      {"time", unit.buildTime, unit.buildTimeLength, "19:13:31"},
+      {"level", unit.level, unit.levelLength, "100"},
+      {"mark", unit.mark, unit.markLength, "*"},
+  };
+  for (const auto &text : texts) {
+    EXPECT_STREQ(text.text, text.expected) << text.reason;
+    EXPECT_EQ(text.length, std::strlen(text.expected)) << text.reason;
+  }
+  EXPECT_EQ(unit.reserved[0] | unit.reserved[1], 0U);
+  EXPECT_STREQ(unit.buildStamp(), NLS2_BuildStamp());
+}
+
+TEST(Frame, SyncsOnTheFirstCallAndWheneverTheWordHasChanged) {
+  const Recording recording(support::traceEvents);
+  translate(0);
+  const SeenFunction before = seen(translateString);
+  EXPECT_NE(before.anchor->sync, before.atFirstSync.sync) << "the host has moved the pointer";
+  const TRC1_EntryBlock settled = *before.anchor;
+  translate(0);
+  translate(1);
+  EXPECT_EQ(seen(translateString).syncs, before.syncs);
+  EXPECT_EQ(std::memcmp(before.anchor, &settled, sizeof settled), 0) << "the library wrote to it";
+  support::changeSyncWord();
+  translate(0);
+  translate(0);
+  EXPECT_EQ(seen(translateString).syncs, before.syncs + 1);
+  EXPECT_EQ(*before.atFirstSync.sync, 1U) << "the library's own word is the host's to change";
+}
+
+// The last line of `function` starts with `name=`, its first is its entry, and calls nest.
+void expectNestedEvents(const std::vector<std::string> &lines, int functions) {
+  std::vector<std::string> open;
+  int entries = 0;
+  for (const std::string &line : lines) {
+    const size_t sign = line.find_first_of(">=:#");
+    const std::string name = line.substr(0, sign);
+    if (line[sign] == '>') {
+      open.push_back(name);
+      ++entries;
+    } else {
+      ASSERT_FALSE(open.empty()) << line;
+      EXPECT_EQ(open.back(), name) << line;
+      if (line[sign] == '=') {
+        open.pop_back();
+      }
+    }
+  }
+  EXPECT_TRUE(open.empty());
+  EXPECT_EQ(entries, functions);
+}
+
+TEST(Frame, EveryCallHasOneEntryAndOneExitAndTheSameResultUnderAllFlags) {
+  const auto isEvent = [](const std::string &line) {
+    return line.find("> entry") != std::string::npos || line.find('=') != std::string::npos;
+  };
+  for (const Call &call : calls) {
+    SCOPED_TRACE(call.reason);
+    const int32_t untraced = call.run();
+    std::vector<std::string> events;
+    std::vector<std::string> details;
+    std::vector<std::string> all;
+    const std::pair<support::TraceFlags, std::vector<std::string> *> runs[] = {
+        {support::traceEvents, &events},
+        {support::traceDetail, &details},
+        {support::traceAll, &all}};
+    for (const auto &[flags, lines] : runs) {
+      const Recording recording(flags);
+      EXPECT_EQ(call.run(), untraced) << flags;
+      *lines = recording.lines();
+    }
+    const Recording quiet(support::traceOff);
+    EXPECT_EQ(call.run(), untraced);
+    EXPECT_TRUE(quiet.lines().empty());
+
+    expectNestedEvents(all, call.functions);
+    expectNestedEvents(events, call.functions);
+    EXPECT_TRUE(std::all_of(events.begin(), events.end(), isEvent));
+    EXPECT_FALSE(details.empty() || std::any_of(details.begin(), details.end(), isEvent));
+    EXPECT_EQ(events.size() + details.size(), all.size());
+  }
+}
+
+TEST(Frame, OtherFlagBitsMeanNothing) {
+  const Recording recording(static_cast<support::TraceFlags>(~0x50U));
+  callAll();
+  EXPECT_TRUE(recording.lines().empty());
+}
+
+} // namespace
