@@ -115,3 +115,15 @@ extern "C" void ucnv_close(UConverter *converter) {
   }
   original(converter);
 }
+
+extern "C" void ucnv_convertEx(UConverter *to, UConverter *from, char **target,
+                               const char *targetLimit, const char **source,
+                               const char *sourceLimit, UChar *pivotStart, UChar **pivotSource,
+                               UChar **pivotTarget, const UChar *pivotLimit, UBool reset,
+                               UBool flush, UErrorCode *error) {
+  static const auto original = NEXT(ucnv_convertEx);
+  if (!refuse("ucnv_convertEx", error)) {
+    original(to, from, target, targetLimit, source, sourceLimit, pivotStart, pivotSource,
+             pivotTarget, pivotLimit, reset, flush, error);
+  }
+}

@@ -30,8 +30,8 @@ public:
   FailingOpens &operator=(const FailingOpens &) = delete;
 };
 
-// While it lives, the nth call (from 1) of ucnv_toUChars or ucnv_fromUChars, whichever is named,
-// fails with `error`.
+// While it lives, the nth call (from 1) of ucnv_convertEx, ucnv_toUChars or ucnv_fromUChars,
+// whichever is named, fails with `error`.
 class FailingConversion {
 public:
   FailingConversion(const char *function, int call, UErrorCode error);
