@@ -240,8 +240,8 @@ extern NLS2_API const CcsidMapEntry ccsidMap[NLS2_CCSID_MAP_RECORDS];
  * name means several tables); or ICU's failure, U_FILE_ACCESS_ERROR (4) for a number or name that
  * this ICU has no converter for (57355 to 57357 with ICU's standard data, and 57364).
  *
- * Surprises: 57372 opens ICU's UTF-16 with a signature, and it, 57360, 57361 and 57369 leave the
- * flag at 0 although their strings end in more than one zero byte. */
+ * Surprises: ICU reads -37 as 37. 57372 opens ICU's UTF-16 with a signature, and it, 57360, 57361
+ * and 57369 leave the flag at 0 although their strings end in more than one zero byte. */
 NLS2_API struct UConverter *NLS2_MapCodepageIdToName(int32_t codepage, int32_t *twoNullTerminator,
                                                      int32_t *status);
 
