@@ -98,7 +98,7 @@ inline Outcome padded(const Request &request, std::u16string work, size_t textLe
       return {0, U_ILLEGAL_ARGUMENT_ERROR, 0, dest};
     }
     // ICU takes -1 for a null-terminated text.
-    bytes = encode(request.dest, left < 0 ? std::u16string(work.c_str())
+    bytes = encode(request.dest, left < 0 ? work.substr(0, work.find(u'\0'))
                                           : work.substr(0, static_cast<size_t>(left)));
     put(dest, bytes, room);
     if (bytes.size() > static_cast<size_t>(room)) {
@@ -118,7 +118,7 @@ inline Outcome shaped(const Request &request, const std::string &source, std::st
   }
   std::fill(work.begin() + static_cast<std::ptrdiff_t>(end), work.end(), u'\0');
   work.resize(std::max(work.size(), static_cast<size_t>(request.destLen)) + 1);
-  const std::u16string text = work.c_str();
+  const std::u16string text = work.substr(0, work.find(u'\0'));
   const std::string bytes = encode(request.dest, text);
   const int32_t terminator = (request.options & 8) != 0 ? request.dest.terminator : 0;
   const int32_t room = request.destLen - terminator;
@@ -142,7 +142,7 @@ inline Outcome translate(const Request &request, const std::string &dest) {
     return {0, 0, 0, dest};
   }
   const std::string source =
-      request.sourceLen < 0 ? std::string(request.bytes.c_str()) : request.bytes;
+      request.sourceLen < 0 ? request.bytes.substr(0, request.bytes.find('\0')) : request.bytes;
   return request.options == 0 || request.options == 8 ? direct(request, source, dest)
                                                       : shaped(request, source, dest);
 }

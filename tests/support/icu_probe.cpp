@@ -36,7 +36,7 @@ Function next(Function /*type*/, const char *name) {
 // ICU's exported names carry its version.
 #define TEXT_OF(symbol) #symbol
 #define NAME_OF(symbol) TEXT_OF(symbol)
-#define NEXT(function) next(&function, NAME_OF(function))
+#define NEXT(function) next(&(function), NAME_OF(function))
 
 bool refuse(UErrorCode *error) {
   if (failure == U_ZERO_ERROR) {
