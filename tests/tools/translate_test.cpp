@@ -236,7 +236,7 @@ TEST(Translate, UsageErrors) {
       {"translate --from 37 --to 1208 --record-length 1 --keep-blanks --strip", "--strip"},
       {"translate --from 37 --to 1208 --record-length 1 --newline crlf", "crlf"},
       {"translate --from 37 --to 1208 --record-length 1 --wrong", "--wrong"},
-      {"translate --from 37 --to 1208 --record-length 1 a b c", "c"},
+      {"translate --from 37 --to 1208 --record-length 1 in out", "out"},
       {"locales extra", "extra"},
   };
   for (const auto &c : cases) {

@@ -28,7 +28,7 @@ EBCDIC.
 
 The first record that fails ends the run: standard output then has the records before it; an output
 file is not touched, since it takes its name, and the place of an older one, at the end. A last
-record shorter than N is such a failure. INPUT and OUTPUT may be the same file.)";
+record shorter than N is such a failure. The input file may be the output file too.)";
 
 struct Arguments {
   TranslateOptions options;
@@ -77,7 +77,7 @@ void addTranslateCommand(CLI::App &app) {
           "what to put behind every output record: none (default) or lf")
       ->check(CLI::IsMember({"none", "lf"}));
   command.add_option("INPUT", arguments->input, "file to read; standard input if - or not given");
-  command.add_option("-o,--output,OUTPUT", arguments->output,
+  command.add_option("-o,--output", arguments->output,
                      "file to write; standard output if - or not given");
   command.footer(help);
   command.callback(
