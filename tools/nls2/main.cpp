@@ -50,11 +50,7 @@ int run(CLI::App &app, int argc, char **argv) {
   }
 }
 
-} // namespace
-
-int main(int argc, char **argv) {
-  occupyStandardStreams();
-  turnSignalsIntoErrors();
+int runCommand(int argc, char **argv) {
   CLI::App app{"National-language support from the command line.", "nls2"};
   app.set_version_flag("--version", std::string(NLS2_BuildStamp()));
   app.require_subcommand(1);
@@ -64,4 +60,16 @@ int main(int argc, char **argv) {
   addLocalesCommand(app);
   addCodepagesCommand(app);
   return run(app, argc, argv);
+}
+
+} // namespace
+
+int main(int argc, char **argv) {
+  occupyStandardStreams();
+  turnSignalsIntoErrors();
+  try {
+    return runCommand(argc, argv);
+  } catch (...) { // standard error itself fails
+    return exitFailed;
+  }
 }

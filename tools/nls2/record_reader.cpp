@@ -8,7 +8,7 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr std::size_t usualChunk = 128 * 1024;
+constexpr std::size_t usualChunk = std::size_t{128} * 1024;
 
 } // namespace
 
