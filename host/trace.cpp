@@ -60,9 +60,9 @@ Settings theSettings;
 pthread_once_t theSettingsAreRead = PTHREAD_ONCE_INIT;
 
 void readSettings() {
-  theSettings.flags = flagsOf(std::getenv("ZELHOST_TRACE"));
+  theSettings.flags = flagsOf(secure_getenv("ZELHOST_TRACE"));
   theSettings.file =
-      theSettings.flags != 0 ? openedFile(std::getenv("ZELHOST_TRACE_FILE")) : stderr;
+      theSettings.flags != 0 ? openedFile(secure_getenv("ZELHOST_TRACE_FILE")) : stderr;
 }
 
 const Settings &settings() {
