@@ -1,0 +1,113 @@
+/* Calls every function from C, and pins the layout of every public record. */
+
+#include "nls2.h"
+#include "sys1.h"
+#include "trc1.h"
+
+#include <stddef.h>
+#include <stdio.h>
+#include <string.h>
+#include <unicode/ucnv.h>
+
+/* C99 has no static assertion: an array of negative size stops the compiler. */
+#define JOIN_(a, b) a##b
+#define JOIN(a, b) JOIN_(a, b)
+#define HOLDS(condition) typedef char JOIN(holds_, __LINE__)[(condition) ? 1 : -1]
+/* Offsets with 64-bit and with 32-bit pointers. */
+#define AT(record, field, wide, narrow)                                                            \
+  HOLDS(offsetof(record, field) == (sizeof(void *) == 8 ? (wide) : (narrow)))
+
+HOLDS(sizeof(LocaleMapEntry) == 276);
+AT(LocaleMapEntry, languageId, 0, 0);
+AT(LocaleMapEntry, asciiCcsid, 4, 4);
+AT(LocaleMapEntry, ebcdicCcsid, 8, 8);
+AT(LocaleMapEntry, localeName, 12, 12);
+AT(LocaleMapEntry, shortName, 144, 144);
+HOLDS(sizeof(CcsidMapEntry) == 136);
+AT(CcsidMapEntry, name, 0, 0);
+AT(CcsidMapEntry, ccsid, 132, 132);
+
+HOLDS(sizeof(TRC1_UnitBlock) == (sizeof(void *) == 8 ? 104 : 60));
+AT(TRC1_UnitBlock, formatVersion, 0, 0);
+AT(TRC1_UnitBlock, attributes, 4, 4);
+AT(TRC1_UnitBlock, fileName, 8, 8);
+AT(TRC1_UnitBlock, fileNameLength, 16, 12);
+AT(TRC1_UnitBlock, buildDate, 24, 16);
+AT(TRC1_UnitBlock, buildDateLength, 32, 20);
+AT(TRC1_UnitBlock, buildTime, 40, 24);
+AT(TRC1_UnitBlock, buildTimeLength, 48, 28);
+AT(TRC1_UnitBlock, level, 56, 32);
+AT(TRC1_UnitBlock, levelLength, 64, 36);
+AT(TRC1_UnitBlock, mark, 72, 40);
+AT(TRC1_UnitBlock, markLength, 80, 44);
+AT(TRC1_UnitBlock, reserved, 84, 48);
+AT(TRC1_UnitBlock, buildStamp, 96, 56);
+
+HOLDS(sizeof(TRC1_EntryBlock) == (sizeof(void *) == 8 ? 56 : 44));
+AT(TRC1_EntryBlock, unit, 0, 0);
+AT(TRC1_EntryBlock, functionName, 8, 4);
+AT(TRC1_EntryBlock, functionNameLength, 16, 8);
+AT(TRC1_EntryBlock, entryLine, 20, 12);
+AT(TRC1_EntryBlock, sync, 24, 16);
+AT(TRC1_EntryBlock, attributes, 32, 20);
+AT(TRC1_EntryBlock, cachedFlags, 36, 24);
+AT(TRC1_EntryBlock, cachedSync, 40, 28);
+AT(TRC1_EntryBlock, reserved, 44, 32);
+
+static int failures;
+
+static void check(int holds, const char *what) {
+  if (!holds) {
+    fprintf(stderr, "FAILED: %s\n", what);
+    ++failures;
+  }
+}
+#define CHECK(condition) check((condition) ? 1 : 0, #condition)
+
+static void callLocales(void) {
+  const LocaleMapEntry *german = NLS2_GetLocaleMapEntry(localeMap[1].languageId);
+  CHECK(german != NULL && german->languageId == localeMap[1].languageId);
+  CHECK(german >= localeMap && german <= &localeMap[1]);
+  CHECK(localeMap[NLS2_LOCALE_MAP_RECORDS - 1].languageId == NLS2_LANGUAGE_ID_END);
+}
+
+static void callCodePages(void) {
+  int32_t status = -1;
+  int32_t twoNulls = -1;
+  UConverter *converter = NLS2_MapCodepageIdToName(1200, &twoNulls, &status);
+  CHECK(converter != NULL && twoNulls == 1 && status <= 0);
+  CHECK(converter != NULL && ucnv_getMinCharSize(converter) == 2);
+  ucnv_close(converter);
+  CHECK(NLS2_MapWindowsNameToCCSID("windows-936", &status) == 936 && status == 0);
+  CHECK(ccsidMap[NLS2_CCSID_MAP_RECORDS - 1].ccsid == NLS2_CCSID_MAP_END);
+}
+
+static void callConversion(void) {
+  char field[5] = "....";
+  int32_t consumed = -1;
+  int32_t status = -1;
+  CHECK(NLS2_TranslateString(1208, field, 4, 37, "\xC1\xC2", 2, &consumed, NLS2_STRING_FILL,
+                             &status) == 4);
+  CHECK(status == 0 && strcmp(field, "AB  ") == 0);
+}
+
+static void callHost(void) {
+  static uint32_t syncWord = 5;
+  static TRC1_UnitBlock unit;
+  uint32_t lock[SYS1_LOCK_SIZE / sizeof(uint32_t)] = {0};
+  TRC1_EntryBlock anchor = {&unit, "callHost", 8, 1, &syncWord, TRC1_ENTRY_PRIVATE, 9, 0, {0, 0}};
+  CHECK(TRC1_Sync(&anchor) == 0 && anchor.cachedFlags == 0 && anchor.cachedSync == syncWord);
+  SYS1_GetLock(lock);
+  CHECK(lock[0] != 0);
+  SYS1_ReleaseLock(lock);
+  CHECK(lock[0] == 0);
+}
+
+int main(void) {
+  callLocales();
+  callCodePages();
+  callConversion();
+  callHost();
+  CHECK(strncmp(NLS2_BuildStamp(), "zelnls2 ", 8) == 0);
+  return failures == 0 ? 0 : 1;
+}
