@@ -159,7 +159,7 @@ int32_t paddedLength(const PaddedTranslation &call, const Field &field) {
 
 void appendBlanks(Field &field, int32_t maximumBufferLength) {
   for (int32_t i = field.textLength; i < maximumBufferLength; ++i) {
-    field.units[i] = fillCharacter;
+    field.units[static_cast<std::size_t>(i)] = fillCharacter;
   }
 }
 

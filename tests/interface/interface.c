@@ -8,6 +8,7 @@
 #include <stdio.h>
 #include <string.h>
 #include <unicode/ucnv.h>
+#include <unicode/uloc.h>
 
 /* C99 has no static assertion: an array of negative size stops the compiler. */
 #define JOIN_(a, b) a##b
@@ -23,6 +24,11 @@ AT(LocaleMapEntry, asciiCcsid, 4, 4);
 AT(LocaleMapEntry, ebcdicCcsid, 8, 8);
 AT(LocaleMapEntry, localeName, 12, 12);
 AT(LocaleMapEntry, shortName, 144, 144);
+HOLDS(sizeof(NLS2_Locale) == (sizeof(void *) == 8 ? 152 : 148));
+AT(NLS2_Locale, languageId, 0, 0);
+AT(NLS2_Locale, codepage, 4, 4);
+AT(NLS2_Locale, icuLocale, 8, 8);
+AT(NLS2_Locale, pNext, 144, 144);
 HOLDS(sizeof(CcsidMapEntry) == 136);
 AT(CcsidMapEntry, name, 0, 0);
 AT(CcsidMapEntry, ccsid, 132, 132);
@@ -64,11 +70,46 @@ static void check(int holds, const char *what) {
 }
 #define CHECK(condition) check((condition) ? 1 : 0, #condition)
 
-static void callLocales(void) {
-  const LocaleMapEntry *german = NLS2_GetLocaleMapEntry(localeMap[1].languageId);
-  CHECK(german != NULL && german->languageId == localeMap[1].languageId);
-  CHECK(german >= localeMap && german <= &localeMap[1]);
+static const LocaleMapEntry *recordOf(const char *shortName) {
+  int32_t status = -1;
+  const LocaleMapEntry *record =
+      NLS2_GetLocaleMapEntry(NLS2_LanguageIDFromShortPosixName(shortName, &status));
+  CHECK(status == 0 && record != NULL && strcmp(record->shortName, shortName) == 0);
+  return record != NULL ? record : localeMap;
+}
+
+static void callLocaleMap(void) {
+  const LocaleMapEntry *german = recordOf("de_DE");
+  char name[132];
   CHECK(localeMap[NLS2_LOCALE_MAP_RECORDS - 1].languageId == NLS2_LANGUAGE_ID_END);
+  CHECK(NLS2_GetLanguageName(german->languageId, name, sizeof name) == 0);
+  CHECK(strcmp(name, "de") == 0);
+  CHECK(NLS2_GetShortPosixName(german->languageId, name, sizeof name) == 0);
+  CHECK(strcmp(name, "de_DE") == 0);
+}
+
+/* Makes an object each way, and releases it. */
+static void callObjects(void) {
+  int32_t status = -1;
+  NLS2_Locale *german = NLS2_GetLocale(recordOf("de_DE")->languageId, 273, 0, &status);
+  CHECK(german != NULL && status == 0 && pLocaleObjectList == german);
+  CHECK(NLS2_GetLocaleNumInfo(german, NLS2_ATTRIBUTE_CODEPAGE, &status) == 273 && status == 0);
+  CHECK(NLS2_SetLocaleNumInfo(german, NLS2_ATTRIBUTE_CODEPAGE, 1141, 0) == 0);
+  CHECK(NLS2_GetLocaleCodepageId(german, &status) == 1141 && status == 0);
+  CHECK(NLS2_ReleaseLocale(german) == 0);
+  CHECK(NLS2_ValidateLocale(german) == NLS2_ERR_INVALID_LOCALE);
+  NLS2_Locale *made[3];
+  made[0] = NLS2_allocateLocale(&status);
+  made[1] = NLS2_GetThreadLocale();
+  made[2] = NLS2_ConvertNativeLocale(NULL, NLS2_LOCALE_DEFAULT, &status);
+  for (int i = 0; i < 3; ++i) {
+    CHECK(NLS2_ValidateLocale(made[i]) == 0);
+    CHECK(NLS2_ReleaseLocale(made[i]) == 0);
+  }
+  CHECK(pLocaleObjectList == NULL && LocaleObjectList_Lock[0] == 0);
+  NLS2_Locale own = {0, 0, "", NULL};
+  CHECK(NLS2_initLocaleObject(&own) == 0 && strcmp(own.icuLocale, "en_US") == 0);
+  CHECK(NLS2_SetLocaleFromNative("tlh", 0) == NLS2_ERR_INVALID_LOCALE);
 }
 
 static void callCodePages(void) {
@@ -79,6 +120,9 @@ static void callCodePages(void) {
   CHECK(converter != NULL && ucnv_getMinCharSize(converter) == 2);
   ucnv_close(converter);
   CHECK(NLS2_MapWindowsNameToCCSID("windows-936", &status) == 936 && status == 0);
+  char name[UCNV_MAX_CONVERTER_NAME_LENGTH];
+  CHECK(NLS2_GetCodepageName(1208, name, sizeof name) == 0 && strcmp(name, "UTF-8") == 0);
+  CHECK(NLS2_GetCodepageId("utf8", &status) == 1208 && status == 0);
   CHECK(ccsidMap[NLS2_CCSID_MAP_RECORDS - 1].ccsid == NLS2_CCSID_MAP_END);
 }
 
@@ -104,7 +148,11 @@ static void callHost(void) {
 }
 
 int main(void) {
-  callLocales();
+  UErrorCode error = U_ZERO_ERROR;
+  uloc_setDefault("en_US", &error);
+  CHECK(NLS2_Init() == 0);
+  callLocaleMap();
+  callObjects();
   callCodePages();
   callConversion();
   callHost();
