@@ -44,9 +44,9 @@ TEST(Lock, ExcludesAllOthersAndKeepsToItsBytes) {
   constexpr int rounds = 20000;
   GuardedLock guarded;
   int counter = 0; // not atomic: the lock alone protects it
-  std::vector<std::thread> threads;
-  for (int i = 0; i < threadCount; ++i) {
-    threads.emplace_back([&] {
+  std::thread threads[threadCount];
+  for (std::thread &thread : threads) {
+    thread = std::thread([&] {
       for (int round = 0; round < rounds; ++round) {
         SYS1_GetLock(guarded.lock);
         const int seen = counter;
@@ -72,9 +72,9 @@ TEST(Lock, PutsWaitersToSleepAndWakesThemAll) {
   std::atomic<int> entered{0};
   std::atomic<std::chrono::nanoseconds> mostCpuTime{0ns};
   SYS1_GetLock(guarded.lock);
-  std::vector<std::thread> threads;
-  for (int i = 0; i < 4; ++i) {
-    threads.emplace_back([&] {
+  std::thread threads[4];
+  for (std::thread &thread : threads) {
+    thread = std::thread([&] {
       const auto before = cpuTimeOfThisThread();
       ++waiting;
       SYS1_GetLock(guarded.lock);

@@ -16,7 +16,8 @@
 #define HOLDS(condition) typedef char JOIN(holds_, __LINE__)[(condition) ? 1 : -1]
 /* Offsets with 64-bit and with 32-bit pointers. */
 #define AT(record, field, wide, narrow)                                                            \
-  HOLDS(offsetof(record, field) == (sizeof(void *) == 8 ? (wide) : (narrow)))
+  HOLDS((sizeof(void *) == 8 && offsetof(record, field) == (wide)) ||                              \
+        (sizeof(void *) == 4 && offsetof(record, field) == (narrow)))
 
 HOLDS(sizeof(LocaleMapEntry) == 276);
 AT(LocaleMapEntry, languageId, 0, 0);
