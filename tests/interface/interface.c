@@ -136,6 +136,50 @@ static void callConversion(void) {
   CHECK(status == 0 && strcmp(field, "AB  ") == 0);
 }
 
+/* One German letter in EBCDIC, UTF-8 and UTF-16, each way. */
+static void callUtfConversion(const NLS2_Locale *german) {
+  char bytes[8] = "";
+  UChar units[8] = {0};
+  int32_t status = 0;
+  CHECK(NLS2_toUTF8(german, "\xC0", 1, bytes, 8, &status) == 2 && status == 0);
+  CHECK(strcmp(bytes, "\xC3\xA4") == 0);
+  CHECK(NLS2_fromUTF8(german, bytes, 8, "\xC3\xA4", 2, &status) == 1 && bytes[0] == '\xC0');
+  CHECK(NLS2_toUTF16(german, "\xC0", 1, units, 8, &status) == 1 && units[0] == 0xE4);
+  CHECK(NLS2_fromUTF16(german, units, 8, bytes, 1, &status) == 1 && bytes[0] == '\xC0');
+  /* In place: source and destination are one buffer. */
+  memcpy(bytes, "\xC1\xC2", 2);
+  NLS2_StringToUnicode(german, bytes, 2, bytes, 2, &status);
+  CHECK(status <= 0 && memcmp(bytes, "AB", 2) == 0);
+  NLS2_UnicodeToString(german, bytes, 2, bytes, 2, &status);
+  CHECK(status <= 0 && memcmp(bytes, "\xC1\xC2", 2) == 0);
+}
+
+static void callLengths(const NLS2_Locale *german, const NLS2_Locale *utf8) {
+  int32_t status = 0;
+  CHECK(NLS2_ConversionRatio(utf8, german, &status) == 3 && status == 0);
+  CHECK(NLS2_Strlen(german, "\xC1\xC2", 0, &status) == 2 && status == 0);
+  CHECK(NLS2_ByteLength(utf8, "\xE6\x97\xA5", &status) == 3 && status == 0);
+  CHECK(NLS2_StringToDouble(NULL, NULL) == 0.0);
+}
+
+static void callText(const NLS2_Locale *utf8) {
+  int32_t status = -1;
+  CHECK(NLS2_Strcoll(utf8, "a", 1, "B ", 2, CHARBASED | SORT_IGNORETRAILING, &status) == -1);
+  CHECK(status == 0);
+  CHECK(NLS2_Findstr(utf8, "Haystack", 8, "STACK", 5, IGNORECASE) == 1);
+  CHECK(NLS2_MapString(utf8, NULL, 0, "a", -1, NLS2_MAP_UPPERCASE) == U_BUFFER_OVERFLOW_ERROR);
+}
+
+static void callWithObjects(void) {
+  int32_t status = -1;
+  NLS2_Locale *german = NLS2_GetLocale(recordOf("de_DE")->languageId, 1141, 0, &status);
+  NLS2_Locale *utf8 = NLS2_GetLocale(recordOf("de_DE")->languageId, 1208, 0, &status);
+  callUtfConversion(german);
+  callLengths(german, utf8);
+  callText(utf8);
+  CHECK(NLS2_ReleaseLocale(german) == 0 && NLS2_ReleaseLocale(utf8) == 0);
+}
+
 static void callHost(void) {
   static uint32_t syncWord = 5;
   static TRC1_UnitBlock unit;
@@ -156,6 +200,7 @@ int main(void) {
   callObjects();
   callCodePages();
   callConversion();
+  callWithObjects();
   callHost();
   CHECK(strncmp(NLS2_BuildStamp(), "zelnls2 ", 8) == 0);
   return failures == 0 ? 0 : 1;
