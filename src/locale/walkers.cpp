@@ -2,6 +2,7 @@
 
 #include "locale/walkers.h"
 
+#include <ctime>
 #include <pthread.h>
 #include <sched.h>
 
@@ -23,10 +24,27 @@ std::size_t chooseStripe() {
 
 namespace {
 
+// A walk takes microseconds, so mostly the processor is only offered to it. Where that does not
+// help, the walk may belong to a thread of lower real-time priority that a yield never lets run.
+void giveWay(unsigned attempt) {
+  constexpr unsigned yields = 1000;
+  if (attempt < yields) {
+    sched_yield();
+    return;
+  }
+  // A sleep is a cancellation point, and the caller holds the list's lock.
+  int cancelState = 0;
+  pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelState);
+  const timespec moment{0, 50'000};
+  nanosleep(&moment, nullptr);
+  pthread_setcancelstate(cancelState, &cancelState);
+}
+
 void waitForRound(uint32_t round) {
-  for (detail::Stripe &stripe : detail::stripeTable) {
-    while (stripe.walksOfRound[round].load(std::memory_order_seq_cst) != 0) {
-      sched_yield();
+  for (const detail::Stripe &stripe : detail::stripeTable) {
+    for (unsigned attempt = 0; stripe.walksOfRound[round].load(std::memory_order_seq_cst) != 0;
+         ++attempt) {
+      giveWay(attempt);
     }
   }
 }
@@ -43,13 +61,13 @@ __attribute__((constructor)) void watchForks() { pthread_atfork(nullptr, nullptr
 
 } // namespace
 
-// A walk counts in the round that it read, which may be the one before the current; so both rounds
-// are seen empty once, each while new walks go to the other.
+// Both rounds are seen empty once. The other round goes first: it can hold only walks that read the
+// round just before it was last changed. Then new walks are sent there, and the current one drains.
 void waitForWalkers() {
-  for (int i = 0; i < 2; ++i) {
-    const uint32_t ended = detail::currentRound.fetch_xor(1, std::memory_order_seq_cst);
-    waitForRound(ended);
-  }
+  const uint32_t current = detail::currentRound.load(std::memory_order_relaxed);
+  waitForRound(current ^ 1);
+  detail::currentRound.store(current ^ 1, std::memory_order_relaxed);
+  waitForRound(current);
 }
 
 } // namespace nls2::locale
