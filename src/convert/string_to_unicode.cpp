@@ -5,6 +5,7 @@
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
@@ -50,8 +51,8 @@ int32_t NLS2_StringToUnicode(const NLS2_Locale *pLocale, char *dest, int32_t dle
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_StringToUnicode");
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocale %X, dest %s, dlen %d, src %s, slen2%d.",
-             low32(pLocale), BoundedText(dest, dlen).c_str(), dlen, BoundedText(src, slen).c_str(),
-             slen);
+             low32(pLocale), BoundedText(dest, std::max(dlen, 0)).c_str(), dlen,
+             BoundedText(src, slen).c_str(), slen);
   *status = U_ZERO_ERROR;
   if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
     *status = NLS2_ERR_INVALID_LOCALE;
@@ -87,8 +88,8 @@ int32_t NLS2_UnicodeToString(const NLS2_Locale *pLocale, char *dest, int32_t dle
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_UnicodeToString");
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocale %X, dest %s, dlen %d, src %s, slen %d.",
-             low32(pLocale), BoundedText(dest, dlen).c_str(), dlen, BoundedText(src, slen).c_str(),
-             slen);
+             low32(pLocale), BoundedText(dest, std::max(dlen, 0)).c_str(), dlen,
+             BoundedText(src, slen).c_str(), slen);
   *status = U_ZERO_ERROR;
   if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
     *status = NLS2_ERR_INVALID_LOCALE;

@@ -5,6 +5,7 @@
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
 
+#include <algorithm>
 #include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
 
@@ -18,17 +19,20 @@ using nls2::trace::Trace;
 
 constexpr const char *utf8 = "utf-8";
 
-// One line for both directions; it labels its arguments as NLS2_toUTF8 has them.
+enum class Direction { ToUtf8, FromUtf8 };
+
+// One line for both directions; it labels its arguments as NLS2_toUTF8 has them. An output with a
+// negative capacity has no text at all.
+template <Direction direction>
 void traceInput(Trace trace, const NLS2_Locale *pLocale, const char *second, int32_t third,
                 const char *fourth, int32_t fifth) {
+  constexpr bool toUtf8 = direction == Direction::ToUtf8;
   NLS2_TRACE(
       trace,
       "Input parameters: pLocale %X, pSource %s, sourceLength %d, pTarget %s, targetLength %d.",
-      low32(pLocale), BoundedText(second, third).c_str(), third, BoundedText(fourth, fifth).c_str(),
-      fifth);
+      low32(pLocale), BoundedText(second, toUtf8 ? third : std::max(third, 0)).c_str(), third,
+      BoundedText(fourth, toUtf8 ? std::max(fifth, 0) : fifth).c_str(), fifth);
 }
-
-enum class Direction { ToUtf8, FromUtf8 };
 
 // The converter opened here only lends its name; ucnv_convert opens its own by that name.
 template <Direction direction>
@@ -89,7 +93,7 @@ int32_t NLS2_toUTF8(const NLS2_Locale *pLocale, const char *pSource, int32_t sou
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_toUTF8");
   Frame frame(anchor);
   *status = U_ZERO_ERROR;
-  traceInput(frame, pLocale, pSource, sourceLength, pTarget, targetLength);
+  traceInput<Direction::ToUtf8>(frame, pLocale, pSource, sourceLength, pTarget, targetLength);
   return frame.result(convertByName<Direction::ToUtf8>(frame, pLocale, pTarget, targetLength,
                                                        pSource, sourceLength, status));
 }
@@ -99,7 +103,7 @@ int32_t NLS2_fromUTF8(const NLS2_Locale *pLocale, char *pTarget, int32_t targetL
                       const char *pSource, int32_t sourceLength, int32_t *status) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_fromUTF8");
   Frame frame(anchor);
-  traceInput(frame, pLocale, pTarget, targetLength, pSource, sourceLength);
+  traceInput<Direction::FromUtf8>(frame, pLocale, pTarget, targetLength, pSource, sourceLength);
   return frame.result(convertByName<Direction::FromUtf8>(frame, pLocale, pTarget, targetLength,
                                                          pSource, sourceLength, status));
 }
