@@ -26,7 +26,7 @@ enum class Which { First, Second };
 
 // One more character of a walk: its size, asked for once for the step and once for the sum. Its
 // status is not looked at, since the object is known to be live.
-void walkOn(const NLS2_Locale *pLoc, const char *string, int64_t &offset, int32_t &sum) {
+void walkOn(const NLS2_Locale *pLoc, const char *string, int64_t &offset, int64_t &sum) {
   int32_t ignored = U_ZERO_ERROR;
   const int32_t step = NLS2_ByteLength(pLoc, string + offset, &ignored);
   sum += NLS2_ByteLength(pLoc, string + offset, &ignored);
@@ -38,7 +38,7 @@ void walkOn(const NLS2_Locale *pLoc, const char *string, int64_t &offset, int32_
 template <Which which>
 int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, int16_t given) {
   int64_t offset = 0;
-  int32_t sum = 0;
+  int64_t sum = 0;
   if (given < 0) {
     if constexpr (which == Which::First) {
       NLS2_TRACE(trace, "Determine length of string 1 by looking for null.");
