@@ -82,6 +82,7 @@ int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t /*i
     return frame.result(0);
   }
   NLS2_TRACE(frame, "Open the code page converter.");
+  nls2::codepage::Utf16Text text; // given back after the converter
   UErrorCode error = U_ZERO_ERROR;
   const auto codepage = static_cast<int32_t>(pLocale->codepage);
   const LocalUConverterPointer converter(ucnv_openCCSID(codepage, UCNV_IBM, &error));
@@ -91,7 +92,6 @@ int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t /*i
     return frame.result(0);
   }
   NLS2_TRACE(frame, "Pre-flight to determine size of output buffer.");
-  nls2::codepage::Utf16Text text;
   error = nls2::codepage::measure(text, converter.getAlias(), pString, -1);
   if (error > U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Error pre-flighting to UChars %d.", error);

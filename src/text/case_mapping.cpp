@@ -54,6 +54,8 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
     return frame.result(int32_t{NLS2_ERR_INVALID_LOCALE});
   }
+  Utf16Text text; // the converter goes first
+  Utf16Text mapped;
   UErrorCode error = U_ZERO_ERROR;
   LocalUConverterPointer converter(
       ucnv_openCCSID(static_cast<int32_t>(pLocale->codepage), UCNV_IBM, &error));
@@ -63,7 +65,7 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   // Unlike elsewhere, ICU's report that a first pass has no room is a failure here, so that only an
   // empty text is ever mapped.
   const auto length = static_cast<int32_t>(std::strlen(src));
-  Utf16Text text;
+  error = U_ZERO_ERROR;
   text.length = ucnv_toUChars(converter.getAlias(), nullptr, 0, src, length, &error);
   if (error > U_ZERO_ERROR) {
     return frame.result(int32_t{error});
@@ -75,14 +77,11 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   }
   error = nls2::codepage::convert(text, converter.getAlias(), src, length);
   if (error > U_ZERO_ERROR) {
-    converter.adoptInstead(nullptr);
     return frame.result(int32_t{error});
   }
   // The output is the mapped text, its terminator and the unit behind that.
-  Utf16Text mapped;
   mapped.length = text.length + 1;
   if (!nls2::codepage::allocate(mapped, frame)) {
-    converter.adoptInstead(nullptr);
     return frame.result(int32_t{NLS2_ERR_NO_MEMORY});
   }
   std::memset(mapped.units.get(), 0, mapped.size());
