@@ -329,10 +329,15 @@ NLS2_API int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t 
 
 /* What the six functions below share. pLocale is a live object, whose code page is the other end of
  * the conversion. A length of -1 means null-terminated input. The result is the output's length,
- * without the terminator that ICU adds where there is room; 0 on failure. *status: 0   done 38
- * NLS2_ERR_INVALID_LOCALE 15  the output is too small; partial output. The length needed is not
- * told other  ICU's failure: 4 for a code page that does not open Bytes or characters that do not
- * convert are replaced by ICU's substitutes and are no failure. */
+ * without the terminator that ICU adds where there is room; 0 on failure. Bytes or characters that
+ * do not convert are replaced by ICU's substitutes and are no failure. *status is one of these:
+ *
+ *   0   done
+ *   15  U_BUFFER_OVERFLOW_ERROR: the output is too small; partial output. The length needed is not
+ *       told
+ *   38  NLS2_ERR_INVALID_LOCALE
+ *
+ * or ICU's failure: 1 for a bad length, 4 for a code page that does not open. */
 
 /* Code page to UTF-8. sourceLength and targetLength in bytes. */
 NLS2_API int32_t NLS2_toUTF8(const NLS2_Locale *pLocale, const char *pSource, int32_t sourceLength,
@@ -360,13 +365,15 @@ NLS2_API int32_t NLS2_fromUTF16(const NLS2_Locale *pLocale, const UChar *pSource
 
 /* Code page to UTF-8, in place. The number of the code page goes to ICU as a CCSID: the private
  * numbers fail (4), and 874, 932, 936, 949 and 950 are other tables than NLS2_MapCodepageIdToName
- * opens. dlen and slen in bytes, neither may be -1.
+ * opens. dlen and slen in bytes; slen may not be -1.
  *
- * Surprises: the output is written from src on, over the input, and may go on to dest + dlen. Only
- * one layout works: src and dest are in one buffer, dest at or behind src, with dest + dlen its
- * end, and no character grows, since output overtakes input otherwise. The result is the output's
- * end minus the input's end, so -2 where two bytes fewer were written, and no length. Use
- * NLS2_toUTF8. Other *status: 1 (U_ILLEGAL_ARGUMENT_ERROR) where dest + dlen lies before src. */
+ * Surprises: the output is written from src on, over the input, and may go on to dest + dlen. Of
+ * dest and dlen only that sum counts: it must be an end, at or behind src, within the buffer that
+ * holds src. The layout to use is dest == src and dlen the buffer's size. Text that grows is sound
+ * up to 1,024 UTF-16 units; beyond that the output can overtake the input, and the result is
+ * garbled at status 0. The return value is the output's end minus the input's end, so -2 where two
+ * bytes fewer were written, and no length. Use NLS2_toUTF8. Other *status: 1
+ * (U_ILLEGAL_ARGUMENT_ERROR) for a negative slen and where dest + dlen lies before src. */
 NLS2_API int32_t NLS2_StringToUnicode(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
                                       const char *src, int32_t slen, int32_t *status);
 
@@ -378,9 +385,10 @@ NLS2_API int32_t NLS2_UnicodeToString(const NLS2_Locale *pLocale, char *dest, in
 
 /* How many bytes of the destination's code page to reserve for a byte of the source's, from ICU's
  * largest character sizes D and S (ucnv_getMaxCharSize): 1 for one and the same page, D where S
- * divides D, else the least multiple of S above D. Never too small for a byte; usually too large.
- * *pStatus: 0; NLS2_ERR_INVALID_LOCALE (result 0); or ICU's for a code page that does not open
- * (result 1, not 0). */
+ * divides D, else the least multiple of S above D. Usually too large, but signatures and shifts
+ * back to the initial state come on top: U+00D7 from 819 to 930 is 4 bytes, the ratio 3. *pStatus:
+ * 0; NLS2_ERR_INVALID_LOCALE (result 0); or ICU's for a code page that does not open (result 1, not
+ * 0). */
 NLS2_API int32_t NLS2_ConversionRatio(const NLS2_Locale *pDestinationLocale,
                                       const NLS2_Locale *pSourceLocale, int32_t *pStatus);
 
@@ -419,8 +427,8 @@ enum {
  * With CHARBASED a negative length means null-terminated, and a character that begins before a
  * given length counts whole. Warnings: the walk believes lead bytes, whatever the code page; one
  * just before the end of a string takes it past the terminator or the given length, so the bytes
- * there must be readable. A walked length wraps at 16 bits: 32,768 bytes and more fail with status
- * 1, or compare too little. */
+ * there must be readable. A walked length wraps at 16 bits: 32,768 to 65,534 bytes fail with status
+ * 1, 65,535 compare whole, 65,536 as an empty string, and so on round. */
 NLS2_API int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t String1Length,
                               const char *pString2, int16_t String2Length, uint32_t options,
                               int32_t *pStatus);
@@ -443,15 +451,15 @@ NLS2_API int32_t NLS2_Findstr(const NLS2_Locale *pLocale, const char *pString1, 
 /* Options of NLS2_MapString; exactly one. */
 enum { NLS2_MAP_FOLDCASE = 0x10, NLS2_MAP_UPPERCASE = 0x400, NLS2_MAP_LOWERCASE = 0x800 };
 
-/* Reserved for case mapping, and of no use for it: every text that is not empty ends with 15
+/* Reserved for case mapping, and of no use for it: every text of one character or more ends with 15
  * (U_BUFFER_OVERFLOW_ERROR) and an untouched dest, whatever the options. Only an empty src, which
  * must be null-terminated (slen is traced only), is mapped, into two null characters of the code
- * page.
+ * page, behind a signature where the page writes one. ICU adds a zero byte where dest has room.
  *
- * Result: the bytes written, or a status: 15; NLS2_ERR_INVALID_LOCALE; NLS2_ERR_NO_MEMORY; or
- * ICU's, 4 for a code page that as a CCSID does not open, 15 where dlen is too small (partial
- * output). Lengths and statuses share the numbers. On a 16-bit page any ASCII text is empty, for
- * its first byte is zero. */
+ * Result: the bytes written without that one (2 for 819, 4 for 1200, 6 for 1204), or a status: 15;
+ * NLS2_ERR_INVALID_LOCALE; NLS2_ERR_NO_MEMORY; or ICU's, 4 for a code page that as a CCSID does not
+ * open, 15 where dlen is too small (partial output). Lengths and statuses share the numbers. On a
+ * big-endian 16-bit page any ASCII text is empty, for its first byte is zero. */
 NLS2_API int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
                                 const char *src, int32_t slen, uint32_t options);
 
