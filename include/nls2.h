@@ -43,7 +43,9 @@ extern "C" {
 #define NLS2_API
 #endif
 
-struct UConverter; /* <unicode/ucnv.h> */
+struct UConverter;      /* <unicode/ucnv.h> */
+struct UFILE;           /* <unicode/ustdio.h> */
+struct UResourceBundle; /* <unicode/ures.h> */
 
 /* ---- Status codes ---------------------------------------------------------------------------- */
 
@@ -462,6 +464,119 @@ enum { NLS2_MAP_FOLDCASE = 0x10, NLS2_MAP_UPPERCASE = 0x400, NLS2_MAP_LOWERCASE 
  * big-endian 16-bit page any ASCII text is empty, for its first byte is zero. */
 NLS2_API int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
                                 const char *src, int32_t slen, uint32_t options);
+
+/* ---- Streams --------------------------------------------------------------------------------- */
+
+/* ICU's file streams (<unicode/ustdio.h>). The caller's side is UTF-16, in units; the file's side
+ * is the encoding named at the opening. pLocale must be live and has no other effect: no stream
+ * uses its code page or its name. A stream belongs to one thread at a time.
+ *
+ * Surprises. None of these functions tells of a failing read or write: a write to a full disk
+ * returns its full count, and a directory opens for reading and reads as empty; ferror() on
+ * u_fgetfile() tells. Bytes that do not convert become U+FFFD, and characters that the file's
+ * encoding lacks become its substitution character. A null stream makes ICU crash, except in
+ * NLS2_CloseStream. */
+
+/* Opens a file.
+ *
+ *   filename     a path, handed to the system as it is
+ *   permissions  as for fopen: "r", "w", "a", with "+" to write and read
+ *   encoding     a converter name of ICU's; null for the process's default code page
+ *
+ * Result: the stream, to be closed by NLS2_CloseStream; null for a locale that is not live (the
+ * file is not touched), a file or mode that does not open and an encoding that ICU does not know.
+ *
+ * Surprises: the file is opened before the encoding is looked up, so a "w" with a misspelt encoding
+ * returns null and leaves an empty file, whatever was in it. "UTF-16" writes a byte-order mark and
+ * reads with or without one (then big-endian); "UTF-16LE", "UTF-16BE" and "UTF-8" write none, and
+ * read one as the unit U+FEFF. A stream with an empty encoding has no converter and loses all but
+ * ASCII. */
+NLS2_API struct UFILE *NLS2_OpenStream(const NLS2_Locale *pLocale, const char *filename,
+                                       const char *permissions, const char *encoding);
+
+/* Writes what is buffered and closes the stream; does nothing for a null one. Status as the result:
+ * 0, or NLS2_ERR_INVALID_LOCALE, which leaves the stream open. */
+NLS2_API int32_t NLS2_CloseStream(const NLS2_Locale *pLocale, struct UFILE *file);
+
+/* Writes `len` units (negative: a null-terminated text). Result: the units written; 0 for a locale
+ * that is not live. */
+NLS2_API int32_t NLS2_WriteString(const NLS2_Locale *pLocale, const UChar *pSource, int32_t len,
+                                  struct UFILE *fileHandle);
+
+/* Reads up to `len` units, 0 or more; no terminator is stored. Result: the units read, fewer than
+ * `len` only at the end of the file; 0 there and for a locale that is not live. A surrogate pair
+ * may be cut between two reads.
+ *
+ * Warning: the stream stands second here and in NLS2_Fgets, last in the two that write. A negative
+ * len is undefined behaviour. */
+NLS2_API int32_t NLS2_ReadString(const NLS2_Locale *pLocale, struct UFILE *fileHandle, UChar *pDest,
+                                 int32_t len);
+
+/* Writes a null-terminated text and a line feed (U+000A). Result: the units written, line feed
+ * included; 0 for a locale that is not live. */
+NLS2_API int32_t NLS2_Fputs(const NLS2_Locale *pLocale, const UChar *pString,
+                            struct UFILE *fileHandle);
+
+/* Reads one line with its end, at most len - 1 units, and stores a terminator behind it.
+ *
+ * A line ends in U+000A, U+000B, U+000C, U+000D (with a U+000A that follows), U+0085, U+2028 or
+ * U+2029. pDest needs room for `len` units, and is traced as it is before the call.
+ *
+ * Result: pDest; null at the end of the file, with a len below 1, and for a locale that is not
+ * live. A len of 1 gives an empty text at every call. A null inside a line cannot be told from the
+ * terminator: NLS2_ReadString counts. */
+NLS2_API UChar *NLS2_Fgets(const NLS2_Locale *pLocale, struct UFILE *fileHandle, UChar *pDest,
+                           int32_t len);
+
+/* Hands the file what is buffered, and ends a shift sequence that the encoding has open. */
+NLS2_API void NLS2_Fflush(struct UFILE *fileHandle);
+
+/* Flushes, and goes back to the file's beginning. */
+NLS2_API void NLS2_Frewind(struct UFILE *fileHandle);
+
+/* The Unicode encoding whose signature (byte-order mark) a text begins with.
+ *
+ *   source, sourceLength  the text's first bytes; -1: null-terminated
+ *   pSignatureLength      receives the signature's length in bytes; 0 where there is none
+ *
+ * Result: ICU's name of the encoding ("UTF-8", "UTF-16LE", "UTF-32BE", "SCSU" ...), a static text;
+ * null where there is none. *pStatus: 0; or ICU's, 1 (U_ILLEGAL_ARGUMENT_ERROR) for a null source
+ * or a length below -1. Five bytes of the text are enough.
+ *
+ * Surprise: FF FE 00 00 is UTF-32LE, even where it begins a text in UTF-16LE. */
+NLS2_API const char *NLS2_detectUnicodeSignature(const char *source, int32_t sourceLength,
+                                                 int32_t *pSignatureLength, int32_t *pStatus);
+
+/* ---- Resource bundles ------------------------------------------------------------------------ */
+
+/* Opens ICU's resource bundle (<unicode/ures.h>) for an object's locale name.
+ *
+ *   packageName  the data's package or path, as ures_open takes it: a directory of .res files, or
+ *                one and a basename; null for ICU's own data
+ *
+ * Result: the bundle, to be closed by NLS2_ResourceClose; null on failure. *pStatus: 0; a warning
+ * of ICU's where another bundle stands in, -128 (U_USING_FALLBACK_WARNING) for one of a parent of
+ * the locale, -127 (U_USING_DEFAULT_WARNING) for that of the process's default locale or the root
+ * bundle; NLS2_ERR_INVALID_LOCALE; or ICU's failure, 2 (U_MISSING_RESOURCE_ERROR) where there is no
+ * bundle at all.
+ *
+ * Surprise: for a language without a bundle the process's default locale comes before the root. */
+NLS2_API struct UResourceBundle *NLS2_ResourceOpen(const char *packageName,
+                                                   const NLS2_Locale *pLocale, int32_t *pStatus);
+
+/* Closes a bundle; the strings that came from it end with it. */
+NLS2_API void NLS2_ResourceClose(struct UResourceBundle *bundle);
+
+/* The string that a bundle, or a parent of it, holds under a key.
+ *
+ * Result: the string in UTF-16, whatever the code page of the locale object; it is null-terminated,
+ * belongs to the bundle and is valid until the bundle is closed. Null on failure. *pLength: its
+ * length in units. *pStatus: 0; -128 or -127 (as above) where a parent or the root bundle gave it;
+ * or ICU's failure: 2 (U_MISSING_RESOURCE_ERROR) for a key that none of them has, 17
+ * (U_RESOURCE_TYPE_MISMATCH) where it names no string, 1 (U_ILLEGAL_ARGUMENT_ERROR) for a null
+ * bundle. */
+NLS2_API const UChar *NLS2_GetStringByKey(const struct UResourceBundle *bundle, const char *key,
+                                          int32_t *pLength, int32_t *pStatus);
 
 /* ---- Build stamp ----------------------------------------------------------------------------- */
 
