@@ -1,4 +1,5 @@
-// Makes the heap refuse. Linking it into a program puts its realloc before the C library's.
+// Makes the heap refuse. Linking it into a program puts its malloc and realloc before the C
+// library's.
 #pragma once
 
 #include <cstddef>
@@ -19,6 +20,15 @@ public:
   ~FailingReallocs();
   FailingReallocs(const FailingReallocs &) = delete;
   FailingReallocs &operator=(const FailingReallocs &) = delete;
+};
+
+// The same for every malloc of this size.
+class FailingMallocs {
+public:
+  explicit FailingMallocs(std::size_t size);
+  ~FailingMallocs();
+  FailingMallocs(const FailingMallocs &) = delete;
+  FailingMallocs &operator=(const FailingMallocs &) = delete;
 };
 
 } // namespace support
