@@ -473,8 +473,8 @@ NLS2_API int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t 
  *
  * Surprises. None of these functions tells of a failing read or write: a write to a full disk
  * returns its full count, and a directory opens for reading and reads as empty; ferror() on
- * u_fgetfile() tells. Bytes that do not convert become U+FFFD, and characters that the file's
- * encoding lacks become its substitution character. A null stream makes ICU crash, except in
+ * u_fgetfile() tells. Bytes that do not convert become U+FFFD or U+001A, and characters that the
+ * file's encoding lacks become its substitution character. A null stream makes ICU crash, except in
  * NLS2_CloseStream. */
 
 /* Opens a file.

@@ -9,5 +9,7 @@ namespace nls2::tool {
 void addTranslateCommand(CLI::App &app);
 void addLocalesCommand(CLI::App &app);
 void addCodepagesCommand(CLI::App &app);
+void addDetectCommand(CLI::App &app);
+void addCatCommand(CLI::App &app);
 
 } // namespace nls2::tool

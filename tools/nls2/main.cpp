@@ -41,6 +41,8 @@ int run(CLI::App &app, int argc, char **argv) {
     return exitDone;
   } catch (const CLI::ParseError &error) {
     return app.exit(error) == 0 ? exitDone : exitUsage;
+  } catch (const AlreadySaid &outcome) {
+    return outcome.code;
   } catch (const UsageError &error) {
     return complain(exitUsage, error.what());
   } catch (const Failure &error) {
@@ -55,10 +57,13 @@ int runCommand(int argc, char **argv) {
   app.set_version_flag("--version", std::string(NLS2_BuildStamp()));
   app.require_subcommand(1);
   app.failure_message(CLI::FailureMessage::simple);
-  app.footer("Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong.");
+  app.footer("Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong, "
+             "3 nothing found.");
   addTranslateCommand(app);
   addLocalesCommand(app);
   addCodepagesCommand(app);
+  addDetectCommand(app);
+  addCatCommand(app);
   return run(app, argc, argv);
 }
 
