@@ -1,7 +1,9 @@
 // Lengths and the size ratio of code pages: NLS2_ConversionRatio, NLS2_Strlen, NLS2_ByteLength,
 // NLS2_StringToDouble.
 
+#include "codepage/locale_converter.h"
 #include "codepage/utf16_text.h"
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/frame.h"
 
@@ -12,13 +14,9 @@
 namespace {
 
 using icu::LocalUConverterPointer;
+using nls2::codepage::openMapped;
 using nls2::trace::Frame;
 using nls2::trace::low32;
-
-UConverter *openCodepage(const NLS2_Locale *pLocale, int32_t *status) {
-  int32_t twoNull = 0;
-  return NLS2_MapCodepageIdToName(static_cast<int32_t>(pLocale->codepage), &twoNull, status);
-}
 
 // The destination's size itself where the source's divides it, else the next multiple of the
 // source's.
@@ -55,13 +53,13 @@ int32_t NLS2_ConversionRatio(const NLS2_Locale *pDestinationLocale,
     return frame.result(1);
   }
   int32_t status = U_ZERO_ERROR;
-  LocalUConverterPointer destination(openCodepage(pDestinationLocale, &status));
+  LocalUConverterPointer destination(openMapped(pDestinationLocale, &status));
   if (status > U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Could not map destination codepage id to name. %d", status);
     *pStatus = status;
     return frame.result(1);
   }
-  const LocalUConverterPointer source(openCodepage(pSourceLocale, &status));
+  const LocalUConverterPointer source(openMapped(pSourceLocale, &status));
   if (status > U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Could not map source codepage id to name. %d", status);
     *pStatus = status;
@@ -77,17 +75,16 @@ int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t /*i
                     int32_t *pStatus) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_Strlen");
   Frame frame(anchor);
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);
   }
   NLS2_TRACE(frame, "Open the code page converter.");
   nls2::codepage::Utf16Text text; // given back after the converter
   UErrorCode error = U_ZERO_ERROR;
-  const auto codepage = static_cast<int32_t>(pLocale->codepage);
-  const LocalUConverterPointer converter(ucnv_openCCSID(codepage, UCNV_IBM, &error));
+  const LocalUConverterPointer converter(nls2::codepage::openAsCcsid(pLocale, &error));
   if (error > U_ZERO_ERROR) {
-    NLS2_TRACE(frame, "Error opening converter for codepage %d.", codepage);
+    NLS2_TRACE(frame, "Error opening converter for codepage %d.", pLocale->codepage);
     *pStatus = error;
     return frame.result(0);
   }
@@ -118,7 +115,7 @@ int32_t NLS2_ByteLength(const NLS2_Locale *pLocale, const char *pCharacter, int3
   *pStatus = U_ZERO_ERROR;
   NLS2_TRACE(frame, "Input parameters: pLocale %X, pCharacter %X.", low32(pLocale),
              low32(pCharacter));
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Invalid locale.");
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);

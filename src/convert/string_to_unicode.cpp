@@ -1,6 +1,7 @@
 // A locale's code page and UTF-8 between two open converters: NLS2_StringToUnicode,
 // NLS2_UnicodeToString.
 
+#include "codepage/locale_converter.h"
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
@@ -18,11 +19,6 @@ using nls2::trace::Frame;
 using nls2::trace::low32;
 
 constexpr const char *utf8 = "utf-8";
-
-// The number goes to ICU as a CCSID, past the names that NLS2_MapCodepageIdToName knows.
-UConverter *openCcsid(const NLS2_Locale *pLocale, UErrorCode &error) {
-  return ucnv_openCCSID(static_cast<int32_t>(pLocale->codepage), UCNV_IBM, &error);
-}
 
 // What a length says need not lie in the buffer it belongs to, so no pointer arithmetic here: ICU
 // compares the addresses and refuses what does not fit.
@@ -59,7 +55,7 @@ int32_t NLS2_StringToUnicode(const NLS2_Locale *pLocale, char *dest, int32_t dle
     return frame.result(0);
   }
   UErrorCode error = U_ZERO_ERROR;
-  const LocalUConverterPointer codepage(openCcsid(pLocale, error));
+  const LocalUConverterPointer codepage(nls2::codepage::openAsCcsid(pLocale, &error));
   if (error > U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Error opening source code converter. %d", error);
     *status = error;
@@ -102,7 +98,7 @@ int32_t NLS2_UnicodeToString(const NLS2_Locale *pLocale, char *dest, int32_t dle
     return frame.result(0);
   }
   error = U_ZERO_ERROR;
-  const LocalUConverterPointer codepage(openCcsid(pLocale, error));
+  const LocalUConverterPointer codepage(nls2::codepage::openAsCcsid(pLocale, &error));
   if (error > U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Could not open CCSID converter for codepage %d", pLocale->codepage);
     *status = error;

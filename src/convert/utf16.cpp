@@ -1,6 +1,7 @@
 // A locale's code page and UTF-16: NLS2_toUTF16, NLS2_fromUTF16.
 
-#include "codepage/codepage_mapping.h"
+#include "codepage/locale_converter.h"
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/frame.h"
 
@@ -15,10 +16,8 @@ using nls2::trace::Trace;
 
 // The converter of a live object's code page; null with the status stored where it does not open.
 inline UConverter *acquire(Trace trace, const NLS2_Locale *pLocale, int32_t *status) {
-  int32_t twoNull = 0;
   int32_t openStatus = U_ZERO_ERROR;
-  UConverter *converter = nls2::codepage::mapCodepageIdToName(
-      static_cast<int32_t>(pLocale->codepage), &twoNull, &openStatus);
+  UConverter *converter = nls2::codepage::openMapped(pLocale, &openStatus);
   if (openStatus > U_ZERO_ERROR) {
     NLS2_TRACE(trace, "Error %d acquiring converter.", openStatus);
     *status = openStatus;
@@ -33,7 +32,7 @@ int32_t NLS2_toUTF16(const NLS2_Locale *pLocale, const char *pSource, int32_t so
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_toUTF16");
   Frame frame(anchor);
   *status = U_ZERO_ERROR;
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Invalid locale.");
     *status = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);
@@ -60,7 +59,7 @@ int32_t NLS2_fromUTF16(const NLS2_Locale *pLocale, const UChar *pSource, int32_t
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_fromUTF16");
   Frame frame(anchor);
   *status = U_ZERO_ERROR;
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
     *status = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);
   }

@@ -1,6 +1,7 @@
 // A locale's code page and UTF-8 by converter names: NLS2_toUTF8, NLS2_fromUTF8.
 
-#include "codepage/codepage_mapping.h"
+#include "codepage/locale_converter.h"
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
@@ -39,14 +40,12 @@ template <Direction direction>
 int32_t convertByName(Trace trace, const NLS2_Locale *pLocale, char *target, int32_t targetLength,
                       const char *source, int32_t sourceLength, int32_t *status) {
   constexpr bool toUtf8 = direction == Direction::ToUtf8;
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
     *status = NLS2_ERR_INVALID_LOCALE;
     return 0;
   }
-  int32_t twoNull = 0;
   int32_t openStatus = U_ZERO_ERROR;
-  LocalUConverterPointer converter(nls2::codepage::mapCodepageIdToName(
-      static_cast<int32_t>(pLocale->codepage), &twoNull, &openStatus));
+  LocalUConverterPointer converter(nls2::codepage::openMapped(pLocale, &openStatus));
   if (openStatus > U_ZERO_ERROR) {
     if constexpr (toUtf8) {
       NLS2_TRACE(trace, "Error opening converter for CCSID %d.", pLocale->codepage);

@@ -103,14 +103,7 @@ int32_t NLS2_initLocaleObject(NLS2_Locale *pLocale) {
 }
 
 int32_t NLS2_ValidateLocale(const NLS2_Locale *pLocale) {
-  static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_ValidateLocale");
-  Frame frame(anchor);
-  if (!nls2::locale::contains(pLocale)) {
-    NLS2_TRACE(frame, "Could not find locale on linked-list.");
-    return frame.result(int32_t{NLS2_ERR_INVALID_LOCALE});
-  }
-  NLS2_TRACE(frame, "Locale successfully found on linked-list.");
-  return frame.result(0);
+  return nls2::locale::validateLocale(pLocale);
 }
 
 int32_t NLS2_ReleaseLocale(NLS2_Locale *pNLS2_Locale) {

@@ -2,7 +2,6 @@
 
 #include "locale/registry.h"
 
-#include "locale/walkers.h"
 #include "sys1.h"
 
 #include <cstddef>
@@ -21,11 +20,7 @@ namespace nls2::locale {
 
 namespace {
 
-// Links are read by walks that take no lock. Their order against the counts of walkers.h is what
-// makes a removal see every walk that can still see the removed object, hence sequential
-// consistency, which costs a load nothing on the machines that matter.
-NLS2_Locale *next(NLS2_Locale *const &link) { return __atomic_load_n(&link, __ATOMIC_SEQ_CST); }
-
+// Like `follow`, for a change.
 void set(NLS2_Locale *&link, NLS2_Locale *object) {
   __atomic_store_n(&link, object, __ATOMIC_SEQ_CST);
 }
@@ -60,18 +55,18 @@ Position locate(trace::Trace trace, NLS2_Locale *head, const NLS2_Locale *object
   Position at{head, head};
   while (at.current != nullptr && at.current != object) {
     at.previous = at.current;
-    at.current = next(at.current->pNext);
+    at.current = follow(at.current->pNext);
     NLS2_TRACE(trace, "Set the following: Previous %X,  Current %X,  Next %X.",
                trace::low32(at.previous), trace::low32(at.current),
-               trace::low32(at.current != nullptr ? next(at.current->pNext) : nullptr));
+               trace::low32(at.current != nullptr ? follow(at.current->pNext) : nullptr));
   }
   return at;
 }
 
 // The removed object keeps its own link, for walks that stand on it.
 void unlink(trace::Trace trace, Position at) {
-  NLS2_Locale *following = next(at.current->pNext);
-  if (at.current == next(pLocaleObjectList)) {
+  NLS2_Locale *following = follow(at.current->pNext);
+  if (at.current == follow(pLocaleObjectList)) {
     NLS2_TRACE(trace, "Head of link-list.");
     set(pLocaleObjectList, following);
     return;
@@ -91,14 +86,14 @@ void unlink(trace::Trace trace, Position at) {
 void append(trace::Trace trace, NLS2_Locale *object) {
   NLS2_TRACE(trace, "Place locale object on linked list.");
   const ListLock lock(trace, "Linked-list modification complete, release lock.\n");
-  NLS2_Locale *last = next(pLocaleObjectList);
+  NLS2_Locale *last = follow(pLocaleObjectList);
   if (last == nullptr) {
     NLS2_TRACE(trace, "List is empty, add as first node.");
     set(pLocaleObjectList, object);
     return;
   }
   NLS2_TRACE(trace, "List has entries, Attach to end of list.");
-  while (NLS2_Locale *following = next(last->pNext)) {
+  while (NLS2_Locale *following = follow(last->pNext)) {
     last = following;
   }
   set(last->pNext, object);
@@ -106,7 +101,7 @@ void append(trace::Trace trace, NLS2_Locale *object) {
 
 void remove(trace::Trace trace, NLS2_Locale *object) {
   const ListLock lock(trace, "Release lock on linked-list.\n");
-  NLS2_Locale *head = next(pLocaleObjectList);
+  NLS2_Locale *head = follow(pLocaleObjectList);
   if (head == nullptr) {
     return;
   }
@@ -119,15 +114,6 @@ void remove(trace::Trace trace, NLS2_Locale *object) {
   NLS2_TRACE(trace, "Locale structure removed from list.");
   waitForWalkers();
   std::free(at.current);
-}
-
-bool contains(const NLS2_Locale *object) {
-  const Walk walk;
-  const NLS2_Locale *node = next(pLocaleObjectList);
-  while (node != nullptr && node != object) {
-    node = next(node->pNext);
-  }
-  return node != nullptr;
 }
 
 } // namespace nls2::locale

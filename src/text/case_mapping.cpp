@@ -1,5 +1,6 @@
 // NLS2_MapString: upper case, lower case and case folding.
 
+#include "codepage/locale_converter.h"
 #include "codepage/utf16_text.h"
 #include "nls2.h"
 #include "trace/frame.h"
@@ -57,8 +58,7 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   Utf16Text text; // the converter goes first
   Utf16Text mapped;
   UErrorCode error = U_ZERO_ERROR;
-  LocalUConverterPointer converter(
-      ucnv_openCCSID(static_cast<int32_t>(pLocale->codepage), UCNV_IBM, &error));
+  LocalUConverterPointer converter(nls2::codepage::openAsCcsid(pLocale, &error));
   if (error > U_ZERO_ERROR) {
     return frame.result(int32_t{error});
   }

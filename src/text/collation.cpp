@@ -1,5 +1,6 @@
 // NLS2_Strcoll: two strings compared by the rules of a language.
 
+#include "codepage/locale_converter.h"
 #include "codepage/utf16_text.h"
 #include "nls2.h"
 #include "trace/bounded_text.h"
@@ -160,10 +161,8 @@ int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t Stri
     return frame.result(0);
   }
   NLS2_TRACE(frame, "Acquire Converter for CodePage %d.", pLoc->codepage);
-  int32_t twoNull = 0;
   int32_t status = U_ZERO_ERROR;
-  LocalUConverterPointer converter(
-      NLS2_MapCodepageIdToName(static_cast<int32_t>(pLoc->codepage), &twoNull, &status));
+  LocalUConverterPointer converter(nls2::codepage::openMapped(pLoc, &status));
   if (status > U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Error %d acquiring Converter.", status);
     *pStatus = status;

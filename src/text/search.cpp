@@ -1,6 +1,8 @@
 // NLS2_Findstr: whether one string occurs in another.
 
+#include "codepage/locale_converter.h"
 #include "codepage/utf16_text.h"
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
@@ -51,10 +53,8 @@ struct Search {
 
 bool openConverter(Search &search) {
   NLS2_TRACE(search.trace, "Opening converter for codepage %d.", search.pLocale->codepage);
-  int32_t twoNull = 0;
   int32_t status = U_ZERO_ERROR;
-  search.converter.adoptInstead(
-      NLS2_MapCodepageIdToName(static_cast<int32_t>(search.pLocale->codepage), &twoNull, &status));
+  search.converter.adoptInstead(nls2::codepage::openMapped(search.pLocale, &status));
   if (status > U_ZERO_ERROR) {
     NLS2_TRACE(search.trace, "Could not map Codepage ID %d to Name", search.pLocale->codepage);
     return false;
@@ -193,7 +193,7 @@ int32_t NLS2_Findstr(const NLS2_Locale *pLocale, const char *pString1, int32_t l
              "options %x.",
              nls2::trace::low32(pLocale), BoundedText(pString1, len1).c_str(), len1,
              BoundedText(pString2, len2).c_str(), len2, options);
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
     NLS2_TRACE(frame, "Invalid locale object.");
     return frame.result(searchFailed);
   }

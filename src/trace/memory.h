@@ -1,8 +1,9 @@
-// The library's one way to a work buffer.
+// realloc_mem, the one internal allocation routine, and the blocks that come from it.
 #pragma once
 
 #include "trace/frame.h"
 
+#include <cstdint>
 #include <cstdlib>
 #include <memory>
 
@@ -18,7 +19,18 @@ using Block = std::unique_ptr<Unit[], FreeBlock>;
 // realloc(3), run in a trace frame of its own. A failure is reported under the calling function's
 // anchor and line; the old block is then as it was. The name is the one that its trace events
 // carry.
-void *realloc_mem(TRC1_EntryBlock *caller, uint32_t line, void *old, uint32_t size);
+inline void *realloc_mem(TRC1_EntryBlock *caller, uint32_t line, void *old, uint32_t size) {
+  static constinit TRC1_EntryBlock anchor = anchorOf("realloc_mem", TRC1_ENTRY_PRIVATE);
+  const Frame frame(anchor);
+  // Taken before the call: with size 0 realloc frees the block, and `old` has no value any more.
+  const auto oldAddress = reinterpret_cast<std::uintptr_t>(old);
+  void *block = std::realloc(old, size);
+  if (block == nullptr && frame.detail()) {
+    TRC1_Printf(caller, line, "Memory allocation failure: Size(%lu), Old(%p)\n",
+                static_cast<unsigned long>(size), reinterpret_cast<void *>(oldAddress));
+  }
+  return block;
+}
 
 // A new block of `bytes` bytes, not cleared; null also for a size that 32 bits cannot carry.
 template <class Unit>
