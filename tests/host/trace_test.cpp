@@ -135,7 +135,7 @@ TEST(Trace, LinesOfThreadsDoNotMix) {
   run("ZELHOST_TRACE=all ZELHOST_TRACE_FILE='" + path + "'", "threads");
   const std::vector<std::string> lines = contentOf(path);
   std::remove(path.c_str());
-  EXPECT_EQ(lines.size(), 800U);
+  EXPECT_EQ(lines.size(), 1600U);
   for (const std::string &line : lines) {
     const size_t text = line.find(" Example:40 ");
     ASSERT_EQ(line.size(), text + 12 + 300) << line;

@@ -5,7 +5,7 @@
 
 #include <cstdio>
 #include <cstring>
-#include <iterator>
+#include <latch>
 #include <thread>
 
 namespace {
@@ -30,12 +30,14 @@ int callHost() {
 
 int callFromThreads() {
   std::thread threads[8];
+  std::latch allAreReady(8);
   for (std::thread &thread : threads) {
     const char letter = static_cast<char>('a' + (&thread - threads));
-    thread = std::thread([letter] {
+    thread = std::thread([letter, &allAreReady] {
       char text[301] = {};
       std::memset(text, letter, sizeof text - 1);
-      for (int i = 0; i < 100; ++i) {
+      allAreReady.arrive_and_wait();
+      for (int i = 0; i < 200; ++i) {
         TRC1_Printf(&anchor, 40, "%s\n", text);
       }
     });
