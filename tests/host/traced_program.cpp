@@ -34,7 +34,7 @@ int callFromThreads() {
   for (std::thread &thread : threads) {
     const char letter = static_cast<char>('a' + (&thread - threads));
     thread = std::thread([letter, &allAreReady] {
-      char text[301] = {};
+      char text[3001] = {};
       std::memset(text, letter, sizeof text - 1);
       allAreReady.arrive_and_wait();
       for (int i = 0; i < 200; ++i) {
