@@ -170,6 +170,30 @@ static void callText(const NLS2_Locale *utf8) {
   CHECK(NLS2_MapString(utf8, NULL, 0, "a", -1, NLS2_MAP_UPPERCASE) == U_BUFFER_OVERFLOW_ERROR);
 }
 
+static void callStreams(const NLS2_Locale *utf8) {
+  static const UChar letters[] = {0x41, 0x42, 0};
+  UChar units[8];
+  struct UFILE *stream = NLS2_OpenStream(utf8, "/dev/null", "r+", "UTF-8");
+  CHECK(NLS2_WriteString(utf8, letters, 1, stream) == 1 && NLS2_Fputs(utf8, letters, stream) == 3);
+  NLS2_Fflush(stream);
+  NLS2_Frewind(stream);
+  CHECK(NLS2_ReadString(utf8, stream, units, 8) == 0);
+  CHECK(NLS2_Fgets(utf8, stream, units, 8) == NULL);
+  CHECK(NLS2_CloseStream(utf8, stream) == 0);
+  int32_t length = 0;
+  int32_t status = -1;
+  CHECK(strcmp(NLS2_detectUnicodeSignature("\xFE\xFF", 2, &length, &status), "UTF-16BE") == 0);
+}
+
+static void callBundles(const NLS2_Locale *german) {
+  int32_t length = 0;
+  int32_t status = -1;
+  struct UResourceBundle *bundle = NLS2_ResourceOpen(NULL, german, &status);
+  const UChar *version = NLS2_GetStringByKey(bundle, "Version", &length, &status);
+  CHECK(status <= 0 && version != NULL && version[length] == 0);
+  NLS2_ResourceClose(bundle);
+}
+
 static void callWithObjects(void) {
   int32_t status = -1;
   NLS2_Locale *german = NLS2_GetLocale(recordOf("de_DE")->languageId, 1141, 0, &status);
@@ -177,6 +201,8 @@ static void callWithObjects(void) {
   callUtfConversion(german);
   callLengths(german, utf8);
   callText(utf8);
+  callStreams(utf8);
+  callBundles(german);
   CHECK(NLS2_ReleaseLocale(german) == 0 && NLS2_ReleaseLocale(utf8) == 0);
 }
 
