@@ -1,0 +1,180 @@
+// The registry of locale objects under many threads, and across fork.
+//
+// ZELNLS2_TEST_SECONDS sets how long the threads run, 1 by default. The faults that these tests are
+// for show as a crash or, under the sanitizers, as a report.
+
+#include "nls2.h"
+
+#include <atomic>
+#include <chrono>
+#include <cstdlib>
+#include <functional>
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <thread>
+#include <unistd.h>
+#include <vector>
+
+namespace {
+
+constexpr uint32_t enUs = 0x03480001;
+
+NLS2_Locale *make() {
+  int32_t status = 0;
+  return NLS2_GetLocale(enUs, 819, 0, &status);
+}
+
+std::chrono::steady_clock::duration duration() {
+  const char *seconds = std::getenv("ZELNLS2_TEST_SECONDS");
+  return std::chrono::seconds(seconds != nullptr ? std::atoi(seconds) : 1);
+}
+
+// Threads that repeat their step until the object goes out of scope.
+class Threads {
+public:
+  Threads() = default;
+  ~Threads() {
+    stop_ = true;
+    for (std::thread &thread : threads_) {
+      thread.join();
+    }
+  }
+  Threads(const Threads &) = delete;
+  Threads &operator=(const Threads &) = delete;
+
+  void start(int count, const std::function<void()> &step) {
+    for (int i = 0; i < count; ++i) {
+      threads_.emplace_back([this, step] {
+        while (!stop_) {
+          step();
+        }
+      });
+    }
+  }
+
+private:
+  std::atomic<bool> stop_{false};
+  std::vector<std::thread> threads_;
+};
+
+struct Faults {
+  std::atomic<long> notMade{0};
+  std::atomic<long> liveCalledInvalid{0};
+  std::atomic<long> notReleased{0};
+  std::atomic<long> steps{0};
+
+  void expectNone() const {
+    EXPECT_EQ(notMade, 0);
+    EXPECT_EQ(liveCalledInvalid, 0) << "a live object was called invalid";
+    EXPECT_EQ(notReleased, 0);
+    EXPECT_GT(steps, 0);
+  }
+};
+
+// Makes some objects, uses them, and gives them back in another order. What it asks about a
+// released pointer may be answered either way, since its memory may be another object by now.
+void liveAndDie(Faults &faults) {
+  NLS2_Locale *objects[5];
+  for (NLS2_Locale *&object : objects) {
+    object = make();
+    faults.notMade += object == nullptr;
+  }
+  for (const int i : {2, 0, 4, 1, 3}) {
+    int32_t status = 0;
+    faults.liveCalledInvalid += NLS2_ValidateLocale(objects[i]) != 0;
+    faults.liveCalledInvalid += NLS2_GetLocaleCodepageId(objects[i], &status) != 819;
+    faults.notReleased += NLS2_ReleaseLocale(objects[i]) != 0;
+    NLS2_ValidateLocale(objects[i]);
+  }
+  ++faults.steps;
+}
+
+TEST(Registry, OwnersAndValidatorsDoNotDisturbEachOther) {
+  struct {
+    const char *reason;
+    int owners;
+    int validators;
+  } const rows[] = {{"a few of each", 4, 4}, {"more threads than stripes", 70, 10}};
+  for (const auto &row : rows) {
+    SCOPED_TRACE(row.reason);
+    Faults faults;
+    NLS2_Locale *const first = make();
+    {
+      Threads threads;
+      threads.start(row.owners, [&] { liveAndDie(faults); });
+      threads.start(row.validators / 2, [&] {
+        NLS2_Locale *own = make();
+        for (int i = 0; i < 1000; ++i) {
+          faults.liveCalledInvalid += NLS2_ValidateLocale(own) != 0;
+        }
+        faults.notReleased += NLS2_ReleaseLocale(own) != 0;
+      });
+      threads.start(row.validators / 2, [&] {
+        faults.liveCalledInvalid += NLS2_ValidateLocale(first) != 0;
+        NLS2_ValidateLocale(nullptr); // walks the whole list
+      });
+      std::this_thread::sleep_for(duration());
+    }
+    faults.expectNone();
+    EXPECT_EQ(NLS2_ReleaseLocale(first), 0);
+    EXPECT_EQ(pLocaleObjectList, nullptr) << "all were released";
+  }
+}
+
+TEST(Registry, OneObjectReleasedByTwoThreadsIsReleasedOnce) {
+  NLS2_Locale *const before = make();
+  for (int round = 0; round < 200; ++round) {
+    NLS2_Locale *const shared = make();
+    NLS2_Locale *const behind = make();
+    std::atomic<int> ready{0};
+    int32_t results[2];
+    const auto release = [&](int32_t &result) {
+      for (++ready; ready < 2;) {
+      }
+      result = NLS2_ReleaseLocale(shared);
+    };
+    std::thread other([&] { release(results[1]); });
+    release(results[0]);
+    other.join();
+    for (const int32_t result : results) {
+      ASSERT_TRUE(result == 0 || result == NLS2_ERR_INVALID_PARAMETER) << result;
+    }
+    ASSERT_TRUE(results[0] == 0 || results[1] == 0);
+    ASSERT_EQ(before->pNext, behind);
+    ASSERT_EQ(NLS2_ReleaseLocale(behind), 0) << "the lock is free";
+  }
+  EXPECT_EQ(NLS2_ReleaseLocale(before), 0);
+}
+
+// Only what the library promises: the validating threads hold no lock of the library's or of ICU's.
+int liveInChild() {
+  alarm(60); // a child that hangs is a failure
+  NLS2_Locale *own = make();
+  return own != nullptr && NLS2_ValidateLocale(own) == 0 && NLS2_ReleaseLocale(own) == 0 &&
+                 NLS2_ValidateLocale(own) == NLS2_ERR_INVALID_LOCALE
+             ? 0
+             : 1;
+}
+
+TEST(Registry, AChildForkedAmidValidationsWorks) {
+  std::vector<NLS2_Locale *> list(200); // walks long enough that a fork finds some under way
+  for (NLS2_Locale *&object : list) {
+    object = make();
+  }
+  Threads threads;
+  threads.start(3, [&] { NLS2_ValidateLocale(list.back()); });
+  for (int round = 0; round < 8; ++round) {
+    const pid_t child = fork();
+    if (child == 0) {
+      _exit(liveInChild());
+    }
+    int status = -1;
+    ASSERT_EQ(waitpid(child, &status, 0), child);
+    ASSERT_EQ(status, 0) << "round " << round;
+  }
+  for (NLS2_Locale *object : list) {
+    ASSERT_EQ(NLS2_ReleaseLocale(object), 0);
+  }
+}
+
+} // namespace
