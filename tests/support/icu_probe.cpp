@@ -20,14 +20,6 @@ std::string failingFunction;
 int callsToFailure = 0;
 UErrorCode conversionFailure = U_ZERO_ERROR;
 
-bool refuse(const char *function, UErrorCode *error) {
-  if (function != failingFunction || --callsToFailure != 0) {
-    return false;
-  }
-  *error = conversionFailure;
-  return true;
-}
-
 template <class Function>
 Function next(Function /*type*/, const char *name) {
   return reinterpret_cast<Function>(dlsym(RTLD_NEXT, name));
@@ -76,11 +68,20 @@ FailingConversion::FailingConversion(const char *function, int call, UErrorCode 
 }
 FailingConversion::~FailingConversion() { failingFunction.clear(); }
 
+bool refuse(const char *function, UErrorCode *error) {
+  if (function != failingFunction || --callsToFailure != 0) {
+    return false;
+  }
+  *error = conversionFailure;
+  return true;
+}
+
 } // namespace support
 
 extern "C" UConverter *ucnv_open(const char *name, UErrorCode *error) {
   static const auto original = NEXT(ucnv_open);
-  return refuse(error) ? nullptr : count(original(name, error));
+  return refuse(error) || support::refuse("ucnv_open", error) ? nullptr
+                                                              : count(original(name, error));
 }
 
 extern "C" UConverter *ucnv_openCCSID(int32_t ccsid, UConverterPlatform platform,
@@ -92,7 +93,7 @@ extern "C" UConverter *ucnv_openCCSID(int32_t ccsid, UConverterPlatform platform
 extern "C" int32_t ucnv_toUChars(UConverter *converter, UChar *dest, int32_t capacity,
                                  const char *source, int32_t length, UErrorCode *error) {
   static const auto original = NEXT(ucnv_toUChars);
-  return refuse("ucnv_toUChars", error)
+  return support::refuse("ucnv_toUChars", error)
              ? 0
              : original(converter, dest, capacity, source, length, error);
 }
@@ -100,7 +101,7 @@ extern "C" int32_t ucnv_toUChars(UConverter *converter, UChar *dest, int32_t cap
 extern "C" int32_t ucnv_fromUChars(UConverter *converter, char *dest, int32_t capacity,
                                    const UChar *source, int32_t length, UErrorCode *error) {
   static const auto original = NEXT(ucnv_fromUChars);
-  return refuse("ucnv_fromUChars", error)
+  return support::refuse("ucnv_fromUChars", error)
              ? 0
              : original(converter, dest, capacity, source, length, error);
 }
@@ -122,7 +123,7 @@ extern "C" void ucnv_convertEx(UConverter *to, UConverter *from, char **target,
                                UChar **pivotTarget, const UChar *pivotLimit, UBool reset,
                                UBool flush, UErrorCode *error) {
   static const auto original = NEXT(ucnv_convertEx);
-  if (!refuse("ucnv_convertEx", error)) {
+  if (!support::refuse("ucnv_convertEx", error)) {
     original(to, from, target, targetLimit, source, sourceLimit, pivotStart, pivotSource,
              pivotTarget, pivotLimit, reset, flush, error);
   }

@@ -30,8 +30,8 @@ public:
   FailingOpens &operator=(const FailingOpens &) = delete;
 };
 
-// While it lives, the nth call (from 1) of ucnv_convertEx, ucnv_toUChars or ucnv_fromUChars,
-// whichever is named, fails with `error`.
+// While it lives, the nth call (from 1) of the named function fails with `error`: ucnv_open,
+// ucnv_convertEx, ucnv_toUChars, ucnv_fromUChars, or another that a test program puts before ICU's.
 class FailingConversion {
 public:
   FailingConversion(const char *function, int call, UErrorCode error);
@@ -39,5 +39,8 @@ public:
   FailingConversion(const FailingConversion &) = delete;
   FailingConversion &operator=(const FailingConversion &) = delete;
 };
+
+// For the definition of such a function: whether this call is the one that fails. Sets the error.
+bool refuse(const char *function, UErrorCode *error);
 
 } // namespace support
