@@ -28,17 +28,17 @@ TEST(Detect, NamesSignatureAndLengthOfEveryFile) {
     bool complains;
   } cases[] = {
       {"found", {utf16}, 0, utf16 + ": UTF-16LE, 2 bytes\n", false},
-      {"not found", {plain}, 3, plain + ": no signature\n", false},
-      {"an empty file", {"/dev/null"}, 3, "/dev/null: no signature\n", false},
+      {"not found", {plain}, 1, plain + ": no signature\n", false},
+      {"an empty file", {"/dev/null"}, 1, "/dev/null: no signature\n", false},
       {"standard input", {"-"}, 0, "-: UTF-8, 3 bytes\n", false},
       {"one of two",
        {plain, utf16},
-       3,
+       1,
        plain + ": no signature\n" + utf16 + ": UTF-16LE, 2 bytes\n",
        false},
       {"a missing one does not hide the next",
        {missing, utf16, plain},
-       1,
+       2,
        utf16 + ": UTF-16LE, 2 bytes\n" + plain + ": no signature\n",
        true},
       {"no file", {}, 2, "", true},
@@ -58,7 +58,7 @@ TEST(Detect, AsJsonWhateverTheFilesName) {
   const std::string odd = dir.path("\xFF");
   writeFile(odd, BYTES("\0\0\xFE\xFF"));
   const Result result = runTool({"detect", "--json", odd, "/dev/null"});
-  EXPECT_EQ(result.exitCode, 3);
+  EXPECT_EQ(result.exitCode, 1);
   const nlohmann::json rows = nlohmann::json::parse(result.out);
   ASSERT_EQ(rows.size(), 2U);
   EXPECT_EQ(rows[0]["encoding"], "UTF-32BE");

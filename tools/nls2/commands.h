@@ -11,5 +11,8 @@ void addLocalesCommand(CLI::App &app);
 void addCodepagesCommand(CLI::App &app);
 void addDetectCommand(CLI::App &app);
 void addCatCommand(CLI::App &app);
+void addCompareCommand(CLI::App &app);
+void addSortCommand(CLI::App &app);
+void addFindCommand(CLI::App &app);
 
 } // namespace nls2::tool

@@ -30,7 +30,7 @@ others from being looked at.
 Without a signature a file may still be Unicode. FF FE 00 00 is UTF-32LE, even where a text in
 UTF-16LE begins with a null.
 
-Exit codes: 0 every file has a signature, 3 some file has none, 1 some file cannot be read.)";
+Exit codes: 0 every file has a signature, 1 some file has none, 2 some file cannot be read.)";
 
 struct Arguments {
   std::vector<std::string> paths;
@@ -86,11 +86,11 @@ void detectAll(const Arguments &arguments) {
     try {
       rows.push_back(detect(path));
       if (code == exitDone && rows.back()["encoding"].is_null()) {
-        code = exitNotFound;
+        code = exitNo;
       }
     } catch (const Failure &error) {
       fmt::print(stderr, "nls2: {}\n", error.what());
-      code = exitFailed;
+      code = exitTrouble;
     }
   }
   OutputFile("-").write(arguments.asJson ? asJsonText(rows) : asText(rows));

@@ -7,9 +7,10 @@ namespace nls2::tool {
 
 enum ExitCode : int {
   exitDone = 0,
-  exitFailed = 1,  // a record that cannot be translated, or input or output that fails
-  exitUsage = 2,   // the command line asks for something that cannot be
-  exitNotFound = 3 // nothing failed, but what was looked for is not there
+  exitFailed = 1, // a record that cannot be translated, or input or output that fails
+  exitUsage = 2,  // the command line asks for something that cannot be
+  exitNo = 1,     // a command that answers a question: the answer is no
+  exitTrouble = 2 // such a command: whatever went wrong
 };
 
 struct Failure : std::runtime_error {
@@ -17,6 +18,11 @@ struct Failure : std::runtime_error {
 };
 
 struct UsageError : std::runtime_error {
+  using std::runtime_error::runtime_error;
+};
+
+// What is a Failure elsewhere, in a command that answers a question.
+struct Trouble : std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 

@@ -45,6 +45,8 @@ int run(CLI::App &app, int argc, char **argv) {
     return outcome.code;
   } catch (const UsageError &error) {
     return complain(exitUsage, error.what());
+  } catch (const Trouble &error) {
+    return complain(exitTrouble, error.what());
   } catch (const Failure &error) {
     return complain(exitFailed, error.what());
   } catch (const std::bad_alloc &) {
@@ -57,13 +59,16 @@ int runCommand(int argc, char **argv) {
   app.set_version_flag("--version", std::string(NLS2_BuildStamp()));
   app.require_subcommand(1);
   app.failure_message(CLI::FailureMessage::simple);
-  app.footer("Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong, "
-             "3 nothing found.");
+  app.footer("Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of "
+             "detect, compare and find, which answer a question: 0 yes, 1 no, 2 trouble.");
   addTranslateCommand(app);
   addLocalesCommand(app);
   addCodepagesCommand(app);
   addDetectCommand(app);
   addCatCommand(app);
+  addCompareCommand(app);
+  addSortCommand(app);
+  addFindCommand(app);
   return run(app, argc, argv);
 }
 
