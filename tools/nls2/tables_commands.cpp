@@ -1,17 +1,17 @@
-// nls2 locales and nls2 codepages: the library's tables, as text or as JSON.
+// nls2 locales and nls2 codepages: the library's tables, or what they say of one name or number, as
+// text or as JSON.
 
+#include "codepage_lookup.h"
 #include "commands.h"
+#include "locale_lookup.h"
 #include "nls2.h"
 #include "output_file.h"
-#include "status.h"
 
 #include <array>
 #include <fmt/core.h>
 #include <memory>
 #include <nlohmann/json.hpp>
 #include <string>
-#include <unicode/localpointer.h>
-#include <unicode/ucnv.h>
 
 namespace nls2::tool {
 
@@ -25,56 +25,10 @@ void print(const std::string &text) {
 }
 
 Json localesAsJson() {
-  Json rows = Json::array();
-  for (const LocaleMapEntry *entry = localeMap; entry->languageId != NLS2_LANGUAGE_ID_END;
-       ++entry) {
-    rows.push_back({{"row", entry - localeMap},
-                    {"locale", entry->localeName},
-                    {"shortName", entry->shortName},
-                    {"languageId", entry->languageId},
-                    {"languageIdHex", fmt::format("0x{:08X}", entry->languageId)},
-                    {"country", entry->languageId >> 16},
-                    {"language", entry->languageId & 0xFFFF},
-                    {"asciiCcsid", entry->asciiCcsid},
-                    {"ebcdicCcsid", entry->ebcdicCcsid}});
-  }
-  return rows;
+  return describeRecords([](const LocaleMapEntry &) { return true; });
 }
 
-std::string localesAsText() {
-  std::string text =
-      fmt::format("{:>3}  {:<8} {:<8} {:<10} {:>10} {:>7} {:>8} {:>6} {:>6}\n", "row", "locale",
-                  "short", "id", "id", "country", "language", "ASCII", "EBCDIC");
-  for (const Json &row : localesAsJson()) {
-    text += fmt::format("{:>3}  {:<8} {:<8} {:<10} {:>10} {:>7} {:>8} {:>6} {:>6}\n",
-                        row["row"].get<int>(), row["locale"].get<std::string>(),
-                        row["shortName"].get<std::string>(),
-                        row["languageIdHex"].get<std::string>(), row["languageId"].get<uint32_t>(),
-                        row["country"].get<uint32_t>(), row["language"].get<uint32_t>(),
-                        row["asciiCcsid"].get<uint32_t>(), row["ebcdicCcsid"].get<uint32_t>());
-  }
-  return text;
-}
-
-// The numbers that nls2.h lists as opened by name; what they open, the library is asked.
-constexpr std::array namedPages{874,   932,   936,   949,   950,   1200,  1208,  57352, 57355,
-                                57356, 57357, 57358, 57359, 57360, 57361, 57362, 57363, 57365,
-                                57366, 57367, 57368, 57369, 57370, 57371, 57372};
-
-// The converter is null where the number does not open, and the status then says why.
-Json codepageAsJson(int32_t number) {
-  int32_t twoNull = 0;
-  int32_t status = U_ZERO_ERROR;
-  const icu::LocalUConverterPointer converter(NLS2_MapCodepageIdToName(number, &twoNull, &status));
-  UErrorCode nameStatus = U_ZERO_ERROR;
-  const char *name = converter.isNull() ? nullptr : ucnv_getName(converter.getAlias(), &nameStatus);
-  return {{"codepage", number},
-          {"opens", !converter.isNull()},
-          {"converter", name != nullptr ? Json(name) : Json()},
-          {"twoNullTerminator", twoNull != 0},
-          {"status", status},
-          {"statusName", statusName(status)}};
-}
+std::string localesAsText() { return recordsAsText(localesAsJson()); }
 
 Json codepagesAsJson() {
   Json names = Json::array();
@@ -82,8 +36,8 @@ Json codepagesAsJson() {
     names.push_back({{"name", entry->name}, {"codepage", entry->ccsid}});
   }
   Json numbers = Json::array();
-  for (const int32_t number : namedPages) {
-    numbers.push_back(codepageAsJson(number));
+  for (const int32_t number : pagesWithNames) {
+    numbers.push_back(describeCodepage(number));
   }
   return {{"windowsNames", names}, {"numbers", numbers}};
 }
@@ -106,25 +60,52 @@ std::string codepagesAsText() {
   return text;
 }
 
-// A command without arguments that shows a table, as text or as JSON.
-void addTable(CLI::App &app, const char *name, const char *description, std::string (*text)(),
-              Json (*json)()) {
+struct Table {
+  std::string (*text)();
+  Json (*json)();
+  Json (*lookUp)(const std::string &); // throws Failure
+  std::string (*foundAsText)(const Json &);
+};
+
+std::string shown(const Table &table, const std::string *asked, bool asJson) {
+  if (asked == nullptr) {
+    return asJson ? table.json().dump(2) + "\n" : table.text();
+  }
+  const Json found = table.lookUp(*asked);
+  return asJson ? found.dump(2) + "\n" : table.foundAsText(found);
+}
+
+// A command that shows a table, or what is known of one argument.
+CLI::App &addTable(CLI::App &app, const char *name, const char *description, const char *argument,
+                   const char *argumentDescription, const Table &table) {
   CLI::App &command = *app.add_subcommand(name, description);
   const auto asJson = std::make_shared<bool>(false);
+  const auto asked = std::make_shared<std::string>();
+  const CLI::Option *option =
+      command.add_option(argument, *asked, argumentDescription)->type_name("");
   command.add_flag("--json", *asJson, "write JSON");
-  command.footer("The tables' terminator records are left out.");
-  command.callback([=] { print(*asJson ? json().dump(2) + "\n" : text()); });
+  command.callback(
+      [=] { print(shown(table, option->count() != 0 ? asked.get() : nullptr, *asJson)); });
+  return command;
 }
 
 } // namespace
 
 void addLocalesCommand(CLI::App &app) {
-  addTable(app, "locales", "List the locales that the library knows", localesAsText, localesAsJson);
+  addTable(app, "locales", "List the locales that the library knows", "NAME-OR-ID",
+           "show the records with this name, language id (decimal or 0x...) or code page, and what "
+           "ICU makes of their code pages",
+           {localesAsText, localesAsJson, lookUpLocale, foundLocaleAsText})
+      .footer("The table's terminator record is left out. Where several records are shown, the "
+              "library's own searches take the first.");
 }
 
 void addCodepagesCommand(CLI::App &app) {
-  addTable(app, "codepages", "List code pages by number and by Windows name", codepagesAsText,
-           codepagesAsJson);
+  addTable(app, "codepages", "List code pages by number and by Windows name", "NAME-OR-NUMBER",
+           "show what the library and ICU make of this code page",
+           {codepagesAsText, codepagesAsJson, lookUpCodepage, foundCodepageAsText})
+      .footer("A number is the library's; everything else is a name as ICU spells them: cp037, "
+              "latin1, windows-1252. The table's terminator record is left out.");
 }
 
 } // namespace nls2::tool
