@@ -237,7 +237,7 @@ TEST(Translate, UsageErrors) {
       {"translate --from 37 --to 1208 --record-length 1 --newline crlf", "crlf"},
       {"translate --from 37 --to 1208 --record-length 1 --wrong", "--wrong"},
       {"translate --from 37 --to 1208 --record-length 1 in out", "out"},
-      {"locales extra", "extra"},
+      {"locales en_US extra", "extra"},
   };
   for (const auto &c : cases) {
     const Result result = runTool(std::string(c.arguments), ab);
