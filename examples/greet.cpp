@@ -47,7 +47,8 @@ std::string fieldText(std::string_view field) {
                        static_cast<int32_t>(field.size()), &consumed, NLS2_STRING_STRIP_TRAILING,
                        &status);
   check("NLS2_TranslateString", status);
-  return text.c_str(); // the result counts UTF-16 units; the bytes end at the null behind them
+  text.resize(text.find('\0')); // the result counts UTF-16 units; the bytes end at the null
+  return text;
 }
 
 std::string message(const NLS2_Locale *locale, const Bundle &bundle, const char *key) {

@@ -16,7 +16,7 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr std::size_t chunkLength = 128 * 1024;
+constexpr std::size_t chunkLength = std::size_t{128} * 1024;
 
 // The byte order, or the state at a line's start, depends on text before the line.
 bool needsTextBefore(int32_t page) {
