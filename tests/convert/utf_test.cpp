@@ -1,5 +1,5 @@
 // A locale's code page and UTF-8 or UTF-16: against the same ICU calls made bare, with every size
-// of output, and traced on each way out.
+// of output.
 
 #include "nls2.h"
 #include "support/call_trace.h"
@@ -15,9 +15,7 @@
 namespace {
 
 using support::exact;
-using support::hex;
 using support::LiveLocale;
-using support::tracedCall;
 
 #if defined(__SANITIZE_ADDRESS__)
 constexpr int slack = 0; // the sanitizer guards the ends
@@ -114,91 +112,6 @@ TEST(Utf, AsBareIcuWithEveryCapacity) {
       sweepAll(locale.get(), icuName, text);
     }
     EXPECT_EQ(support::openConverters(), before) << icuName;
-  }
-}
-
-// One of the four functions, converting "AB" from or to 819, and its lines.
-struct Way {
-  const char *function;
-  int32_t (*call)(const NLS2_Locale *, char *target, int32_t capacity, int32_t *status);
-  std::string (*input)(const std::string &target, int32_t capacity); // behind the pointer
-  std::string notLive, unopened, name, converting, failed;
-  int32_t successStatus;
-};
-
-const Way ways[] = {
-    {"NLS2_toUTF8",
-     [](auto locale, auto target, auto capacity, auto status) {
-       return NLS2_toUTF8(locale, "ABx", 2, target, capacity, status);
-     },
-     [](const std::string &target, int32_t capacity) {
-       return ", pSource AB, sourceLength 2, pTarget " + target + ", targetLength " +
-              std::to_string(capacity) + ".\n";
-     },
-     "", "Error opening converter for CCSID 57364.\n", "Converter name returned is ",
-     "Converting source to UTF-8 string.\n", "Error converting string to UTF-8  15.\n", 0},
-    {"NLS2_fromUTF8",
-     [](auto locale, auto target, auto capacity, auto status) {
-       return NLS2_fromUTF8(locale, target, capacity, "ABx", 2, status);
-     },
-     [](const std::string &target, int32_t capacity) {
-       return ", pSource " + target + ", sourceLength " + std::to_string(capacity) +
-              ", pTarget AB, targetLength 2.\n";
-     },
-     "", "Error 4 acquiring converter.\n", "", "", "Error 15 converting string from UTF8.\n", 99},
-    {"NLS2_toUTF16",
-     [](auto locale, auto, auto capacity, auto status) {
-       UChar target[4];
-       return NLS2_toUTF16(locale, "ABx", 2, target, capacity, status);
-     },
-     nullptr, "Invalid locale.\n", "Error 4 acquiring converter.\n", "", "",
-     "Error 15 converting string from UTF16.\n", 0},
-    {"NLS2_fromUTF16",
-     [](auto locale, auto target, auto capacity, auto status) {
-       return NLS2_fromUTF16(locale, u"ABx", capacity, target, 2, status);
-     },
-     nullptr, "", "Error 4 acquiring converter.\n", "", "", "Error 15 converting to utf16 .\n", 0},
-};
-
-TEST(Utf, TracesEachWayOut) {
-  static const NLS2_Locale notLive{};
-  const LiveLocale live(819);
-  const LiveLocale none(57364);
-  const std::string opened = "ValidateLocale= 0\n+ucnv\nMapCodepageIdToName= converter\n";
-  for (const Way &way : ways) {
-    SCOPED_TRACE(way.function);
-    const auto expect = [&](const NLS2_Locale *locale, const support::Fault &fault,
-                            int32_t capacity, int32_t statusAfter, const std::string &tail) {
-      const std::string target = "old";
-      const auto buffer = support::exact(target); // without a terminator
-      int32_t status = 99;
-      std::string input;
-      if (way.input != nullptr) {
-        const auto shown = static_cast<size_t>(std::max(capacity, 0));
-        input = "Input parameters: pLocale " + hex(locale) +
-                way.input(target.substr(0, shown), capacity);
-      }
-      EXPECT_EQ(tracedCall(way.function, fault,
-                           [&] { return way.call(locale, buffer.get(), capacity, &status); }),
-                "> entry\n" + input + tail);
-      EXPECT_EQ(status, statusAfter) << tail;
-    };
-    const std::string name = way.name.empty() ? "" : way.name + "ISO-8859-1.\n";
-    const std::string named = opened + name + way.converting;
-    expect(live.get(), {}, 3, way.successStatus, named + "-ucnv\nLength of output 2.\n= 2\n");
-    expect(&notLive, {}, 3, 38, "ValidateLocale= 38\n" + way.notLive + "= 0\n");
-    expect(none.get(), {}, 3, 4,
-           "ValidateLocale= 0\nMapCodepageIdToName= 0\n" + way.unopened + "= 0\n");
-    expect(live.get(), {}, 1, 15, named + way.failed + "-ucnv\n= 0\n");
-    if (way.input != nullptr) {
-      expect(live.get(), {"ucnv_getName", 1}, 3, 7,
-             opened + (way.name.empty() ? "" : way.name + "(null).\n") +
-                 "Error 7 acquiring corresponding name of converter.\n-ucnv\n= 0\n");
-      // A negative capacity: nothing of the output is read.
-      std::string failed = way.failed;
-      failed.erase(failed.find("15") + 1, 1); // status 1
-      expect(live.get(), {}, -1, 1, named + failed + "-ucnv\n= 0\n");
-    }
   }
 }
 

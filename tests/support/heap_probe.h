@@ -2,6 +2,7 @@
 // library's.
 #pragma once
 
+#include <atomic>
 #include <cstddef>
 
 namespace support {
@@ -13,22 +14,21 @@ constexpr bool heapCanRefuse = false;
 constexpr bool heapCanRefuse = true;
 #endif
 
-// While it lives, every realloc of this size, new or moved, fails.
-class FailingReallocs {
-public:
-  explicit FailingReallocs(std::size_t size);
-  ~FailingReallocs();
-  FailingReallocs(const FailingReallocs &) = delete;
-  FailingReallocs &operator=(const FailingReallocs &) = delete;
-};
+// The size that is refused, by default none.
+constexpr std::size_t noSize = static_cast<std::size_t>(-1);
+inline std::atomic<std::size_t> refusedRealloc{noSize};
+inline std::atomic<std::size_t> refusedMalloc{noSize};
 
-// The same for every malloc of this size.
-class FailingMallocs {
+// While it lives, every request of this size fails: to realloc, new or moved, or to malloc.
+template <std::atomic<std::size_t> &refused>
+class FailingRequests {
 public:
-  explicit FailingMallocs(std::size_t size);
-  ~FailingMallocs();
-  FailingMallocs(const FailingMallocs &) = delete;
-  FailingMallocs &operator=(const FailingMallocs &) = delete;
+  explicit FailingRequests(std::size_t size) { refused = size; }
+  ~FailingRequests() { refused = noSize; }
+  FailingRequests(const FailingRequests &) = delete;
+  FailingRequests &operator=(const FailingRequests &) = delete;
 };
+using FailingReallocs = FailingRequests<refusedRealloc>;
+using FailingMallocs = FailingRequests<refusedMalloc>;
 
 } // namespace support

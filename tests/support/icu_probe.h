@@ -1,15 +1,14 @@
-// Watches what the library opens at ICU and gives back. Linking it into a program puts its
-// functions before ICU's own; each passes the call on.
+// Watches what the library opens at ICU and gives back, and makes ICU fail. Linking it into a
+// program puts its functions before ICU's own; each passes the call on.
 #pragma once
 
+#include <dlfcn.h>
 #include <unicode/utypes.h>
 
 namespace support {
 
 // Converters open at this moment.
 int openConverters();
-// Converters that were closed since the program began.
-int closedConverters();
 
 // While it lives, opens and closes of converters are marked in the open Recording, as
 // "+ucnv", "-ucnv".
@@ -21,20 +20,11 @@ public:
   ConverterMarks &operator=(const ConverterMarks &) = delete;
 };
 
-// While it lives, the library's opens of converters fail with `error`, by name or as a CCSID.
-class FailingOpens {
-public:
-  explicit FailingOpens(UErrorCode error);
-  ~FailingOpens();
-  FailingOpens(const FailingOpens &) = delete;
-  FailingOpens &operator=(const FailingOpens &) = delete;
-};
-
-// While it lives, the nth call (from 1) of the named function fails with `error`: ucnv_open,
-// ucnv_convertEx, ucnv_toUChars, ucnv_fromUChars, or another that a test program puts before ICU's.
+// While it lives, the nth call (from 1) of the named function fails with `error`: one that the
+// probe, or another that a test program puts before ICU's.
 class FailingConversion {
 public:
-  FailingConversion(const char *function, int call, UErrorCode error);
+  FailingConversion(const char *function, int call, UErrorCode error = U_MEMORY_ALLOCATION_ERROR);
   ~FailingConversion();
   FailingConversion(const FailingConversion &) = delete;
   FailingConversion &operator=(const FailingConversion &) = delete;
@@ -43,4 +33,22 @@ public:
 // For the definition of such a function: whether this call is the one that fails. Sets the error.
 bool refuse(const char *function, UErrorCode *error);
 
+template <class Function>
+Function next(Function /*type*/, const char *name) {
+  return reinterpret_cast<Function>(dlsym(RTLD_NEXT, name));
+}
+
 } // namespace support
+
+// ICU's function behind the program's own. Its exported name carries ICU's version.
+#define TEXT_OF(symbol) #symbol
+#define NAME_OF(symbol) TEXT_OF(symbol)
+#define NEXT(function) support::next(&function, NAME_OF(function))
+
+// Puts a function before ICU's that fails on request and is otherwise ICU's; `error` names the
+// parameter for the error, `passedOn` calls `original`, `refused` is what a failing call returns.
+#define PROBE(Result, function, parameters, passedOn, refused)                                     \
+  extern "C" Result function parameters {                                                          \
+    static const auto original = NEXT(function);                                                   \
+    return support::refuse(#function, error) ? refused : passedOn;                                 \
+  }
