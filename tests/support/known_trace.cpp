@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <fstream>
 #include <gtest/gtest.h>
+#include <set>
 
 namespace support {
 
@@ -33,12 +34,16 @@ std::string named(std::string text, uint32_t pointer, const std::string &name) {
 std::string textOf(const Recording &recording, const Names &names) {
   const std::string opened = "NLS2_MapCodepageIdToName= ";
   std::string text;
-  for (std::string line : recording.lines()) {
+  std::set<uint32_t> converters;
+  for (const std::string &line : recording.lines()) {
     text += line + "\n";
     if (line.rfind(opened, 0) == 0 && line != opened + "0") {
       const long value = std::strtol(line.c_str() + opened.size(), nullptr, 10);
-      text = named(text, static_cast<uint32_t>(value), "converter");
+      converters.insert(static_cast<uint32_t>(value));
     }
+  }
+  for (const uint32_t converter : converters) {
+    text = named(text, converter, "converter");
   }
   for (const auto &[pointer, name] : names) {
     text = pointer == nullptr ? text : named(text, low32(pointer), name);
