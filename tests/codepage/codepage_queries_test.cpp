@@ -1,10 +1,8 @@
 // NLS2_GetCodepageName and NLS2_GetCodepageId.
 
-#include "nls2.h"
-#include "support/default_probe.h"
+#include "locale/scenario.h"
 #include "support/icu_probe.h"
 #include "support/recording_host.h"
-#include "support/trace_outline.h"
 
 #include <gtest/gtest.h>
 #include <unicode/ucnv.h>
@@ -12,189 +10,96 @@
 namespace {
 
 using support::Answers;
-using support::outline;
-using support::Recording;
-using support::traceAll;
-using support::traceDetail;
-using support::traceOff;
+using support::expectScenario;
+using support::plain;
+using support::said;
+using support::traced;
 
-constexpr const char *untouched = "untouched";
+std::string nameOf(int32_t codepage) {
+  const int open = support::openConverters();
+  char name[UCNV_MAX_CONVERTER_NAME_LENGTH] = "untouched";
+  const int32_t status = NLS2_GetCodepageName(codepage, name, 0);
+  EXPECT_EQ(support::openConverters(), open);
+  return said(status, name);
+}
 
 TEST(GetCodepageName, GivesIcusCanonicalName) {
+  const Answers noCcsid{.ccsidError = U_INVALID_TABLE_FORMAT};
   const struct {
-    const char *reason;
-    int32_t codepage;
-    int32_t status;
     const char *name;
-  } rows[] = {
-      {"as a CCSID", 37, 0, "ibm-37_P100-1995"},
-      {"canonical, not as it was opened", 1208, 0, "UTF-8"},
-      {"a warning of the open is no failure", 932, 0, "ibm-943_P15A-2003"},
-      {"a name that lives in the converter", 57365, 0, "ISCII,version=0"},
-      {"a private number without a name", 57364, 4, untouched},
-      {"a negative number", -1, 4, untouched},
-  };
-  for (const auto &row : rows) {
-    for (const auto flags : {traceOff, traceAll}) {
-      SCOPED_TRACE(row.reason);
-      const int open = support::openConverters();
-      char name[UCNV_MAX_CONVERTER_NAME_LENGTH] = "untouched";
-      const Recording recording(flags);
-      EXPECT_EQ(NLS2_GetCodepageName(row.codepage, name, 0), row.status);
-      EXPECT_STREQ(name, row.name);
-      EXPECT_EQ(support::openConverters(), open);
-    }
-  }
-}
-
-// The opened converter as an outline's name: the test knows of it only what the trace tells.
-support::Names converterIn(const Recording &recording) {
-  const std::string exit = "NLS2_MapCodepageIdToName= ";
-  uintptr_t address = 0;
-  for (const std::string &line : recording.lines()) {
-    if (line.rfind(exit, 0) == 0) {
-      address = static_cast<uint32_t>(std::stol(line.substr(exit.size())));
-    }
-  }
-  return {{reinterpret_cast<const void *>(address), "converter"}};
-}
-
-TEST(GetCodepageName, TracesEachPath) {
-  const std::string opened = "NLS2_MapCodepageIdToName = {converter}\n";
-  const struct {
-    const char *reason;
+    support::Trace trace;
     int32_t codepage;
-    UErrorCode ccsidError;
-    UErrorCode nameError;
-    bool noName;
-    int32_t status;
-    std::string trace;
+    std::string answer;
+    Answers answers = {};
   } rows[] = {
-      {"found", 57365, U_ZERO_ERROR, U_ZERO_ERROR, false, 0,
-       opened + ": CCSID for this converter is 4902\n"
-                ": Codepage name ISCII,version=0 found.\n"
-                ": Release converter {converter}.\n"
-                "-ucnv\n"
-                ": Copy codepage name ISCII,version=0 to user buffer.\n"
-                ": Compute length of name.\n"
-                ": Name length is 15.\n"
-                "= 0\n"},
-      {"not opened", 57364, U_ZERO_ERROR, U_ZERO_ERROR, false, 4,
-       "NLS2_MapCodepageIdToName = 0\n"
-       ": ICU converter for codepage not found.4\n"
-       "= 4\n"},
-      {"no CCSID", 37, U_INVALID_TABLE_FORMAT, U_ZERO_ERROR, false, U_INVALID_TABLE_FORMAT,
-       opened + ": CCSID for this converter is -1\n"
-                ": Error retrieving CCSID for converter {converter}.\n"
-                "-ucnv\n"
-                "= 13\n"},
-      {"a warning with the CCSID", 37, U_USING_DEFAULT_WARNING, U_INTERNAL_PROGRAM_ERROR, false, 5,
-       opened + ": CCSID for this converter is -1\n"
-                ": Converter codepage name not found.\n"
-                "-ucnv\n"
-                "= 5\n"},
-      {"no name and no error", 37, U_ZERO_ERROR, U_ZERO_ERROR, true, 2,
-       opened + ": CCSID for this converter is 37\n"
-                ": Converter codepage name not found.\n"
-                "-ucnv\n"
-                "= 2\n"},
+      {"name of a CCSID", plain, 37, "0 ibm-37_P100-1995"},
+      {"name, canonical, not as it was opened", plain, 1208, "0 UTF-8"},
+      {"name, a warning of the open is no failure", plain, 932, "0 ibm-943_P15A-2003"},
+      {"name that lives in the converter", traced, 57365, "0 ISCII,version=0"},
+      {"name, not opened", traced, 57364, "4 untouched"},
+      {"name of a negative number", plain, -1, "4 untouched"},
+      {"name, no CCSID", traced, 37, "13 untouched", noCcsid},
+      {"name, without detail tracing no CCSID is asked for", plain, 37, "0 ibm-37_P100-1995",
+       noCcsid},
+      {"name, a warning with the CCSID",
+       traced,
+       37,
+       "5 untouched",
+       {.ccsidError = U_USING_DEFAULT_WARNING, .nameError = U_INTERNAL_PROGRAM_ERROR}},
+      {"name, none and no error", traced, 37, "2 untouched", {.noName = true}},
   };
   for (const auto &row : rows) {
-    SCOPED_TRACE(row.reason);
-    Answers answers;
-    answers.ccsidError = row.ccsidError;
-    answers.nameError = row.nameError;
-    if (row.noName) {
-      answers.name = nullptr;
-    }
-    char name[UCNV_MAX_CONVERTER_NAME_LENGTH] = "untouched";
-    const support::ConverterMarks marks;
-    const Recording recording(traceAll);
-    EXPECT_EQ(NLS2_GetCodepageName(row.codepage, name, 0), row.status);
-    EXPECT_EQ(outline(recording, converterIn(recording)),
-              "> NLS2_GetCodepageName\n: Input parameters: CodePageID " +
-                  std::to_string(row.codepage) + "\n" + row.trace);
-    EXPECT_STREQ(name, row.status == 0 ? "ISCII,version=0" : untouched);
+    const auto call = [&] { return nameOf(row.codepage); };
+    expectScenario({row.name, row.trace, call, row.answer, "", row.answers});
   }
 }
 
-TEST(GetCodepageName, AsksForTheCcsidUnderDetailTracingOnly) {
-  Answers answers;
-  answers.ccsidError = U_INVALID_TABLE_FORMAT;
-  for (const auto flags : {traceOff, support::traceEvents, traceDetail, traceAll}) {
-    char name[UCNV_MAX_CONVERTER_NAME_LENGTH] = "untouched";
-    const Recording recording(flags);
-    const bool detail = (flags & traceDetail) != 0;
-    EXPECT_EQ(NLS2_GetCodepageName(37, name, sizeof name), detail ? 13 : 0) << flags;
-    EXPECT_STREQ(name, detail ? untouched : "ibm-37_P100-1995");
+TEST(GetCodepageName, AsksForTheCcsidByDetailTracingAlone) {
+  const Answers noCcsid{.ccsidError = U_INVALID_TABLE_FORMAT};
+  const support::Answering answering(noCcsid);
+  for (const auto flags : {support::traceEvents, support::traceDetail}) {
+    const support::Recording recording(flags);
+    EXPECT_EQ(nameOf(37), flags == support::traceDetail ? "13 untouched" : "0 ibm-37_P100-1995");
   }
 }
 
-TEST(GetCodepageId, TracesEachPath) {
-  const std::string opened = ": ICU converter allocated.\n"
-                             ": Retrieve the CCSID for this converter.\n";
-  const struct {
-    const char *reason;
-    const char *name;
-    UErrorCode ccsidError;
-    uint32_t codepage;
-    int32_t status;
-    int leftOpen;
-    std::string trace;
-  } rows[] = {
-      {"an alias", "UTF8", U_ZERO_ERROR, 1208, 0, 0,
-       opened + "-ucnv\n"
-                ": CCSID associated with the codepage name is 1208.\n"
-                "= 1208\n"},
-      {"a name of several tables", "windows-1252", U_ZERO_ERROR, 5348, 0, 0,
-       opened + "-ucnv\n"
-                ": CCSID associated with the codepage name is 5348.\n"
-                "= 5348\n"},
-      {"unknown to ICU: the Windows names are not asked", "windows-65000x", U_ZERO_ERROR, 0, 4, 0,
-       ": Could not open ICU converter based on codepage name.\n= 0\n"},
-      {"no answer about the CCSID", "UTF-8", U_INVALID_TABLE_FORMAT, 0, 13, 0,
-       opened + ": CCSID number not found for Codepage name.\n-ucnv\n= 0\n"},
-      {"no CCSID, but a Windows name", "windows-936-2000", U_ZERO_ERROR, 936, 0, 0,
-       opened + ": ICU cannot find a CCSID for this codepage named windows-936-2000\n"
-                "NLS2_MapWindowsNameToCCSID = 936\n"
-                "-ucnv\n"
-                ": CCSID associated with the codepage name is 936.\n"
-                "= 936\n"},
-      {"no CCSID and no Windows name: left open", "UTF-7", U_ZERO_ERROR, 0, 37, 1,
-       opened + ": ICU cannot find a CCSID for this codepage named UTF-7\n"
-                "NLS2_MapWindowsNameToCCSID = 0\n"
-                ": Codepage name is not CCSID nor Windows.\n"
-                "= 0\n"},
-  };
-  for (const auto &row : rows) {
-    SCOPED_TRACE(row.reason);
-    Answers answers;
-    answers.ccsidError = row.ccsidError;
-    const int open = support::openConverters();
-    int32_t status = -1;
-    const support::ConverterMarks marks;
-    const Recording recording(traceAll);
-    [[maybe_unused]] const support::MeantLeak converter;
-    EXPECT_EQ(NLS2_GetCodepageId(row.name, &status), row.codepage);
-    EXPECT_EQ(status, row.status);
-    EXPECT_EQ(support::openConverters() - open, row.leftOpen);
-    EXPECT_EQ(outline(recording), support::filled("> NLS2_GetCodepageId\n"
-                                                  ": Input parameters: CodePageName @.\n"
-                                                  ": Getting codepage id from codepage name @.\n"
-                                                  ": Opening ICU converter for codepage name @.\n",
-                                                  "@", row.name) +
-                                      (row.status == 4 ? "" : "+ucnv\n") + row.trace);
-  }
-}
-
-// ICU opens its default converter for a null name. Without a CCSID for it the name is looked up as
-// text all the same.
-TEST(GetCodepageId, NullNameIsIcusDefault) {
+std::string idOf(const char *name) {
   int32_t status = -1;
-  const Recording recording(traceAll);
+  const uint32_t codepage = NLS2_GetCodepageId(name, &status);
+  return said(status, codepage);
+}
+
+// That converters are given back, but for one, shows in the traces.
+TEST(GetCodepageId, GivesTheCcsidOrTheNumberOfAWindowsName) {
+  const struct {
+    const char *section;
+    const char *name;
+    std::string answer;
+    UErrorCode ccsidError = U_ZERO_ERROR;
+  } rows[] = {
+      {"id of an alias", "UTF8", "0 1208"},
+      {"id of a name of several tables", "windows-1252", "0 5348"},
+      {"id, unknown to ICU: no Windows name", "windows-65000x", "4 0"},
+      {"id, no answer about the CCSID", "UTF-8", "13 0", U_INVALID_TABLE_FORMAT},
+      {"id of a Windows name without a CCSID", "windows-936-2000", "0 936"},
+      {"id, neither CCSID nor Windows name: left open", "UTF-7", "37 0"},
+  };
+  for (const auto &row : rows) {
+    const auto call = [&] {
+      [[maybe_unused]] const support::MeantLeak converter;
+      return idOf(row.name);
+    };
+    expectScenario({row.section, traced, call, row.answer, "", {.ccsidError = row.ccsidError}});
+  }
+}
+
+// ICU opens its default converter for a null name.
+TEST(GetCodepageId, NullNameIsIcusDefault) {
+  const support::Recording recording(support::traceAll);
+  int32_t status = -1;
   EXPECT_NE(NLS2_GetCodepageId(nullptr, &status), 0U);
   EXPECT_EQ(status, 0);
-  EXPECT_EQ(recording.details("NLS2_GetCodepageId")[0], "Input parameters: CodePageName (null).");
+  EXPECT_EQ(recording.lines()[1], "NLS2_GetCodepageId: Input parameters: CodePageName (null).");
 }
 
 } // namespace

@@ -1,106 +1,62 @@
 // NLS2_GetLanguageName, NLS2_GetShortPosixName and NLS2_LanguageIDFromShortPosixName.
 
-#include "nls2.h"
-#include "support/recording_host.h"
-#include "support/trace_outline.h"
+#include "locale/scenario.h"
 
-#include <cstring>
+#include <cstdio>
 #include <gtest/gtest.h>
 
 namespace {
 
-using support::outline;
-using support::Recording;
-using support::traceAll;
+using support::plain;
+using support::said;
+using support::traced;
 
-TEST(GetLanguageName, WritesAsIcuDoes) {
-  const struct {
-    const char *reason;
-    uint32_t languageId;
-    int32_t length;
-    int32_t status;
-    const char *buffer; // "...." before
-    const char *end;
-  } rows[] = {
-      {"with its terminator", 0x03480001, 3, 0, "en\0.", ": Found languageID in table.\n= 0\n"},
-      {"no room for the terminator", 0x03480001, 2, 0, "en..",
-       ": Found languageID in table.\n= 0\n"},
-      {"too small", 0x03480001, 1, 15, "....",
-       ": Found languageID in table.\n: Error 15 retrieving language name from ICU.\n= 15\n"},
-      {"a negative length", 0x03480001, -1, 1, "....",
-       ": Found languageID in table.\n: Error 1 retrieving language name from ICU.\n= 1\n"},
-      {"unknown", 0x03480002, 4, 39, "....",
-       ": Could not find matching languageID in table.\n= 39\n"},
-      {"the terminator's id", 0xFF, 4, 39, "....",
-       ": Could not find matching languageID in table.\n= 39\n"},
-  };
-  for (const auto &row : rows) {
-    SCOPED_TRACE(row.reason);
-    char buffer[4] = {'.', '.', '.', '.'};
-    char input[100];
-    std::snprintf(input, sizeof input,
-                  ": Input parameters: languageID %X, buflen %d.\n: Locate languageID %d in table.",
-                  row.languageId, row.length, static_cast<int32_t>(row.languageId));
-    const Recording recording(traceAll);
-    EXPECT_EQ(NLS2_GetLanguageName(row.languageId, buffer, row.length), row.status);
-    if (row.status != U_BUFFER_OVERFLOW_ERROR) { // what ICU then leaves depends on its version
-      EXPECT_EQ(std::string(buffer, 4), std::string(row.buffer, 4));
-    }
-    EXPECT_EQ(outline(recording), std::string("> NLS2_GetLanguageName\n") + input + "\n" + row.end);
+// The status, and the bytes of a buffer of dots with 0 for NUL. What ICU leaves in a buffer that is
+// too small depends on its version.
+std::string language(uint32_t languageId, int32_t length) {
+  std::string buffer = "....";
+  const int32_t status = NLS2_GetLanguageName(languageId, buffer.data(), length);
+  for (char &byte : buffer) {
+    byte = byte == '\0' ? '0' : byte;
   }
+  return status == U_BUFFER_OVERFLOW_ERROR ? said(status) : said(status, buffer);
 }
 
-TEST(GetShortPosixName, CopiesTheFirstRecordsName) {
-  const struct {
-    const char *reason;
-    uint32_t languageId;
-    int32_t status;
-    const char *name;
-  } rows[] = {
-      {"the first of two records", 0x01140002, 0, "de_DE"},
-      {"not the posix record", 0x03480001, 0, "en_US"},
-      {"unknown", 1, 39, "untouched"},
-      {"the terminator's id", 0xFF, 39, "untouched"},
-  };
-  for (const auto &row : rows) {
-    SCOPED_TRACE(row.reason);
-    char name[16] = "untouched";
-    char input[100];
-    std::snprintf(input, sizeof input, ": Input parameters: languageID %X, buflen -7.\n",
-                  row.languageId);
-    const Recording recording(traceAll);
-    EXPECT_EQ(NLS2_GetShortPosixName(row.languageId, name, -7), row.status);
-    EXPECT_STREQ(name, row.name);
-    EXPECT_EQ(
-        outline(recording),
-        std::string("> NLS2_GetShortPosixName\n") + input + ": Locate name in the table.\n" +
-            (row.status == 0 ? ": Found matching languageID in the table.\n= 0\n" : "= 39\n"));
-  }
+std::string posix(uint32_t languageId) {
+  char name[16] = "untouched";
+  const int32_t status = NLS2_GetShortPosixName(languageId, name, -7);
+  return said(status, name);
 }
 
-TEST(LanguageIDFromShortPosixName, ComparesWholeNames) {
-  const struct {
-    const char *reason;
-    const char *name;
-    uint32_t languageId; // 0: status 37
-  } rows[] = {
-      {"a name", "en_US", 0x03480001},        {"the last record", "posix", 0x03480001},
-      {"a language alone", "de", 0x01140002}, {"letter case counts", "en_us", 0},
-      {"only a beginning", "en_U", 0},        {"empty, as the terminator's", "", 0},
+std::string idOf(const char *name) {
+  int32_t status = -1;
+  const uint32_t languageId = NLS2_LanguageIDFromShortPosixName(name, &status);
+  char digits[9];
+  std::snprintf(digits, sizeof digits, "%X", languageId);
+  return said(status, digits);
+}
+
+TEST(LanguageNames, AreFoundInTheTable) {
+  const support::Scenario rows[] = {
+      {"language", traced, [] { return language(0x03480001, 3); }, "0 en0."},
+      {"language, no room for the end", plain, [] { return language(0x03480001, 2); }, "0 en.."},
+      {"language, too small", traced, [] { return language(0x03480001, 1); }, "15"},
+      {"language, negative length", traced, [] { return language(0x03480001, -1); }, "1 ...."},
+      {"language, unknown", traced, [] { return language(0x03480002, 4); }, "39 ...."},
+      {"language of the terminator", plain, [] { return language(0xFF, 4); }, "39 ...."},
+      {"posix name, the first of two records", traced, [] { return posix(0x01140002); }, "0 de_DE"},
+      {"posix name, not the posix record", plain, [] { return posix(0x03480001); }, "0 en_US"},
+      {"posix name, unknown", traced, [] { return posix(1); }, "39 untouched"},
+      {"posix name of the terminator", plain, [] { return posix(0xFF); }, "39 untouched"},
+      {"language id", traced, [] { return idOf("en_US"); }, "0 3480001"},
+      {"language id, the last record", plain, [] { return idOf("posix"); }, "0 3480001"},
+      {"language id, a language alone", plain, [] { return idOf("de"); }, "0 1140002"},
+      {"language id, letter case counts", traced, [] { return idOf("en_us"); }, "37 0"},
+      {"language id, only a beginning", plain, [] { return idOf("en_U"); }, "37 0"},
+      {"language id, empty, as the terminator's", plain, [] { return idOf(""); }, "37 0"},
   };
   for (const auto &row : rows) {
-    SCOPED_TRACE(row.reason);
-    int32_t status = -1;
-    const Recording recording(traceAll);
-    EXPECT_EQ(NLS2_LanguageIDFromShortPosixName(row.name, &status), row.languageId);
-    EXPECT_EQ(status, row.languageId != 0 ? 0 : 37);
-    EXPECT_EQ(outline(recording),
-              std::string("> NLS2_LanguageIDFromShortPosixName\n"
-                          ": Input parameter: pShortPosixName ") +
-                  row.name + ".\n: Locate matching Short Posix Name in the table.\n" +
-                  (row.languageId != 0 ? ": Found matching name in the table.\n= " +
-                                             std::to_string(row.languageId) + "\n"
-                                       : ": No matching name in the table.\n= 0\n"));
+    support::expectScenario(row);
   }
 }
 

@@ -11,7 +11,8 @@
 
 namespace {
 
-support::Answers *answers = nullptr;
+const support::Answers *answers = nullptr;
+size_t codepagesAsked = 0;
 
 template <class Function>
 Function next(Function /*type*/, const char *name) {
@@ -31,26 +32,26 @@ namespace support {
 // sanitizer's has, gives it away here: in a trace it would look like null.
 void *firstObject = std::calloc(1, sizeof(NLS2_Locale));
 
-Answers::Answers() { answers = this; }
-Answers::~Answers() { answers = nullptr; }
+Answering::Answering(const Answers &given) {
+  answers = &given;
+  codepagesAsked = 0;
+}
+Answering::~Answering() { answers = nullptr; }
 
 } // namespace support
 
 extern "C" const char *uloc_getDefault() {
   static const auto original = NEXT(uloc_getDefault);
-  return answers != nullptr && answers->locale ? *answers->locale : original();
+  return answers != nullptr ? answers->locale : original();
 }
 
 extern "C" const char *ucnv_getDefaultName() {
   static const auto original = NEXT(ucnv_getDefaultName);
-  if (answers == nullptr || !answers->codepage) {
+  if (answers == nullptr) {
     return original();
   }
-  const char *name = *answers->codepage;
-  if (answers->nextCodepage) {
-    answers->codepage = answers->nextCodepage;
-  }
-  return name;
+  const auto &names = answers->codepages;
+  return codepagesAsked < names.size() ? names[codepagesAsked++] : names.back();
 }
 
 extern "C" int32_t ucnv_getCCSID(const UConverter *converter, UErrorCode *error) {
@@ -64,11 +65,11 @@ extern "C" int32_t ucnv_getCCSID(const UConverter *converter, UErrorCode *error)
 
 extern "C" const char *ucnv_getName(const UConverter *converter, UErrorCode *error) {
   static const auto original = NEXT(ucnv_getName);
-  if (answers == nullptr || (answers->nameError == U_ZERO_ERROR && !answers->name)) {
+  if (answers == nullptr || (answers->nameError == U_ZERO_ERROR && !answers->noName)) {
     return original(converter, error);
   }
   *error = answers->nameError;
-  return answers->name.value_or(nullptr);
+  return nullptr;
 }
 
 #if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)

@@ -2,9 +2,8 @@
 // puts its functions before ICU's and the C library's own.
 #pragma once
 
-#include <cstdint>
-#include <optional>
 #include <unicode/utypes.h>
+#include <vector>
 #if defined(__SANITIZE_ADDRESS__)
 #include <sanitizer/lsan_interface.h>
 #endif
@@ -24,21 +23,22 @@ using MeantLeak = __lsan::ScopedDisabler;
 struct MeantLeak {};
 #endif
 
-// While it lives, the fields that are set are the answers; the others are asked for as usual. One
-// at a time.
 struct Answers {
-  Answers();
-  ~Answers();
-  Answers(const Answers &) = delete;
-  Answers &operator=(const Answers &) = delete;
+  const char *locale = "en_US";                 // uloc_getDefault
+  std::vector<const char *> codepages{"UTF-8"}; // ucnv_getDefaultName, call by call; the last stays
+  UErrorCode ccsidError = U_ZERO_ERROR;         // ucnv_getCCSID, unless zero
+  UErrorCode nameError = U_ZERO_ERROR;          // ucnv_getName, unless zero
+  bool noName = false;                          // ucnv_getName: null, without an error
+  bool noObjects = false;                       // calloc of a locale object's size
+};
 
-  std::optional<const char *> locale = "en_US";   // uloc_getDefault
-  std::optional<const char *> codepage = "UTF-8"; // ucnv_getDefaultName
-  std::optional<const char *> nextCodepage;       // the same, from its second call on
-  UErrorCode ccsidError = U_ZERO_ERROR;           // ucnv_getCCSID
-  UErrorCode nameError = U_ZERO_ERROR;            // ucnv_getName
-  std::optional<const char *> name;
-  bool noObjects = false; // calloc of a locale object's size
+// While it lives, the answers are these. One at a time.
+class Answering {
+public:
+  explicit Answering(const Answers &answers);
+  ~Answering();
+  Answering(const Answering &) = delete;
+  Answering &operator=(const Answering &) = delete;
 };
 
 } // namespace support
