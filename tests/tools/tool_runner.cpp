@@ -21,7 +21,7 @@ namespace {
 
 // Standard input is a pipe where `input` is a descriptor of one, else a file.
 pid_t spawn(const std::vector<std::string> &arguments, int inputPipe, const std::string &input,
-            const std::string &output, const std::string &error) {
+            const std::string &output, const std::string &error, const std::string &directory) {
   std::vector<char *> argv{const_cast<char *>(NLS2_TOOL)};
   for (const std::string &argument : arguments) {
     argv.push_back(const_cast<char *>(argument.c_str()));
@@ -36,6 +36,7 @@ pid_t spawn(const std::vector<std::string> &arguments, int inputPipe, const std:
   }
   posix_spawn_file_actions_addopen(&actions, 1, output.c_str(), O_WRONLY | O_CREAT, 0666);
   posix_spawn_file_actions_addopen(&actions, 2, error.c_str(), O_WRONLY | O_CREAT, 0666);
+  posix_spawn_file_actions_addchdir_np(&actions, directory.c_str());
   pid_t pid = -1;
   const int failed = posix_spawn(&pid, NLS2_TOOL, &actions, nullptr, argv.data(), environ);
   posix_spawn_file_actions_destroy(&actions);
@@ -87,16 +88,17 @@ std::vector<std::string> words(const std::string &line) {
   return {std::istream_iterator<std::string>(stream), {}};
 }
 
-Result runTool(const std::vector<std::string> &arguments, std::string_view input) {
+Result runTool(const std::vector<std::string> &arguments, std::string_view input,
+               const std::string &directory) {
   const TempDir dir;
   writeFile(dir.path("in"), input);
   const int code =
-      exitCodeOf(spawn(arguments, -1, dir.path("in"), dir.path("out"), dir.path("err")));
+      exitCodeOf(spawn(arguments, -1, dir.path("in"), dir.path("out"), dir.path("err"), directory));
   return {code, readFile(dir.path("out")), readFile(dir.path("err"))};
 }
 
-Result runTool(const std::string &line, std::string_view input) {
-  return runTool(words(line), input);
+Result runTool(const std::string &line, std::string_view input, const std::string &directory) {
+  return runTool(words(line), input, directory);
 }
 
 RunningTool::RunningTool(const std::vector<std::string> &arguments, const std::string &outputPath,
@@ -106,7 +108,7 @@ RunningTool::RunningTool(const std::vector<std::string> &arguments, const std::s
   if (pipe2(ends, O_CLOEXEC) != 0) {
     throw std::runtime_error("cannot make a pipe");
   }
-  pid_ = spawn(arguments, ends[0], "", outputPath, errorPath);
+  pid_ = spawn(arguments, ends[0], "", outputPath, errorPath, ".");
   close(ends[0]);
   input_ = ends[1];
 }

@@ -35,9 +35,11 @@ struct Result {
   std::string err;
 };
 
-// Standard input is `input`, standard output a file that is read back.
-Result runTool(const std::vector<std::string> &arguments, std::string_view input = "");
-Result runTool(const std::string &line, std::string_view input = "");
+// Standard input is `input`, standard output a file that is read back. Runs in `directory`.
+Result runTool(const std::vector<std::string> &arguments, std::string_view input = "",
+               const std::string &directory = ".");
+Result runTool(const std::string &line, std::string_view input = "",
+               const std::string &directory = ".");
 
 // A nls2 that is running, its standard input a pipe from here.
 class RunningTool {
