@@ -149,7 +149,7 @@ TEST_P(Cases, AnswerAsTheFileHasThem) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Of, Cases, testing::Values("compare", "find", "sort", "translate"),
-                         [](const auto &info) { return std::string(info.param); });
+                         [](const auto &file) { return std::string(file.param); });
 
 } // namespace
 
