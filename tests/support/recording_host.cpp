@@ -24,8 +24,6 @@ std::atomic<uint32_t> currentFlags{0};
 uint32_t hostSync = 2;
 
 std::mutex listMutex;
-std::atomic<unsigned> lockCallCount{0};
-std::atomic<bool> held{false};
 
 std::string nameOf(const TRC1_EntryBlock *anchor) {
   return {anchor->functionName, anchor->functionNameLength};
@@ -56,20 +54,6 @@ Recording::~Recording() {
 std::vector<std::string> Recording::lines() const {
   const std::lock_guard<std::mutex> guard(recordMutex);
   return recorded;
-}
-
-std::string
-Recording::text(std::initializer_list<std::pair<const char *, const char *>> shortNames) const {
-  std::string all;
-  for (std::string line : lines()) {
-    for (const auto &[name, shortName] : shortNames) {
-      if (line.rfind(name, 0) == 0) {
-        line.replace(0, std::string(name).size(), shortName);
-      }
-    }
-    all += line + "\n";
-  }
-  return all;
 }
 
 std::vector<std::string> Recording::details(const std::string &function) const {
@@ -109,9 +93,6 @@ std::string hex(const void *pointer) {
 std::string exitValue(const void *pointer) {
   return std::to_string(static_cast<int32_t>(low32(pointer)));
 }
-
-unsigned lockCalls() { return lockCallCount; }
-bool lockHeld() { return held; }
 
 } // namespace support
 
@@ -181,14 +162,10 @@ void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t /*line*/, const void *address, 
 
 void SYS1_GetLock(void *lock) {
   listMutex.lock();
-  ++lockCallCount;
-  held = true;
   support::mark("lock " + support::hex(lock));
 }
 
 void SYS1_ReleaseLock(void *lock) {
-  held = false;
-  ++lockCallCount;
   support::mark("unlock " + support::hex(lock));
   listMutex.unlock();
 }

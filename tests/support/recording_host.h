@@ -5,9 +5,7 @@
 #include "trc1.h"
 
 #include <cstdint>
-#include <initializer_list>
 #include <string>
-#include <utility>
 #include <vector>
 
 namespace support {
@@ -34,8 +32,6 @@ public:
   Recording &operator=(const Recording &) = delete;
 
   std::vector<std::string> lines() const;
-  // All lines, each ended by a newline, with function names put shorter: {"NLS2_Name", "N"}.
-  std::string text(std::initializer_list<std::pair<const char *, const char *>> shortNames) const;
   // The lines of one function, its name and the sign cut off for detail lines: "detail text".
   std::vector<std::string> details(const std::string &function) const;
 };
@@ -59,9 +55,5 @@ void mark(const std::string &line);
 uint32_t low32(const void *pointer);
 std::string hex(const void *pointer);
 std::string exitValue(const void *pointer);
-
-// Calls of the lock service since the program began; `lockHeld` is true between a pair of them.
-unsigned lockCalls();
-bool lockHeld();
 
 } // namespace support
