@@ -1,4 +1,4 @@
-# What cmake --install puts where: headers, libraries, the command, the CMake package and the
+# What cmake --install puts where: headers, libraries, the command, manual pages, the CMake package and the
 # pkg-config file. The installed tree can be moved as a whole.
 
 include(CMakePackageConfigHelpers)
@@ -11,12 +11,14 @@ install(
   EXPORT zelnls2Targets
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR})
 install(FILES ${PROJECT_SOURCE_DIR}/include/nls2.h DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
+install(FILES ${PROJECT_SOURCE_DIR}/docs/zelnls2.3 DESTINATION ${CMAKE_INSTALL_MANDIR}/man3)
 install(FILES ${PROJECT_SOURCE_DIR}/host/trc1.h ${PROJECT_SOURCE_DIR}/host/sys1.h
         DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/zelnls2)
 if(ZELNLS2_BUILD_TOOL)
   file(RELATIVE_PATH _lib_from_bin ${CMAKE_INSTALL_FULL_BINDIR} ${CMAKE_INSTALL_FULL_LIBDIR})
   set_target_properties(nls2 PROPERTIES INSTALL_RPATH "$ORIGIN/${_lib_from_bin}")
   install(TARGETS nls2 DESTINATION ${CMAKE_INSTALL_BINDIR})
+  install(FILES ${PROJECT_SOURCE_DIR}/docs/nls2.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
 endif()
 
 install(
