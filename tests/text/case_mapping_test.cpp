@@ -1,9 +1,8 @@
-// NLS2_MapString: what little it maps, and each way out.
+// NLS2_MapString: what little it maps.
 
 #include "nls2.h"
 #include "support/call_trace.h"
 #include "support/icu_probe.h"
-#include "support/recording_host.h"
 
 #include <gtest/gtest.h>
 #include <string>
@@ -11,7 +10,6 @@
 namespace {
 
 using namespace std::string_literals;
-using support::hex;
 using support::LiveLocale;
 
 const uint32_t optionSets[] = {NLS2_MAP_FOLDCASE, NLS2_MAP_UPPERCASE, NLS2_MAP_LOWERCASE, 0, 0x410};
@@ -52,49 +50,6 @@ TEST(MapString, MapsTheEmptyTextIntoTwoNulls) {
     }
     EXPECT_EQ(support::openConverters(), before) << row.reason;
   }
-}
-
-TEST(MapString, TracesEachWayOut) {
-  static const NLS2_Locale notLive{};
-  const LiveLocale live(819);
-  const LiveLocale none(57364);
-  const auto expect = [&](const NLS2_Locale *locale, const char *src, int32_t dlen,
-                          uint32_t options, std::vector<support::Step> steps) {
-    char dest[4];
-    char input[160];
-    std::snprintf(input, sizeof input,
-                  "Input parameters: pLocale %s, dest %s, dlen %d, src %s, slen 77,options %x.\n",
-                  hex(locale).c_str(), hex(dest).c_str(), dlen, hex(src).c_str(), options);
-    steps[0].lines = input + steps[0].lines;
-    support::expectSteps("NLS2_MapString", steps,
-                         [&] { return NLS2_MapString(locale, dest, dlen, src, 77, options); });
-  };
-  const std::string opened = "ValidateLocale= 0\n+ucnv\n";
-  const std::string both = opened + "realloc_mem=\nrealloc_mem=\n";
-  expect(&notLive, "", 4, 0x400, {{"", {}, "ValidateLocale= 38\n= 38\n", 38}});
-  expect(none.get(), "", 4, 0x400, {{"", {}, "ValidateLocale= 0\n= 4\n", 4}});
-  expect(live.get(), "a", 4, 0x400, {{opened, {}, "-ucnv\n= 15\n", 15}});
-  expect(
-      live.get(), "", 4, 0x400,
-      {{opened, {"ucnv_toUChars", 1}, "-ucnv\n= 7\n", 7},
-       {"",
-        {nullptr, 0, 2},
-        "Memory allocation failure: Size(2), Old((nil))\nrealloc_mem=\n-ucnv\n"
-        "Invalid locale.\n= 32\n",
-        32},
-       {"realloc_mem=\n", {"ucnv_toUChars", 2}, "-ucnv\n= 7\n", 7},
-       {"",
-        {nullptr, 0, 4},
-        "Memory allocation failure: Size(4), Old((nil))\nrealloc_mem=\n-ucnv\n= 32\n",
-        32},
-       {"realloc_mem=\n", {"u_strToUpper", 1}, "Error occurred during mapping 7.\n-ucnv\n= 7\n", 7},
-       {"", {"ucnv_fromUChars", 1}, "Error occurred during conversion 7.\n-ucnv\n= 7\n", 7},
-       {"-ucnv\n= 2\n", {}, "", 2}});
-  expect(live.get(), "", 4, 0x800,
-         {{both, {"u_strToLower", 1}, "Error occurred during mapping 7.\n-ucnv\n= 7\n", 7}});
-  expect(live.get(), "", 4, 0x10,
-         {{both, {"u_strFoldCase", 1}, "Error occurred during mapping 7.\n-ucnv\n= 7\n", 7}});
-  expect(live.get(), "", 4, 0x410, {{both, {}, "No opiton specified.\n-ucnv\n= 2\n", 2}});
 }
 
 } // namespace
