@@ -1,7 +1,7 @@
 // Lengths and the size ratio of code pages.
 
 #include "nls2.h"
-#include "support/call_trace.h"
+#include "support/live_locale.h"
 
 #include <gtest/gtest.h>
 

@@ -1,7 +1,7 @@
 // NLS2_StringToUnicode and NLS2_UnicodeToString: the in-place layout.
 
 #include "nls2.h"
-#include "support/call_trace.h"
+#include "support/live_locale.h"
 
 #include <algorithm>
 #include <gtest/gtest.h>

@@ -2,7 +2,7 @@
 // of output.
 
 #include "nls2.h"
-#include "support/call_trace.h"
+#include "support/live_locale.h"
 #include "support/icu_probe.h"
 #include "support/recording_host.h"
 

@@ -43,12 +43,12 @@ Function next(Function /*type*/, const char *name) {
 // ICU's function behind the program's own. Its exported name carries ICU's version.
 #define TEXT_OF(symbol) #symbol
 #define NAME_OF(symbol) TEXT_OF(symbol)
-#define NEXT(function) support::next(&function, NAME_OF(function))
+#define NEXT(function) support::next(&(function), NAME_OF(function))
 
 // Puts a function before ICU's that fails on request and is otherwise ICU's; `error` names the
 // parameter for the error, `passedOn` calls `original`, `refused` is what a failing call returns.
 #define PROBE(Result, function, parameters, passedOn, refused)                                     \
   extern "C" Result function parameters {                                                          \
     static const auto original = NEXT(function);                                                   \
-    return support::refuse(#function, error) ? refused : passedOn;                                 \
+    return support::refuse(#function, error) ? (refused) : (passedOn);                             \
   }

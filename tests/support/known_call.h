@@ -1,10 +1,10 @@
 // Calls with a fault on request, whose whole trace is a known one.
 #pragma once
 
-#include "support/call_trace.h"
 #include "support/heap_probe.h"
 #include "support/icu_probe.h"
 #include "support/known_trace.h"
+#include "support/live_locale.h"
 
 #include <functional>
 #include <sstream>

@@ -1,7 +1,7 @@
 // NLS2_Strcoll and NLS2_Findstr: answers, and orders against bare ICU.
 
 #include "nls2.h"
-#include "support/call_trace.h"
+#include "support/live_locale.h"
 #include "support/icu_probe.h"
 #include "support/recording_host.h"
 

@@ -1,7 +1,7 @@
 // NLS2_MapString: what little it maps.
 
 #include "nls2.h"
-#include "support/call_trace.h"
+#include "support/live_locale.h"
 #include "support/icu_probe.h"
 
 #include <gtest/gtest.h>

@@ -1,7 +1,7 @@
 // NLS2_Findstr: the buffer that two of its ways out leave behind.
 
 #include "nls2.h"
-#include "support/call_trace.h"
+#include "support/live_locale.h"
 #include "support/heap_probe.h"
 #include "support/icu_probe.h"
 
