@@ -15,22 +15,22 @@ using namespace std::string_literals;
 
 class Streams : public testing::Test {
 protected:
-  ~Streams() override { unlink(path_.c_str()); }
+  ~Streams() override { unlink(path.c_str()); }
 
   UFILE *open(const char *permissions, const char *encoding) {
-    return NLS2_OpenStream(locale_.get(), path_.c_str(), permissions, encoding);
+    return NLS2_OpenStream(live.get(), path.c_str(), permissions, encoding);
   }
-  void close(UFILE *stream) { EXPECT_EQ(NLS2_CloseStream(locale_.get(), stream), 0); }
-  void write(const std::string &bytes) { std::ofstream(path_, std::ios::binary) << bytes; }
+  void close(UFILE *stream) { EXPECT_EQ(NLS2_CloseStream(live.get(), stream), 0); }
+  void write(const std::string &bytes) { std::ofstream(path, std::ios::binary) << bytes; }
   std::string bytes() {
-    std::ifstream file(path_, std::ios::binary);
+    std::ifstream file(path, std::ios::binary);
     return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
   }
   // All lines, read into a buffer of this capacity; a | ends each.
   std::u16string lines(UFILE *stream, int32_t capacity = 80) {
     std::u16string all;
     const auto buffer = std::make_unique<UChar[]>(static_cast<std::size_t>(capacity));
-    while (const UChar *line = NLS2_Fgets(locale_.get(), stream, buffer.get(), capacity)) {
+    while (const UChar *line = NLS2_Fgets(live.get(), stream, buffer.get(), capacity)) {
       EXPECT_EQ(line, buffer.get());
       all.append(line).append(u"|");
     }
@@ -41,15 +41,15 @@ protected:
     std::u16string all;
     const auto buffer = std::make_unique<UChar[]>(static_cast<std::size_t>(length));
     int32_t got = 0;
-    while ((got = NLS2_ReadString(locale_.get(), stream, buffer.get(), length)) > 0) {
+    while ((got = NLS2_ReadString(live.get(), stream, buffer.get(), length)) > 0) {
       all.append(buffer.get(), static_cast<std::size_t>(got));
     }
     EXPECT_EQ(got, 0);
     return all;
   }
 
-  const support::LiveLocale locale_{1208, "de_DE"};
-  const std::string path_ = testing::TempDir() + "nls2_io_" + std::to_string(getpid());
+  const support::LiveLocale live{1208, "de_DE"};
+  const std::string path = testing::TempDir() + "nls2_io_" + std::to_string(getpid());
 };
 
 TEST_F(Streams, EveryEncodingHasItsBytesAndReadsBack) {
@@ -68,8 +68,8 @@ TEST_F(Streams, EveryEncodingHasItsBytesAndReadsBack) {
     SCOPED_TRACE(encoding);
     UFILE *stream = open("w+", encoding);
     ASSERT_NE(stream, nullptr);
-    EXPECT_EQ(NLS2_Fputs(locale_.get(), u"G\u00FC\u00DF", stream), 4);
-    EXPECT_EQ(NLS2_WriteString(locale_.get(), u"ja, not more", 2, stream), 2);
+    EXPECT_EQ(NLS2_Fputs(live.get(), u"G\u00FC\u00DF", stream), 4);
+    EXPECT_EQ(NLS2_WriteString(live.get(), u"ja, not more", 2, stream), 2);
     NLS2_Fflush(stream);
     EXPECT_EQ(bytes(), expected);
     NLS2_Frewind(stream);
@@ -116,8 +116,8 @@ TEST_F(Streams, LongTextsGoThroughWhole) {
     text += u"a\U0001F600";
   }
   UFILE *stream = open("w", "UTF-8");
-  EXPECT_EQ(NLS2_WriteString(locale_.get(), text.data(), 4501, stream), 4501);
-  EXPECT_EQ(NLS2_WriteString(locale_.get(), text.c_str() + 4501, -1, stream), 4499)
+  EXPECT_EQ(NLS2_WriteString(live.get(), text.data(), 4501, stream), 4501);
+  EXPECT_EQ(NLS2_WriteString(live.get(), text.c_str() + 4501, -1, stream), 4499)
       << "the rest, null-terminated, from the second half of a pair on";
   close(stream);
   EXPECT_EQ(bytes().size(), 3000U * 5);
@@ -132,7 +132,7 @@ TEST_F(Streams, WhatDoesNotOpen) {
   EXPECT_EQ(open("r", "UTF-8"), nullptr) << "no such file";
   write("text");
   const NLS2_Locale unlisted{};
-  EXPECT_EQ(NLS2_OpenStream(&unlisted, path_.c_str(), "w", "UTF-8"), nullptr);
+  EXPECT_EQ(NLS2_OpenStream(&unlisted, path.c_str(), "w", "UTF-8"), nullptr);
   EXPECT_EQ(open("?", "UTF-8"), nullptr) << "no such mode";
   EXPECT_EQ(open("r", "no-such-encoding"), nullptr);
   EXPECT_EQ(bytes(), "text") << "none of these may touch the file";
