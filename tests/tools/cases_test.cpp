@@ -171,7 +171,8 @@ TEST_P(Cases, AnswerAsTheFileHasThem) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Of, Cases,
-                         testing::Values("cat", "compare", "detect", "find", "sort", "translate"),
+                         testing::Values("cat", "codepages", "compare", "detect", "find", "locales",
+                                         "sort", "translate", "usage"),
                          [](const auto &file) { return std::string(file.param); });
 
 } // namespace

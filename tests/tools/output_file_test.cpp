@@ -104,31 +104,13 @@ TEST(OutputFile, RecordsComeOutWhileTheInputIsStillOpen) {
   EXPECT_EQ(readFile(dir.path("out")), "ABCD");
 }
 
-TEST(OutputFile, FilesThatFail) {
+TEST(OutputFile, ALinkToNothingStaysOne) {
   const TempDir dir;
-  const std::string record(80, '\xC1');
-  writeFile(dir.path("in"), record);
   fs::create_symlink("nowhere", dir.path("dangling"));
-  const struct {
-    std::string why;
-    std::string arguments;
-    int exitCode;
-    std::string err;
-  } cases[] = {
-      {"a full device", "- -o /dev/full", 1, "cannot write /dev/full: No space left on device"},
-      {"a device is written to", "- -o /dev/null", 0, ""},
-      {"no input", dir.path("absent"), 1, "absent: No such file or directory"},
-      {"a directory as input", dir.path("."), 1, "Is a directory"},
-      {"a directory as output", "- -o " + dir.path("."), 1, "Is a directory"},
-      {"no such directory", "- -o " + dir.path("a/b"), 1, "No such file or directory"},
-      {"a link to nothing", "- -o " + dir.path("dangling"), 1, "leads nowhere"},
-  };
-  for (const auto &c : cases) {
-    const Result result = runTool(translate + c.arguments, record);
-    EXPECT_EQ(result.exitCode, c.exitCode) << c.why;
-    EXPECT_NE(result.err.find(c.err), std::string::npos) << c.why << "\n" << result.err;
-  }
-  EXPECT_EQ(dir.names(), (Names{"dangling", "in"}));
+  const Result result = runTool(translate + "- -o " + dir.path("dangling"));
+  EXPECT_EQ(result.exitCode, 1);
+  EXPECT_NE(result.err.find("leads nowhere"), std::string::npos) << result.err;
+  EXPECT_EQ(dir.names(), Names{"dangling"});
 }
 
 TEST(OutputFile, StandardOutputThatFails) {
