@@ -2,8 +2,8 @@
 // of output.
 
 #include "nls2.h"
-#include "support/live_locale.h"
 #include "support/icu_probe.h"
+#include "support/live_locale.h"
 #include "support/recording_host.h"
 
 #include <algorithm>

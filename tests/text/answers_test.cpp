@@ -1,8 +1,8 @@
 // NLS2_Strcoll and NLS2_Findstr: answers, and orders against bare ICU.
 
 #include "nls2.h"
-#include "support/live_locale.h"
 #include "support/icu_probe.h"
+#include "support/live_locale.h"
 #include "support/recording_host.h"
 
 #include <gtest/gtest.h>

@@ -1,8 +1,8 @@
 // NLS2_MapString: what little it maps.
 
 #include "nls2.h"
-#include "support/live_locale.h"
 #include "support/icu_probe.h"
+#include "support/live_locale.h"
 
 #include <gtest/gtest.h>
 #include <string>

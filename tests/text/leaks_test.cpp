@@ -1,9 +1,9 @@
 // NLS2_Findstr: the buffer that two of its ways out leave behind.
 
 #include "nls2.h"
-#include "support/live_locale.h"
 #include "support/heap_probe.h"
 #include "support/icu_probe.h"
+#include "support/live_locale.h"
 
 #include <gtest/gtest.h>
 #include <malloc.h>
