@@ -16,9 +16,9 @@ using support::Recording;
 
 const NLS2_Locale unlisted{};
 // A heap whose first block of a size has an address that ends in 32 zero bits, as the thread
-// sanitizer's has, gives it away here: in a trace it would look like 0.
+// sanitizer's has, gives it away here: in a trace it would look like 0. The tests do the same with
+// streams and bundles.
 [[maybe_unused]] const auto firstObject = std::make_unique<NLS2_Locale>();
-[[maybe_unused]] UFILE *const firstStream = u_fopen("/dev/null", "r", nullptr, nullptr);
 
 // Units that consist of these bytes, whatever the machine's order.
 std::u16string unitsOf(const std::string &bytes) {
@@ -37,6 +37,7 @@ void answer(const void *pointer, const int32_t *status = nullptr) {
 TEST(IoTraces, StreamsAskIcuOnlyForALiveLocale) {
   const support::LiveLocale live(1208);
   const std::u16string text = unitsOf("ABCD");
+  UFILE *first = u_fopen("/dev/null", "r", nullptr, nullptr);
   for (const NLS2_Locale *locale : {live.get(), &unlisted}) {
     UFILE *file = u_fopen("/dev/null", "w", nullptr, "UTF-8");
     std::u16string buffer = unitsOf("old\0\0\0\0\0"s);
@@ -57,17 +58,13 @@ TEST(IoTraces, StreamsAskIcuOnlyForALiveLocale) {
         {{locale, "locale"}, {file, "file"}, {opened, "opened"}, {buffer.data(), "buffer"}});
     NLS2_CloseStream(live.get(), locale == &unlisted ? file : opened);
   }
+  u_fclose(first);
 }
 
 TEST(IoTraces, Signatures) {
-  const std::pair<std::string, int32_t> cases[] = {{"\xFE\xFF", 2},
-                                                   {"\xFF\xFE\0\0"s, 4},
-                                                   {"\xFF\xFE\0\0"s, 3},
-                                                   {"\xEF\xBB\xBF", -1},
-                                                   {"\xDD\x73\x66\x73", 4},
-                                                   {"\xEF\xBB", 2},
-                                                   {"", 0},
-                                                   {"\xFF\xFE", -2}};
+  const std::pair<std::string, int32_t> cases[] = {
+      {"\xFE\xFF", 2},         {"\xFF\xFE\0\0"s, 4}, {"\xFF\xFE\0\0"s, 3}, {"\xEF\xBB\xBF", -1},
+      {"\xDD\x73\x66\x73", 4}, {"\xEF\xBB", 2},      {"\xFF\xFE", -2}};
   support::Names names;
   const Recording recording(support::traceAll);
   for (const auto &[bytes, given] : cases) {
