@@ -42,13 +42,23 @@ Json canonicalName(const std::string &name) {
   return canonical != nullptr ? Json(canonical) : Json();
 }
 
-Json ccsidOf(const Json &name) {
-  if (name.is_null()) {
+// NLS2_GetCodepageId, asked only where it finds a number: it leaks its converter otherwise.
+std::optional<uint32_t> codepageId(const std::string &name) {
+  UErrorCode error = U_ZERO_ERROR;
+  const icu::LocalUConverterPointer converter(ucnv_open(name.c_str(), &error));
+  if (converter.isNull()) {
     return {};
   }
   int32_t status = U_ZERO_ERROR;
-  const uint32_t ccsid = NLS2_GetCodepageId(name.get<std::string>().c_str(), &status);
-  return status == U_ZERO_ERROR ? Json(ccsid) : Json();
+  const bool numbered = ucnv_getCCSID(converter.getAlias(), &error) != 0;
+  const uint32_t number = numbered ? NLS2_GetCodepageId(name.c_str(), &status)
+                                   : NLS2_MapWindowsNameToCCSID(name.c_str(), &status);
+  return status == U_ZERO_ERROR ? std::optional(number) : std::nullopt;
+}
+
+Json ccsidOf(const Json &name) {
+  const auto number = name.is_null() ? std::nullopt : codepageId(name.get<std::string>());
+  return number ? Json(*number) : Json();
 }
 
 Json windowsNamesOf(int32_t number) {
@@ -87,21 +97,23 @@ std::optional<uint32_t> numberInside(const std::string &name) {
 // name without any of them, the numbers that the library opens as the same converter.
 std::vector<int32_t> numbersOf(const std::string &name) {
   std::vector<int32_t> numbers;
-  const auto add = [&](uint32_t number, int32_t status) {
+  const auto add = [&](uint32_t number) {
     const auto signedNumber = static_cast<int32_t>(number);
-    if (status == U_ZERO_ERROR &&
-        std::find(numbers.begin(), numbers.end(), signedNumber) == numbers.end()) {
+    if (std::find(numbers.begin(), numbers.end(), signedNumber) == numbers.end()) {
       numbers.push_back(signedNumber);
     }
   };
+  if (const auto icuNumber = codepageId(name)) {
+    add(*icuNumber);
+  }
   int32_t status = U_ZERO_ERROR;
-  const uint32_t icuNumber = NLS2_GetCodepageId(name.c_str(), &status);
-  add(icuNumber, status);
   const uint32_t windowsNumber = NLS2_MapWindowsNameToCCSID(name.c_str(), &status);
-  add(windowsNumber, status);
+  if (status == U_ZERO_ERROR) {
+    add(windowsNumber);
+  }
   const auto inside = numberInside(name);
   if (inside && !canonicalName(static_cast<int32_t>(*inside)).is_null()) {
-    add(*inside, U_ZERO_ERROR);
+    add(*inside);
   }
   const Json canonical = canonicalName(name);
   if (numbers.empty() && !canonical.is_null()) {
