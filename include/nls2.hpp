@@ -41,6 +41,8 @@
 #include "nls2/error.hpp"
 #include "nls2/language.hpp"
 #include "nls2/locale.hpp"
+#include "nls2/signature.hpp"
+#include "nls2/text.hpp"
 
 #include <string_view>
 
