@@ -42,6 +42,7 @@
 #include "nls2/language.hpp"
 #include "nls2/locale.hpp"
 #include "nls2/signature.hpp"
+#include "nls2/stream.hpp"
 #include "nls2/text.hpp"
 
 #include <string_view>
