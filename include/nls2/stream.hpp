@@ -88,9 +88,9 @@ public:
     return kept + static_cast<std::size_t>(got);
   }
 
-  // Reads a line without its end. False at the end of the file and on failure. A line ends in
-  // U+000A, U+000B, U+000C, U+000D (with a U+000A that follows), U+0085, U+2028 or U+2029; the last
-  // one may have no end. Nulls inside are text.
+  // Reads a line without its end. False at the end of the file and on failure, when `line` holds
+  // what could be read. A line ends in U+000A, U+000B, U+000C, U+000D (with a U+000A that follows),
+  // U+0085, U+2028 or U+2029; the last one may have no end. Nulls inside are text.
   bool read_line(std::u16string &line, std::error_code &error) {
     line.clear();
     if (!check(0, error)) {
@@ -102,7 +102,7 @@ public:
     error = failure();
     const bool found = !error && !line.empty();
     if (found && ends_line(line.back())) {
-      take_end(line, error);
+      take_end(line);
     }
     return found;
   }
@@ -214,8 +214,9 @@ private:
     return true;
   }
 
-  // A line feed after a carriage return comes with it, or starts the next piece.
-  void take_end(std::u16string &line, std::error_code &error) noexcept {
+  // A line feed after a carriage return comes with it, or starts the next piece. A failure to look
+  // there is for the next call to report.
+  void take_end(std::u16string &line) noexcept {
     const char16_t end = line.back();
     line.pop_back();
     if (end == u'\n' && !line.empty() && line.back() == u'\r') {
@@ -225,7 +226,6 @@ private:
     if (end == u'\r' && NLS2_ReadString(live_, owned_, &next, 1) == 1 && next != u'\n') {
       ahead_ = next;
     }
-    error = failure();
   }
 
   UFILE *owned_ = nullptr;
