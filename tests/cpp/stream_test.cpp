@@ -27,7 +27,7 @@ protected:
 };
 
 TEST_F(Streams, LinesEndWhereTheyEnd) {
-  for (const std::size_t length : {1, 254, 255, 256, 510}) { // pieces have 255 units
+  for (const std::size_t length : {1U, 254U, 255U, 256U, 510U}) { // pieces have 255 units
     const std::u16string text(length, u'x');
     const std::u16string lines[] = {text, u"", u"\U0001F600", u"a\0\uFFFF"s + text, u"", text};
     for (const std::u16string_view end :
