@@ -2,7 +2,7 @@
 // NLS2_GetThreadLocale.
 
 #include "locale/locale_map.h"
-#include "locale/object_lines.h"
+#include "locale/trace_object.h"
 #include "nls2.h"
 #include "trace/frame.h"
 
