@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <exception>
 #include <iostream>
+#include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -14,9 +15,12 @@
 namespace {
 
 // A field of an international EBCDIC record as UTF-8, without its trailing blanks.
-std::string fieldText(std::string_view field) {
-  std::string text = nls2::translate(nls2::utf8_page, nls2::code_page(500), field);
-  return text.erase(text.find_last_not_of(' ') + 1);
+std::string fieldText(nls2::field_translator &translator, std::string_view field) {
+  std::string text;
+  if (!translator.translate(field, text)) {
+    throw std::runtime_error("the field is not text of its code page");
+  }
+  return text;
 }
 
 void greet(std::string_view language, std::string_view directory, std::vector<std::string> names) {
@@ -40,10 +44,14 @@ int main(int argc, char **argv) {
     return 2;
   }
   try {
-    const std::vector<std::string> names = {
-        fieldText("\xE9\x96\x53\x40\x40\x40\x40\x40\x40\x40"),  // Zoë
-        fieldText("\x71\x94\x89\x93\x85\x40\x40\x40\x40\x40"),  // Émile
-        fieldText("\xEC\xA9\x93\x85\x94\x40\x40\x40\x40\x40")}; // Özlem
+    nls2::field_translator translator(nls2::code_page(500), nls2::utf8_page,
+                                      {.padding = nls2::padding::strip});
+    std::vector<std::string> names;
+    for (const char *field : {"\xE9\x96\x53\x40\x40\x40\x40\x40\x40\x40",    // Zoë
+                              "\x71\x94\x89\x93\x85\x40\x40\x40\x40\x40",    // Émile
+                              "\xEC\xA9\x93\x85\x94\x40\x40\x40\x40\x40"}) { // Özlem
+      names.push_back(fieldText(translator, field));
+    }
     greet("de_DE", argv[1], names);
     greet("fr_FR", argv[1], names);
     return 0;

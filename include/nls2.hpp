@@ -39,6 +39,7 @@
 #include "nls2/bundle.hpp"
 #include "nls2/code_page.hpp"
 #include "nls2/error.hpp"
+#include "nls2/field_translator.hpp"
 #include "nls2/language.hpp"
 #include "nls2/locale.hpp"
 #include "nls2/signature.hpp"

@@ -2,7 +2,7 @@
 #ifndef NLS2_BUNDLE_HPP
 #define NLS2_BUNDLE_HPP
 
-#include "nls2/detail.hpp"
+#include "nls2/detail/common.hpp"
 #include "nls2/locale.hpp"
 
 #include <cstdint>

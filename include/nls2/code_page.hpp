@@ -2,7 +2,7 @@
 #ifndef NLS2_CODE_PAGE_HPP
 #define NLS2_CODE_PAGE_HPP
 
-#include "nls2/detail.hpp"
+#include "nls2/detail/common.hpp"
 
 #include <cstddef>
 #include <cstdint>

@@ -2,7 +2,7 @@
 #ifndef NLS2_LANGUAGE_HPP
 #define NLS2_LANGUAGE_HPP
 
-#include "nls2/detail.hpp"
+#include "nls2/detail/common.hpp"
 
 #include <cstddef>
 #include <cstdint>

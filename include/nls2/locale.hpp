@@ -3,7 +3,7 @@
 #define NLS2_LOCALE_HPP
 
 #include "nls2/code_page.hpp"
-#include "nls2/detail.hpp"
+#include "nls2/detail/common.hpp"
 #include "nls2/language.hpp"
 
 #include <string_view>

@@ -3,7 +3,7 @@
 #define NLS2_TEXT_HPP
 
 #include "nls2/code_page.hpp"
-#include "nls2/detail.hpp"
+#include "nls2/detail/common.hpp"
 #include "nls2/locale.hpp"
 
 #include <algorithm>

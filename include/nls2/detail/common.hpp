@@ -1,6 +1,6 @@
-// detail.hpp - what the parts of the C++ interface share; not for programs.
-#ifndef NLS2_DETAIL_HPP
-#define NLS2_DETAIL_HPP
+// common.hpp - what the parts of the C++ interface share; not for programs.
+#ifndef NLS2_DETAIL_COMMON_HPP
+#define NLS2_DETAIL_COMMON_HPP
 
 #include "nls2/error.hpp"
 
