@@ -2,7 +2,9 @@
 
 #include "codepage/code_page.h"
 
+#include "codepage/page_names.h"
 #include "errors.h"
+#include "near_names.h"
 #include "options.h"
 
 #include <algorithm>
@@ -25,8 +27,28 @@ void requireMemory(int32_t status) {
 } // namespace
 
 int32_t parsePage(const char *option, const std::string &text) {
-  return parseNumber(option, text, std::numeric_limits<int32_t>::min(),
-                     std::numeric_limits<int32_t>::max());
+  if (text.find_first_not_of("0123456789", text.starts_with("-") ? 1 : 0) == std::string::npos &&
+      !text.empty()) {
+    return parseNumber(option, text, std::numeric_limits<int32_t>::min(),
+                       std::numeric_limits<int32_t>::max());
+  }
+  if (const auto number = wholeNumber(text);
+      number && *number <= std::numeric_limits<int32_t>::max()) {
+    return static_cast<int32_t>(*number);
+  }
+  const auto number = numberOf(text);
+  const auto meanings = meaningsOf(text);
+  if (number && (meanings.empty() || windowsPage(text) == number)) {
+    return *number;
+  }
+  if (!meanings.empty()) {
+    throw usageError("{}: the name {} has several tables{}", option, printable(text),
+                     didYouMean(meanings));
+  }
+  throw converterOf(text)
+      ? usageError("{}: the library has no number for code page {}; `nls2 codepages` lists numbers",
+                   option, printable(text))
+      : usageError("{}: unknown code page {}{}", option, printable(text), nearPages(text));
 }
 
 CodePage::CodePage(int32_t number, const char *option) : number_(number) {
@@ -34,8 +56,8 @@ CodePage::CodePage(int32_t number, const char *option) : number_(number) {
   converter_ = open_converter(nls2::code_page(number), error);
   requireMemory(error.value());
   if (!converter_) {
-    throw usageError("{}: code page {} does not open: {}; `nls2 codepages` lists numbers", option,
-                     number, error.message());
+    throw usageError("{}: code page {} does not open: {}{}; `nls2 codepages` lists numbers", option,
+                     number, error.message(), nearPages(std::to_string(number)));
   }
 }
 
