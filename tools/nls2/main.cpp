@@ -25,6 +25,7 @@ constexpr std::array commands{
     CommandEntry{"codepages", "List code pages by number and by Windows name", exitFailed,
                  codepagesCommand},
     CommandEntry{"detect", "Report the Unicode signatures of files", exitUsage, detectCommand},
+    CommandEntry{"dump", "Show a file in hex and as text of a code page", exitFailed, dumpCommand},
     CommandEntry{"cat", "Write text files in any encoding to standard output as UTF-8", exitFailed,
                  catCommand},
     CommandEntry{"compare", "Compare two strings by the rules of a language", exitUsage,

@@ -107,8 +107,8 @@ std::optional<EncodedCharacter> CodePage::encoded(char16_t character) const {
   const std::string two = encode(std::u16string(2, character));
   char16_t back[fewBytes] = {};
   UErrorCode error = U_ZERO_ERROR;
-  const int32_t units =
-      ucnv_toUChars(converter(), back, fewBytes, one.data(), static_cast<int32_t>(one.size()), &error);
+  const int32_t units = ucnv_toUChars(converter(), back, fewBytes, one.data(),
+                                      static_cast<int32_t>(one.size()), &error);
   requireMemory(error);
   if (U_FAILURE(error) || units != 1 || back[0] != character) {
     return {};
