@@ -72,6 +72,8 @@ std::string generalHelp() {
     text += fmt::format("  {:<24} {}\n", entry.name, entry.summary);
   }
   text += fmt::format("  {:<24} {}\n", "help [COMMAND]", "Print this help, or that of a command");
+  text +=
+      fmt::format("  {:<24} {}\n", "-h, --help", "Print this help, or a command's after its name");
   text += fmt::format("  {:<24} {}\n", "--version", "Print how the library was built");
   return text + "\n" + generalNotes + "See nls2(1).\n";
 }

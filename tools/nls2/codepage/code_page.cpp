@@ -49,12 +49,10 @@ int32_t parsePage(const char *option, const std::string &text) {
   if (const auto number = givenNumber(option, text)) {
     return *number;
   }
-  const auto number = numberOf(text);
-  const std::vector<std::string> meanings = meaningsOf(text);
-  if (number && (meanings.empty() || windowsPage(text) == number)) {
+  if (const auto number = numberOf(text)) {
     return *number;
   }
-  if (!meanings.empty()) {
+  if (const auto meanings = meaningsOf(text); !meanings.empty()) {
     throw usageError("{}: {} means several tables{}", option, printable(text),
                      didYouMean(meanings));
   }

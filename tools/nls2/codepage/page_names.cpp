@@ -111,10 +111,14 @@ std::optional<int32_t> numberOf(const std::string &name) {
     return windows;
   }
   const auto opensIt = [&](int32_t number) { return converterOf(number) == converter; };
-  for (const std::optional<int32_t> candidate : {ccsidOf(name), windows}) {
-    if (candidate && opensIt(*candidate)) {
-      return candidate;
-    }
+  if (windows && opensIt(*windows)) {
+    return windows;
+  }
+  if (!meaningsOf(name).empty()) {
+    return {};
+  }
+  if (const std::optional<int32_t> ccsid = ccsidOf(name); ccsid && opensIt(*ccsid)) {
+    return ccsid;
   }
   const auto found = std::find_if(pagesWithNames.begin(), pagesWithNames.end(), opensIt);
   return found != pagesWithNames.end() ? std::optional(*found) : std::nullopt;
@@ -129,6 +133,14 @@ std::vector<std::string> allPageNames() {
   for (const CcsidMapEntry *entry = ccsidMap; entry->ccsid != NLS2_CCSID_MAP_END; ++entry) {
     names.emplace_back(entry->name);
   }
+  return names;
+}
+
+std::vector<std::string> namesWithNumbers() {
+  std::vector<std::string> names = allPageNames();
+  std::erase_if(names, [](const std::string &name) { return !numberOf(name); });
+  std::sort(names.begin(), names.end());
+  names.erase(std::unique(names.begin(), names.end()), names.end());
   return names;
 }
 

@@ -3,6 +3,7 @@
 
 #include "codepage/byte_chart.h"
 #include "codepage/codepage_render.h"
+#include "codepage/page_names.h"
 #include "commands.h"
 #include "io/print.h"
 
@@ -22,6 +23,7 @@ struct Arguments {
   std::vector<std::string> pages;
   bool asChart = false;
   bool asDifference = false;
+  bool asNames = false;
   bool asJson = false;
 };
 
@@ -44,15 +46,35 @@ std::string difference(const Arguments &arguments) {
       arguments, [&] { return differenceAsText(a, b); }, [&] { return differenceAsJson(a, b); });
 }
 
+std::string namesAsText() {
+  std::string text;
+  for (const std::string &name : namesWithNumbers()) {
+    text += name + "\n";
+  }
+  return text;
+}
+
+Json namesAsJson() {
+  Json names = Json::array();
+  for (const std::string &name : namesWithNumbers()) {
+    names.append(name);
+  }
+  return names;
+}
+
 std::string answer(const Arguments &arguments) {
-  if (arguments.asChart && arguments.asDifference) {
-    throw usageError("--chart and --diff exclude each other");
+  if (arguments.asChart + arguments.asDifference + arguments.asNames > 1) {
+    throw usageError("--chart, --diff and --names exclude each other");
   }
   if (arguments.asDifference) {
     return difference(arguments);
   }
-  if (arguments.pages.size() > 1) {
-    throw usageError("extra operand {}", printable(arguments.pages[1]));
+  const std::size_t most = arguments.asNames ? 0 : 1;
+  if (arguments.pages.size() > most) {
+    throw usageError("extra operand {}", printable(arguments.pages[most]));
+  }
+  if (arguments.asNames) {
+    return rendered(arguments, namesAsText, namesAsJson);
   }
   if (arguments.asChart) {
     if (arguments.pages.empty()) {
@@ -83,6 +105,9 @@ Command codepagesCommand() {
                      {.name = "diff",
                       .help = "show the bytes whose characters differ in two PAGEs",
                       .take = into(arguments->asDifference)},
+                     {.name = "names",
+                      .help = "list the names that options take for a PAGE",
+                      .take = into(arguments->asNames)},
                      {.name = "json", .help = "write JSON", .take = into(arguments->asJson)}};
   command.notes = notes;
   command.run = [arguments] {
