@@ -4,8 +4,7 @@
 
 #include "errors.h"
 #include "nls2.h"
-#include "number_option.h"
-#include "status.h"
+#include "options.h"
 
 #include <algorithm>
 #include <fmt/core.h>
@@ -148,9 +147,9 @@ Json lookUpNumber(uint32_t asked) {
   const bool listed =
       std::find(pagesWithNames.begin(), pagesWithNames.end(), number) != pagesWithNames.end();
   if (asked > std::numeric_limits<int32_t>::max() || (!listed && canonicalName(number).is_null())) {
-    throw Failure(fmt::format("code page {} is unknown: it is none of the library's numbers, and "
-                              "ICU has no converter for it as a CCSID",
-                              asked));
+    throw failure("code page {} is unknown: it is none of the library's numbers, and "
+                  "ICU has no converter for it as a CCSID",
+                  asked);
   }
   return found({number}, spellingsOf(number));
 }
@@ -159,9 +158,9 @@ Json lookUpName(const std::string &name) {
   const std::vector<int32_t> numbers = name.empty() ? std::vector<int32_t>() : numbersOf(name);
   const bool opens = !canonicalName(name).is_null();
   if (numbers.empty() && !opens) {
-    throw Failure(fmt::format("code page \"{}\" is unknown: it is neither a name that ICU has a "
-                              "converter for nor a Windows name of the library's",
-                              name));
+    throw failure("code page \"{}\" is unknown: it is neither a name that ICU has a "
+                  "converter for nor a Windows name of the library's",
+                  name);
   }
   return found(numbers, {name});
 }
@@ -186,7 +185,7 @@ Json describeCodepage(int32_t number) {
            converter.isNull() ? Json() : Json(ucnv_getMaxCharSize(converter.getAlias()))},
           {"windowsNames", windowsNamesOf(number)},
           {"status", status},
-          {"statusName", statusName(status)}};
+          {"statusName", statusText(status)}};
 }
 
 Json lookUpCodepage(const std::string &asked) {

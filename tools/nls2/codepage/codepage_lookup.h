@@ -17,7 +17,7 @@ inline constexpr std::array<int32_t, 25> pagesWithNames{
 nlohmann::ordered_json describeCodepage(int32_t number);
 
 // The numbers that a name stands for, or the number given, and the names that people write for it;
-// `tablesDiffer` tells whether they open different tables of ICU's. Throws Failure where neither
+// `tablesDiffer` tells whether they open different tables of ICU's. Throws Error where neither
 // the library nor ICU knows what was asked for.
 nlohmann::ordered_json lookUpCodepage(const std::string &asked);
 std::string foundCodepageAsText(const nlohmann::ordered_json &found);

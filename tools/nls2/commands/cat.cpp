@@ -13,16 +13,12 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr const char *help =
+constexpr const char *notes =
     R"(NAME is a converter name of ICU's in any spelling: UTF-16, ISO-8859-1, windows-1252, ibm-1141.
-FILE may be - for standard input.
-
-Line ends and nulls stay what they are. UTF-16 and UTF-32 take off a byte-order mark and do without
-one (then big-endian); with any other name a mark is text, U+FEFF. `nls2 detect` tells which one a
-file has.
-
-Bytes that are no text of the encoding are written as U+FFFD or U+001A; their number is told, and
-the exit code is 1.)";
+Line ends and nulls stay what they are. UTF-16 and UTF-32 take off a byte-order mark, and do without
+one (then big-endian); with any other name a mark is text, U+FEFF.
+Bytes that are not valid in the encoding are replaced and counted, and the exit code is 1.
+)";
 
 struct Arguments {
   std::string encoding;
@@ -36,24 +32,28 @@ void copy(const Arguments &arguments) {
     out.write(text);
   }
   if (in.badSequences() != 0) {
-    throw Failure(
-        fmt::format("{}: {} byte sequences are no text of {}; a substitute stands for each",
-                    arguments.path, in.badSequences(), arguments.encoding));
+    throw failure("{}: {} byte sequences are no text of {}; a substitute stands for each",
+                  arguments.path, in.badSequences(), arguments.encoding);
   }
 }
 
 } // namespace
 
-void addCatCommand(CLI::App &app) {
-  CLI::App &command =
-      *app.add_subcommand("cat", "Write a text file in any encoding to standard output as UTF-8");
+Command catCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  command.add_option("--encoding", arguments->encoding, "the file's encoding")
-      ->required()
-      ->type_name("NAME");
-  command.add_option("FILE", arguments->path, "file to read")->required();
-  command.footer(help);
-  command.callback([arguments] { copy(*arguments); });
+  Command command;
+  command.operands = {{"FILE", "file to read; - is standard input", into(arguments->path), 1}};
+  command.options = {{.name = "encoding",
+                      .metavar = "NAME",
+                      .help = "the file's encoding",
+                      .take = into(arguments->encoding),
+                      .isRequired = true}};
+  command.notes = notes;
+  command.run = [arguments] {
+    copy(*arguments);
+    return exitDone;
+  };
+  return command;
 }
 
 } // namespace nls2::tool

@@ -5,7 +5,6 @@
 #include "io/input_file.h"
 #include "io/output_file.h"
 #include "nls2.h"
-#include "status.h"
 
 #include <array>
 #include <fmt/core.h>
@@ -22,15 +21,11 @@ using Json = nlohmann::ordered_json;
 
 constexpr std::size_t longestSignature = 5;
 
-constexpr const char *help =
-    R"(For each FILE the encoding whose signature (byte-order mark) it begins with, and the bytes that the
-signature takes. FILE may be - for standard input. A file that cannot be read does not keep the
-others from being looked at.
-
-Without a signature a file may still be Unicode. FF FE 00 00 is UTF-32LE, even where a text in
+constexpr const char *notes =
+    R"(Without a signature a file may still be Unicode. FF FE 00 00 is UTF-32LE, even where a text in
 UTF-16LE begins with a null.
-
-Exit codes: 0 every file has a signature, 1 some file has none, 2 some file cannot be read.)";
+Exit codes: 0 every file has a signature, 1 some file has none, 2 something went wrong.
+)";
 
 struct Arguments {
   std::vector<std::string> paths;
@@ -55,7 +50,7 @@ Json detect(const std::string &path) {
   const char *name = NLS2_detectUnicodeSignature(bytes.data(), static_cast<int32_t>(bytes.size()),
                                                  &length, &status);
   if (status > 0) {
-    throw Failure(fmt::format("{}: {}", path, statusName(status)));
+    throw failure("{}: {}", path, statusText(status));
   }
   return {{"file", path},
           {"encoding", name != nullptr ? Json(name) : Json()},
@@ -79,35 +74,35 @@ std::string asJsonText(const Json &rows) {
   return rows.dump(2, ' ', false, Json::error_handler_t::replace) + "\n";
 }
 
-void detectAll(const Arguments &arguments) {
+int detectAll(const Arguments &arguments) {
   Json rows = Json::array();
-  ExitCode code = exitDone;
+  int code = exitDone;
   for (const std::string &path : arguments.paths) {
     try {
       rows.push_back(detect(path));
       if (code == exitDone && rows.back()["encoding"].is_null()) {
-        code = exitNo;
+        code = exitFailed;
       }
-    } catch (const Failure &error) {
-      fmt::print(stderr, "nls2: {}\n", error.what());
-      code = exitTrouble;
+    } catch (const Error &error) {
+      complain(error.what());
+      code = exitUsage;
     }
   }
   OutputFile("-").write(arguments.asJson ? asJsonText(rows) : asText(rows));
-  if (code != exitDone) {
-    throw AlreadySaid{code};
-  }
+  return code;
 }
 
 } // namespace
 
-void addDetectCommand(CLI::App &app) {
-  CLI::App &command = *app.add_subcommand("detect", "Tell the Unicode signatures of files");
+Command detectCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  command.add_flag("--json", arguments->asJson, "write JSON");
-  command.add_option("FILE", arguments->paths, "files to look at")->required();
-  command.footer(help);
-  command.callback([arguments] { detectAll(*arguments); });
+  Command command;
+  command.operands = {{"FILE", "files to look at; - is standard input", into(arguments->paths), 1,
+                       Operand::anyNumber}};
+  command.options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}};
+  command.notes = notes;
+  command.run = [arguments] { return detectAll(*arguments); };
+  return command;
 }
 
 } // namespace nls2::tool

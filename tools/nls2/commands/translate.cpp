@@ -2,9 +2,7 @@
 
 #include "commands.h"
 #include "convert/translate_run.h"
-#include "number_option.h"
 
-#include <limits>
 #include <memory>
 #include <string>
 
@@ -12,23 +10,12 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr const char *help =
-    R"(Each record of N bytes is one field: it is translated for itself.
-
-Padding. Without an option a record is translated as it is, blanks and nulls too. With one of the
-three the blanks at its end (tabs and all space characters, and nulls, which count as blanks) are
-cut off, and blanks (U+0020) are put back as the option says. The text itself must fit in M bytes.
-A record with a null inside its text is refused under these options. So is one whose rest cannot be
-filled exactly, such as an odd one with two-byte blanks.
-
-Characters that the destination does not have become its substitution character; that is no failure.
-A destination with a signature (57368, 57369, 57372) has it at the start of every record.
-The line feed of --newline is U+000A in the destination's own encoding: two bytes in UTF-16, 0x25 in
-EBCDIC.
-
-The first record that fails ends the run: standard output then has the records before it; an output
-file is not touched, since it takes its name, and the place of an older one, at the end. A last
-record shorter than N is such a failure. The input file may be the output file too.)";
+constexpr const char *notes =
+    R"(Each record is one field and is translated on its own. Under --fill, --keep-blanks and --strip the
+blanks and nulls at its end are cut off, and blanks (U+0020) are put back as the option says; a null
+inside the text is refused. A character that the output lacks becomes its substitution character.
+The first record that fails ends the run; an output file appears only when it is complete.
+)";
 
 struct Arguments {
   TranslateOptions options;
@@ -36,52 +23,87 @@ struct Arguments {
   std::string output = "-";
 };
 
-void addNumbers(CLI::App &command, TranslateOptions &options) {
-  constexpr int32_t least = std::numeric_limits<int32_t>::min();
-  constexpr int32_t most = std::numeric_limits<int32_t>::max();
-  constexpr int32_t longest = 1 << 30;
-  addNumber(command, "--from", options.from, least, most, "code page of the input")->required();
-  addNumber(command, "--to", options.to, least, most, "code page of the output")->required();
-  addNumber(command, "--record-length", options.recordLength, 1, longest,
-            "N, the bytes of every input record")
-      ->required();
+constexpr int32_t longest = 1 << 30;
+
+// At most one of the three, whichever comes first on the command line.
+void choose(Padding &padding, Padding chosen) {
+  if (padding != Padding::none && padding != chosen) {
+    throw usageError("--fill, --keep-blanks and --strip exclude each other");
+  }
+  padding = chosen;
 }
 
-void addPadding(CLI::App &command, TranslateOptions &options) {
-  CLI::Option *outLength = addNumber(command, "--out-length", options.outLength, 1, 1 << 30,
-                                     "M, the most bytes of an output record");
-  const auto add = [&](const char *name, Padding padding, const char *description) {
-    return command.add_flag_callback(
-        name, [&options, padding] { options.padding = padding; }, description);
-  };
-  CLI::Option *fill = add("--fill", Padding::fill, "pad with blanks to M bytes");
-  CLI::Option *keep = add("--keep-blanks", Padding::keepBlanks,
-                          "keep as many trailing blanks as there were, or as fit in M");
-  CLI::Option *strip = add("--strip", Padding::strip, "drop trailing blanks");
-  fill->needs(outLength)->excludes(keep)->excludes(strip);
-  keep->excludes(strip);
+bool isLineFeed(const std::string &text) {
+  if (text != "none" && text != "lf") {
+    throw usageError("--newline: \"{}\" is not none or lf", printable(text));
+  }
+  return text == "lf";
+}
+
+int run(const Arguments &arguments) {
+  if (arguments.options.padding == Padding::fill && arguments.options.outLength == 0) {
+    throw usageError("--fill needs --out-length");
+  }
+  translateFile(arguments.options, arguments.input, arguments.output);
+  return exitDone;
 }
 
 } // namespace
 
-void addTranslateCommand(CLI::App &app) {
-  CLI::App &command =
-      *app.add_subcommand("translate", "Translate fixed-length records to another code page");
+Command translateCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  addNumbers(command, arguments->options);
-  addPadding(command, arguments->options);
-  command
-      .add_option_function<std::string>(
-          "--newline",
-          [arguments](const std::string &value) { arguments->options.newline = value == "lf"; },
-          "what to put behind every output record: none (default) or lf")
-      ->check(CLI::IsMember({"none", "lf"}));
-  command.add_option("INPUT", arguments->input, "file to read; standard input if - or not given");
-  command.add_option("-o,--output", arguments->output,
-                     "file to write; standard output if - or not given");
-  command.footer(help);
-  command.callback(
-      [arguments] { translateFile(arguments->options, arguments->input, arguments->output); });
+  TranslateOptions &options = arguments->options;
+  Command command;
+  command.operands = {{.metavar = "INPUT",
+                       .help = "file to read; standard input if - or not given",
+                       .take = into(arguments->input)}};
+  command.options = {
+      {.name = "from",
+       .metavar = "PAGE",
+       .help = "code page of the input",
+       .take = [&](const std::string &text) { options.from = parsePage("--from", text); },
+       .isRequired = true},
+      {.name = "to",
+       .metavar = "PAGE",
+       .help = "code page of the output",
+       .take = [&](const std::string &text) { options.to = parsePage("--to", text); },
+       .isRequired = true},
+      {.name = "record-length",
+       .metavar = "N",
+       .help = "bytes of every input record",
+       .take =
+           [&](const std::string &text) {
+             options.recordLength = parseNumber("--record-length", text, 1, longest);
+           },
+       .isRequired = true},
+      {.name = "out-length",
+       .metavar = "M",
+       .help = "the most bytes of an output record",
+       .take =
+           [&](const std::string &text) {
+             options.outLength = parseNumber("--out-length", text, 1, longest);
+           }},
+      {.name = "fill",
+       .help = "pad with blanks to M bytes",
+       .take = [&](const std::string &) { choose(options.padding, Padding::fill); }},
+      {.name = "keep-blanks",
+       .help = "keep the trailing blanks, or as many as fit in M",
+       .take = [&](const std::string &) { choose(options.padding, Padding::keepBlanks); }},
+      {.name = "strip",
+       .help = "drop trailing blanks",
+       .take = [&](const std::string &) { choose(options.padding, Padding::strip); }},
+      {.name = "newline",
+       .metavar = "KIND",
+       .help = "what ends every output record: none (default) or lf",
+       .take = [&](const std::string &text) { options.newline = isLineFeed(text); }},
+      {.name = "output",
+       .letter = 'o',
+       .metavar = "OUT",
+       .help = "file to write; standard output if - or not given",
+       .take = into(arguments->output)}};
+  command.notes = notes;
+  command.run = [arguments] { return run(*arguments); };
+  return command;
 }
 
 } // namespace nls2::tool

@@ -21,7 +21,7 @@ class RecordReader {
 public:
   RecordReader(InputFile &input, std::size_t recordLength, int wakeFd);
 
-  // The next whole records, as soon as there is one; false at the end of the input. Throws Failure.
+  // The next whole records, as soon as there is one; false at the end of the input. Throws Error.
   bool read(RecordChunk &chunk);
 
 private:

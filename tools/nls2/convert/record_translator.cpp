@@ -2,8 +2,8 @@
 
 #include "convert/record_translator.h"
 
+#include "errors.h"
 #include "nls2.h"
-#include "status.h"
 
 #include <algorithm>
 #include <cstring>
@@ -56,13 +56,38 @@ std::size_t greatestLength(std::string_view record) {
   return std::min(64 * record.size() + 1024, mostBytes);
 }
 
+std::optional<char> singleByteBlank(const CodePage &page) {
+  const auto blank = page.isSingleByte() ? page.encoded(u' ') : std::nullopt;
+  return blank ? std::optional(blank->bytes.front()) : std::nullopt;
+}
+
 UChar unitAt(std::string_view wide, std::size_t index) {
   const auto byteAt = [&](std::size_t i) { return static_cast<unsigned char>(wide[i]); };
   return static_cast<UChar>(byteAt(2 * index) | (byteAt(2 * index + 1) << 8));
 }
 
+std::string statusAdvice(int32_t status) {
+  switch (status) {
+  case U_FILE_ACCESS_ERROR:
+    return "this ICU has no converter for the code page; `nls2 codepages` lists numbers";
+  case U_BUFFER_OVERFLOW_ERROR:
+    return "give a larger --out-length";
+  case U_INVALID_CHAR_FOUND:
+  case U_TRUNCATED_CHAR_FOUND:
+  case U_ILLEGAL_CHAR_FOUND:
+  case U_ILLEGAL_ESCAPE_SEQUENCE:
+  case U_UNSUPPORTED_ESCAPE_SEQUENCE:
+    return "the bytes are not text of the code page given with --from";
+  case U_MEMORY_ALLOCATION_ERROR:
+  case NLS2_ERR_NO_MEMORY:
+    return "out of memory; is the record length right?";
+  default:
+    return "";
+  }
+}
+
 std::string overflow(std::size_t needed) {
-  return fmt::format("{}: the text takes {} bytes; {}", statusName(U_BUFFER_OVERFLOW_ERROR), needed,
+  return fmt::format("{}: the text takes {} bytes; {}", statusText(U_BUFFER_OVERFLOW_ERROR), needed,
                      statusAdvice(U_BUFFER_OVERFLOW_ERROR));
 }
 
@@ -70,10 +95,10 @@ std::string overflow(std::size_t needed) {
 
 RecordTranslator::RecordTranslator(const TranslateOptions &options)
     : options_(options), outLength_(static_cast<std::size_t>(options.outLength)),
-      blank_(encodedCharacter(options.to, ' ')), sourceBlank_(singleByteBlank(options.from)) {}
+      blank_(CodePage(options.to, "--to").encoded(u' ').value_or(EncodedCharacter())),
+      sourceBlank_(singleByteBlank(CodePage(options.from, "--from"))) {}
 
-RecordTranslator::Refusal RecordTranslator::translate(std::string_view record,
-                                                      OutputBuffer &out) const {
+Refusal RecordTranslator::translate(std::string_view record, OutputBuffer &out) const {
   if (options_.padding == Padding::none) {
     return translateAsItIs(record, out, 0);
   }
@@ -139,14 +164,13 @@ int32_t RecordTranslator::translateToFit(std::string_view record, OutputBuffer &
   }
 }
 
-RecordTranslator::Refusal RecordTranslator::translateAsItIs(std::string_view record,
-                                                            OutputBuffer &out,
-                                                            uint32_t option) const {
+Refusal RecordTranslator::translateAsItIs(std::string_view record, OutputBuffer &out,
+                                          uint32_t option) const {
   const int32_t status = translateToFit(record, out, option, outLength_ == 0);
   return status == U_ZERO_ERROR ? Refusal() : refuse(status, record);
 }
 
-RecordTranslator::Refusal RecordTranslator::fill(std::string_view record, OutputBuffer &out) const {
+Refusal RecordTranslator::fill(std::string_view record, OutputBuffer &out) const {
   const bool done =
       blank_.bytes.size() == 1 ? fillAtOnce(record, out) : stripAndAppend(record, out);
   return done ? Refusal() : padThroughUtf16(record, out);
@@ -189,8 +213,7 @@ bool RecordTranslator::stripAndAppend(std::string_view record, OutputBuffer &out
 
 // The library drops blanks without a word where the room ends; a field whose room still ends in a
 // sentinel has all of them.
-RecordTranslator::Refusal RecordTranslator::keepBlanks(std::string_view record,
-                                                       OutputBuffer &out) const {
+Refusal RecordTranslator::keepBlanks(std::string_view record, OutputBuffer &out) const {
   if (blank_.bytes.size() != 1) {
     return padThroughUtf16(record, out);
   }
@@ -239,8 +262,7 @@ std::size_t RecordTranslator::roomForBlanks(const WideField &field) const {
   return (outLength_ - field.blankedBytes) / blank_.bytes.size() + 1;
 }
 
-RecordTranslator::Refusal RecordTranslator::padThroughUtf16(std::string_view record,
-                                                            OutputBuffer &out) const {
+Refusal RecordTranslator::padThroughUtf16(std::string_view record, OutputBuffer &out) const {
   const WideField field = widen(record);
   if (field.status != U_ZERO_ERROR) {
     return refuse(field.status, record);
@@ -256,8 +278,8 @@ RecordTranslator::Refusal RecordTranslator::padThroughUtf16(std::string_view rec
                 out);
 }
 
-RecordTranslator::Refusal RecordTranslator::narrow(const WideField &field, std::size_t blanks,
-                                                   OutputBuffer &out) const {
+Refusal RecordTranslator::narrow(const WideField &field, std::size_t blanks,
+                                 OutputBuffer &out) const {
   std::string wide = field.text;
   for (std::size_t i = 0; i < blanks; ++i) {
     wide += wideBlank;
@@ -265,7 +287,7 @@ RecordTranslator::Refusal RecordTranslator::narrow(const WideField &field, std::
   int32_t status = U_ZERO_ERROR;
   const std::string bytes = translateText(options_.to, utf16lePage, wide, status);
   if (status != U_ZERO_ERROR) {
-    return fmt::format("{}: {}", statusName(status), statusAdvice(status));
+    return fmt::format("{}: {}", statusText(status), statusAdvice(status));
   }
   if (options_.padding == Padding::fill && bytes.size() != outLength_) {
     return fmt::format("with blanks of {} bytes it can be {} bytes long, but not {}; give another "
@@ -276,7 +298,7 @@ RecordTranslator::Refusal RecordTranslator::narrow(const WideField &field, std::
   return {};
 }
 
-RecordTranslator::Refusal RecordTranslator::refuse(int32_t status, std::string_view record) const {
+Refusal RecordTranslator::refuse(int32_t status, std::string_view record) const {
   if (status == U_BUFFER_OVERFLOW_ERROR && outLength_ != 0) {
     OutputBuffer measured;
     const uint32_t option = options_.padding == Padding::none ? 0 : NLS2_STRING_STRIP_TRAILING;
@@ -285,7 +307,7 @@ RecordTranslator::Refusal RecordTranslator::refuse(int32_t status, std::string_v
     }
   }
   const std::string advice = statusAdvice(status);
-  return advice.empty() ? statusName(status) : fmt::format("{}: {}", statusName(status), advice);
+  return advice.empty() ? statusText(status) : fmt::format("{}: {}", statusText(status), advice);
 }
 
 } // namespace nls2::tool

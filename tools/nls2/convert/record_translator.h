@@ -3,6 +3,7 @@
 
 #include "codepage/code_page.h"
 #include "convert/output_buffer.h"
+#include "errors.h"
 
 #include <cstdint>
 #include <optional>
@@ -26,9 +27,6 @@ struct TranslateOptions {
 class RecordTranslator {
 public:
   explicit RecordTranslator(const TranslateOptions &options);
-
-  // Why a record failed, with what would help; nothing where it went well.
-  using Refusal = std::optional<std::string>;
 
   // Appends the record's translation to the output. On failure the output is as it was.
   Refusal translate(std::string_view record, OutputBuffer &out) const;

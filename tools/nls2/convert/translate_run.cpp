@@ -29,7 +29,7 @@ class WakeFlag {
 public:
   WakeFlag() : fd_(eventfd(0, EFD_CLOEXEC)) {
     if (fd_ < 0) {
-      throw Failure("cannot make an event descriptor");
+      throw failure("cannot make an event descriptor");
     }
   }
   ~WakeFlag() { close(fd_); }
@@ -50,8 +50,8 @@ void refuseSameFile(const InputFile &input, const OutputFile &output) {
   if (output.directFd() >= 0 && fstat(input.fd(), &in) == 0 &&
       fstat(output.directFd(), &out) == 0 && S_ISREG(in.st_mode) && in.st_dev == out.st_dev &&
       in.st_ino == out.st_ino) {
-    throw UsageError(fmt::format(
-        "{} is also standard output; give --output, which replaces it at the end", input.name()));
+    throw usageError("{} is also standard output; give --output, which replaces it at the end",
+                     input.name());
   }
 }
 
@@ -60,7 +60,8 @@ public:
   TranslateRun(const TranslateOptions &options, InputFile &input, OutputFile &output)
       : translator_(options), input_(input), output_(output),
         recordLength_(static_cast<std::size_t>(options.recordLength)),
-        newline_(options.newline ? encodedCharacter(options.to, '\n').bytes : std::string()),
+        newline_(options.newline ? CodePage(options.to, "--to").encoded(u'\n')->bytes
+                                 : std::string()),
         reader_(input, recordLength_, wake_.fd()), pieces_(pipeline_.slots()) {}
 
   void run() {
@@ -98,7 +99,7 @@ private:
   void write(Piece &piece) {
     output_.write(piece.output.bytes());
     if (!piece.failure.empty()) {
-      throw Failure(piece.failure);
+      throw failure("{}", piece.failure);
     }
   }
 
@@ -114,15 +115,15 @@ private:
 };
 
 void checkOptions(const TranslateOptions &options) {
-  requireCodePage(options.from, "--from");
-  requireCodePage(options.to, "--to");
+  const CodePage from(options.from, "--from");
+  const CodePage to(options.to, "--to");
   const bool needsBlank =
       options.padding == Padding::fill || options.padding == Padding::keepBlanks;
-  if (needsBlank && !hasCharacter(options.to, ' ')) {
-    throw UsageError(fmt::format("code page {} has no blank to pad with", options.to));
+  if (needsBlank && !to.encoded(u' ')) {
+    throw usageError("code page {} has no blank to pad with", options.to);
   }
-  if (options.newline && !hasCharacter(options.to, '\n')) {
-    throw UsageError(fmt::format("code page {} has no line feed", options.to));
+  if (options.newline && !to.encoded(u'\n')) {
+    throw usageError("code page {} has no line feed", options.to);
   }
 }
 

@@ -7,7 +7,7 @@
 
 namespace nls2::tool {
 
-// "-" is standard input or output. Throws UsageError and Failure.
+// "-" is standard input or output. Throws Error.
 void translateFile(const TranslateOptions &options, const std::string &inputPath,
                    const std::string &outputPath);
 

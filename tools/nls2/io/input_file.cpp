@@ -32,9 +32,7 @@ InputFile::~InputFile() {
   }
 }
 
-void InputFile::fail() const {
-  throw Failure(fmt::format("cannot read {}: {}", name_, std::strerror(errno)));
-}
+void InputFile::fail() const { throw failure("cannot read {}: {}", name_, std::strerror(errno)); }
 
 std::size_t InputFile::read(char *buffer, std::size_t length, int wakeFd) {
   for (;;) {

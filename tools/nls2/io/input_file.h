@@ -8,14 +8,14 @@ namespace nls2::tool {
 
 class InputFile {
 public:
-  // "-" is standard input. Throws Failure.
+  // "-" is standard input. Throws Error.
   explicit InputFile(const std::string &path);
   ~InputFile();
   InputFile(const InputFile &) = delete;
   InputFile &operator=(const InputFile &) = delete;
 
   // Up to `length` bytes, as many as are there at once; 0 at the end, and when `wakeFd` becomes
-  // readable before any are. Throws Failure.
+  // readable before any are. Throws Error.
   std::size_t read(char *buffer, std::size_t length, int wakeFd);
 
   int fd() const { return fd_; }

@@ -23,7 +23,7 @@ std::string realPathOf(const std::string &path) {
   const std::unique_ptr<char, decltype(&std::free)> resolved(realpath(path.c_str(), nullptr),
                                                              &std::free);
   if (!resolved) {
-    throw Failure(fmt::format("{}: {}", path, std::strerror(errno)));
+    throw failure("{}: {}", path, std::strerror(errno));
   }
   return resolved.get();
 }
@@ -32,10 +32,10 @@ std::string realPathOf(const std::string &path) {
 // others' files; the mode then still holds.
 void copyPermissions(const struct stat &from, int fd) {
   if (fchown(fd, from.st_uid, from.st_gid) != 0 && errno != EPERM) {
-    throw Failure(fmt::format("cannot keep the file's owner: {}", std::strerror(errno)));
+    throw failure("cannot keep the file's owner: {}", std::strerror(errno));
   }
   if (fchmod(fd, from.st_mode & 0777) != 0) {
-    throw Failure(fmt::format("cannot keep the file's permissions: {}", std::strerror(errno)));
+    throw failure("cannot keep the file's permissions: {}", std::strerror(errno));
   }
 }
 
@@ -54,7 +54,7 @@ void OutputFile::replaceFile(const std::string &path) {
   struct stat existing = {};
   if (stat(path.c_str(), &existing) != 0) {
     if (lstat(path.c_str(), &existing) == 0) {
-      throw Failure(fmt::format("cannot write {}: it is a symbolic link that leads nowhere", path));
+      throw failure("cannot write {}: it is a symbolic link that leads nowhere", path);
     }
     temporary_ = std::make_unique<TemporaryFile>(path);
     fd_ = temporary_->fd();
@@ -81,9 +81,7 @@ OutputFile::~OutputFile() {
   }
 }
 
-void OutputFile::fail() const {
-  throw Failure(fmt::format("cannot write {}: {}", name_, std::strerror(errno)));
-}
+void OutputFile::fail() const { throw failure("cannot write {}: {}", name_, std::strerror(errno)); }
 
 void OutputFile::write(std::string_view bytes) {
   while (!bytes.empty()) {

@@ -11,14 +11,14 @@ namespace nls2::tool {
 
 class OutputFile {
 public:
-  // "-" is standard output. Throws Failure.
+  // "-" is standard output. Throws Error.
   explicit OutputFile(const std::string &path);
   ~OutputFile();
   OutputFile(const OutputFile &) = delete;
   OutputFile &operator=(const OutputFile &) = delete;
 
-  void write(std::string_view bytes); // throws Failure
-  // Without it a file that has been written disappears and the one before it stays. Throws Failure.
+  void write(std::string_view bytes); // throws Error
+  // Without it a file that has been written disappears and the one before it stays. Throws Error.
   void commit();
 
   // The open file that the bytes go to at once; -1 for a file that is not seen before commit().

@@ -79,7 +79,7 @@ std::string takeFreeName(const std::string &target, Make make) {
       break;
     }
   }
-  throw Failure(fmt::format("cannot create a file beside {}: {}", target, std::strerror(errno)));
+  throw failure("cannot create a file beside {}: {}", target, std::strerror(errno));
 }
 
 } // namespace
@@ -127,7 +127,7 @@ void TemporaryFile::publish() {
     giveTemporaryName();
   }
   if (std::rename(name_.c_str(), target_.c_str()) != 0) {
-    throw Failure(fmt::format("{}: {}", target_, std::strerror(errno)));
+    throw failure("{}: {}", target_, std::strerror(errno));
   }
   nameToRemove = nullptr;
   name_.clear();

@@ -9,14 +9,14 @@ namespace nls2::tool {
 // gone; a signal that ends the process takes it along.
 class TemporaryFile {
 public:
-  // Throws Failure.
+  // Throws Error.
   explicit TemporaryFile(std::string target);
   ~TemporaryFile();
   TemporaryFile(const TemporaryFile &) = delete;
   TemporaryFile &operator=(const TemporaryFile &) = delete;
 
   int fd() const { return fd_; }
-  // Gives it the name, in place of the file that has it now. Throws Failure.
+  // Gives it the name, in place of the file that has it now. Throws Error.
   void publish();
 
 private:

@@ -3,7 +3,6 @@
 #include "io/text_stream.h"
 
 #include "errors.h"
-#include "status.h"
 
 #include <cerrno>
 #include <cstdio>
@@ -29,8 +28,8 @@ void requireEncoding(const std::string &encoding) {
   UErrorCode status = U_ZERO_ERROR;
   const icu::LocalUConverterPointer converter(ucnv_open(encoding.c_str(), &status));
   if (encoding.empty() || U_FAILURE(status)) {
-    throw UsageError(fmt::format("--encoding '{}': {}", encoding,
-                                 encoding.empty() ? "a name is needed" : statusName(status)));
+    throw usageError("--encoding '{}': {}", encoding,
+                     encoding.empty() ? "a name is needed" : statusText(status));
   }
 }
 
@@ -42,7 +41,7 @@ NLS2_Locale *makeLocale() {
   int32_t status = 0;
   NLS2_Locale *locale = NLS2_allocateLocale(&status);
   if (locale == nullptr) {
-    throw Failure(fmt::format("cannot make a locale object: {}", statusName(status)));
+    throw failure("cannot make a locale object: {}", statusText(status));
   }
   return locale;
 }
@@ -63,7 +62,7 @@ std::string toUtf8(const UChar *units, std::size_t length) {
   u_strToUTF8WithSub(text.data(), static_cast<int32_t>(text.size()), &bytes, units,
                      static_cast<int32_t>(length), 0xFFFD, nullptr, &error);
   if (U_FAILURE(error)) {
-    throw Failure(fmt::format("cannot convert to UTF-8: {}", statusName(error)));
+    throw failure("cannot convert to UTF-8: {}", statusText(error));
   }
   text.resize(static_cast<std::size_t>(bytes));
   return text;
@@ -96,13 +95,13 @@ void TextStream::open(const std::string &encoding) {
   ucnv_setToUCallBack(u_fgetConverter(stream_.get()), countAndSubstitute, badSequences_.get(),
                       nullptr, nullptr, &error);
   if (U_FAILURE(error)) {
-    throw Failure(fmt::format("cannot read {}: {}", path_, statusName(error)));
+    throw failure("cannot read {}: {}", path_, statusText(error));
   }
 }
 
 void TextStream::fail() const {
-  throw Failure(fmt::format("cannot read {}: {}", path_,
-                            errno != 0 ? std::strerror(errno) : "it does not open"));
+  throw failure("cannot read {}: {}", path_,
+                errno != 0 ? std::strerror(errno) : "it does not open");
 }
 
 std::string TextStream::read() {

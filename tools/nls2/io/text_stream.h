@@ -12,11 +12,11 @@ namespace nls2::tool {
 
 class TextStream {
 public:
-  // "-" is standard input. Throws UsageError for an encoding that ICU does not have, Failure for a
+  // "-" is standard input. Throws Error for an encoding that ICU does not have, Failure for a
   // file that does not open.
   TextStream(const std::string &path, const std::string &encoding);
 
-  // The next part of the text as UTF-8; empty at the end. Throws Failure.
+  // The next part of the text as UTF-8; empty at the end. Throws Error.
   std::string read();
 
   // Byte sequences so far that are no text of the encoding; each was read as a substitute.

@@ -4,7 +4,7 @@
 
 #include "codepage/codepage_lookup.h"
 #include "errors.h"
-#include "number_option.h"
+#include "options.h"
 
 #include <fmt/core.h>
 #include <set>
@@ -69,9 +69,8 @@ Json lookUpLocale(const std::string &asked) {
   const auto number = wholeNumber(asked);
   const Match match = number ? recordsWith(*number) : recordsWith(asked);
   if (match.records.empty()) {
-    throw Failure(fmt::format("no locale has the {} {}; `nls2 locales` lists them all",
-                              number ? "language id or code page" : "locale name or short name",
-                              asked));
+    throw failure("no locale has the {} {}; `nls2 locales` lists them all",
+                  number ? "language id or code page" : "locale name or short name", asked);
   }
   std::set<int32_t> pages;
   for (const Json &record : match.records) {

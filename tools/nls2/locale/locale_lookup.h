@@ -26,7 +26,7 @@ nlohmann::ordered_json describeRecords(Wanted wanted) {
 std::string recordsAsText(const nlohmann::ordered_json &rows);
 
 // The records with a language id, a locale name or short POSIX name, or a code page, and their code
-// pages. Throws Failure where there is none.
+// pages. Throws Error where there is none.
 nlohmann::ordered_json lookUpLocale(const std::string &asked);
 std::string foundLocaleAsText(const nlohmann::ordered_json &found);
 

@@ -3,7 +3,7 @@
 
 #include "codepage/codepage_lookup.h"
 #include "commands.h"
-#include "io/output_file.h"
+#include "io/print.h"
 #include "locale/locale_lookup.h"
 #include "nls2.h"
 
@@ -18,11 +18,6 @@ namespace nls2::tool {
 namespace {
 
 using Json = nlohmann::ordered_json;
-
-void print(const std::string &text) {
-  OutputFile out("-");
-  out.write(text);
-}
 
 Json localesAsJson() {
   return describeRecords([](const LocaleMapEntry &) { return true; });
@@ -75,37 +70,45 @@ std::string shown(const Table &table, const std::string *asked, bool asJson) {
   return asJson ? found.dump(2) + "\n" : table.foundAsText(found);
 }
 
+int show(const Table &table, const std::string *asked, bool asJson) {
+  print(shown(table, asked, asJson));
+  return exitDone;
+}
+
 // A command that shows a table, or what is known of one argument.
-CLI::App &addTable(CLI::App &app, const char *name, const char *description, const char *argument,
-                   const char *argumentDescription, const Table &table) {
-  CLI::App &command = *app.add_subcommand(name, description);
-  const auto asJson = std::make_shared<bool>(false);
-  const auto asked = std::make_shared<std::string>();
-  const CLI::Option *option =
-      command.add_option(argument, *asked, argumentDescription)->type_name("");
-  command.add_flag("--json", *asJson, "write JSON");
-  command.callback(
-      [=] { print(shown(table, option->count() != 0 ? asked.get() : nullptr, *asJson)); });
+Command tableCommand(const char *metavar, const char *help, const char *notes, const Table &table) {
+  struct Arguments {
+    std::optional<std::string> asked;
+    bool asJson = false;
+  };
+  const auto arguments = std::make_shared<Arguments>();
+  Command command;
+  command.operands = {
+      {metavar, help, [arguments](const std::string &text) { arguments->asked = text; }}};
+  command.options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}};
+  command.notes = notes;
+  command.run = [=] {
+    return show(table, arguments->asked ? &*arguments->asked : nullptr, arguments->asJson);
+  };
   return command;
 }
 
 } // namespace
 
-void addLocalesCommand(CLI::App &app) {
-  addTable(app, "locales", "List the locales that the library knows", "NAME-OR-ID",
-           "show the records with this name, language id (decimal or 0x...) or code page, and what "
-           "ICU makes of their code pages",
-           {localesAsText, localesAsJson, lookUpLocale, foundLocaleAsText})
-      .footer("The table's terminator record is left out. Where several records are shown, the "
-              "library's own searches take the first.");
+Command localesCommand() {
+  return tableCommand(
+      "NAME-OR-ID", "show the records with this name, language id or code page",
+      "Language ids are decimal or 0x... Where several records are shown, the library's own\n"
+      "searches take the first.\n",
+      {localesAsText, localesAsJson, lookUpLocale, foundLocaleAsText});
 }
 
-void addCodepagesCommand(CLI::App &app) {
-  addTable(app, "codepages", "List code pages by number and by Windows name", "NAME-OR-NUMBER",
-           "show what the library and ICU make of this code page",
-           {codepagesAsText, codepagesAsJson, lookUpCodepage, foundCodepageAsText})
-      .footer("A number is the library's; everything else is a name as ICU spells them: cp037, "
-              "latin1, windows-1252. The table's terminator record is left out.");
+Command codepagesCommand() {
+  return tableCommand(
+      "NAME-OR-NUMBER", "show what the library and ICU make of this code page",
+      "A number is the library's; everything else is a name as ICU spells them: cp037, latin1,\n"
+      "windows-1252.\n",
+      {codepagesAsText, codepagesAsJson, lookUpCodepage, foundCodepageAsText});
 }
 
 } // namespace nls2::tool
