@@ -6,6 +6,7 @@
 #include "nls2/detail/field_path.hpp"
 
 #include <bit>
+#include <utility>
 
 namespace nls2::detail {
 
@@ -142,8 +143,18 @@ private:
     return false;
   }
 
+  // Cuts blanks and nulls off the end, a block at a time while all of it is the one or the other.
   std::size_t trim(std::span<const char> field, std::size_t &text) const noexcept {
     std::size_t blanks = 0;
+    while (text >= block) {
+      const std::uint64_t all =
+          common(field.data() + text - block, std::make_index_sequence<block>());
+      if ((all & (blank | null)) == 0) {
+        break;
+      }
+      blanks += (all & blank) != 0 ? block : 0;
+      text -= block;
+    }
     for (; text > 0; --text) {
       const std::uint64_t last = row(field[text - 1]);
       if ((last & (blank | null)) == 0) {
@@ -152,6 +163,11 @@ private:
       blanks += (last & blank) != 0 ? 1 : 0;
     }
     return blanks;
+  }
+
+  template <std::size_t... I>
+  std::uint64_t common(const char *source, std::index_sequence<I...>) const noexcept {
+    return (row(source[I]) & ...);
   }
 
   std::size_t count_bad(std::span<const char> text) const noexcept {
@@ -170,25 +186,8 @@ private:
     std::uint64_t kinds = 0;
     while (static_cast<std::size_t>(end - source) >= block &&
            static_cast<std::size_t>(limit - target) >= block * most) {
-      std::array<std::uint64_t, block> rows;
-      std::uint64_t together = 0;
-      for (std::size_t i = 0; i < block; ++i) {
-        rows[i] = row(source[i]);
-        together |= rows[i];
-      }
-      kinds |= together;
+      kinds |= write_block(source, target, std::make_index_sequence<block>());
       source += block;
-      if ((together & not_one_byte) == 0) {
-        for (std::size_t i = 0; i < block; ++i) {
-          target[i] = first_byte(rows[i]);
-        }
-        target += block;
-      } else {
-        for (const std::uint64_t next : rows) {
-          put(target, next, most);
-          target += size_of(next);
-        }
-      }
     }
     for (; source != end; ++source) {
       const std::uint64_t next = row(*source);
@@ -201,6 +200,21 @@ private:
     }
     seen = kinds;
     return static_cast<std::size_t>(target - room.data());
+  }
+
+  // Spelt out for each byte, for at lower levels of optimisation compilers leave such loops rolled.
+  template <std::size_t... I>
+  std::uint64_t write_block(const char *source, char *&target,
+                            std::index_sequence<I...>) const noexcept {
+    const std::uint64_t rows[] = {row(source[I])...};
+    const std::uint64_t together = (rows[I] | ...);
+    if ((together & not_one_byte) == 0) {
+      ((target[I] = first_byte(rows[I])), ...);
+      target += block;
+    } else {
+      ((put(target, rows[I], most), target += size_of(rows[I])), ...);
+    }
+    return together;
   }
 
   static void put(char *target, std::uint64_t row, std::size_t size) noexcept {
