@@ -50,7 +50,8 @@ std::vector<std::string> nearNames(const std::string &unknown,
                    [](const auto &a, const auto &b) { return a.first < b.first; });
   std::vector<std::string> names;
   for (const auto &[letters, name] : near) {
-    if (names.size() < most && std::find(names.begin(), names.end(), name) == names.end()) {
+    if (letters == near.front().first && names.size() < most &&
+        std::find(names.begin(), names.end(), name) == names.end()) {
       names.push_back(name);
     }
   }

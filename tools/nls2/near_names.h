@@ -6,7 +6,7 @@
 
 namespace nls2::tool {
 
-// Up to `most` of the known names, nearest first, that differ in few letters; case does not count.
+// Up to `most` of the known names that are nearest and differ in few letters; case does not count.
 std::vector<std::string> nearNames(const std::string &unknown,
                                    const std::vector<std::string> &known, std::size_t most = 3);
 

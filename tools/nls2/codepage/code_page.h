@@ -8,6 +8,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace nls2::tool {
 
@@ -18,6 +19,10 @@ constexpr int32_t utf7Page = 57366;
 // The number of a code page that an option gives by number or by name. Whether the number opens is
 // seen when the page is. Throws usageError.
 int32_t parsePage(const char *option, const std::string &text);
+
+// The converter of a page that an option gives by number, or by any name that ICU knows, be it
+// ambiguous or without a number. Throws usageError.
+converter openEncoding(const char *option, const std::string &text);
 
 // One character as it stands inside a text of a code page.
 struct EncodedCharacter {
@@ -33,6 +38,7 @@ public:
 
   int32_t number() const { return number_; }
   UConverter *converter() const { return converter_.get(); }
+  nls2::converter take() { return std::move(converter_); }
   bool isSingleByte() const; // every byte is a character by itself
 
   // Nothing where the page does not have the character, or only a substitute for it.

@@ -1,40 +1,75 @@
-// nls2 cat: a text file in any encoding as UTF-8 on standard output.
+// nls2 cat: text files in any encoding as UTF-8 on standard output.
 
+#include "codepage/code_page.h"
 #include "commands.h"
-#include "errors.h"
 #include "io/output_file.h"
 #include "io/text_stream.h"
 
-#include <fmt/core.h>
+#include <algorithm>
 #include <memory>
-#include <string>
+#include <optional>
 
 namespace nls2::tool {
 
 namespace {
 
 constexpr const char *notes =
-    R"(NAME is a converter name of ICU's in any spelling: UTF-16, ISO-8859-1, windows-1252, ibm-1141.
-Line ends and nulls stay what they are. UTF-16 and UTF-32 take off a byte-order mark, and do without
-one (then big-endian); with any other name a mark is text, U+FEFF.
-Bytes that are not valid in the encoding are replaced and counted, and the exit code is 1.
+    R"(NAME is a code page by number, or a converter name of ICU's: UTF-16, ISO-8859-1, ibm-1141. Line ends
+and nulls stay what they are. UTF-16 and UTF-32 take off a byte-order mark, and do without one (then
+big-endian); with any other name a mark is text, U+FEFF.
+Exit codes: 1 if bytes that are not valid in the encoding were replaced, 2 if a file failed.
 )";
 
 struct Arguments {
   std::string encoding;
-  std::string path;
+  std::vector<std::string> paths;
 };
 
-void copy(const Arguments &arguments) {
-  TextStream in(arguments.path, arguments.encoding);
-  OutputFile out("-");
-  for (std::string text = in.read(); !text.empty(); text = in.read()) {
+// Runs a step of reading. A failure is reported, and leaves the other files to be read.
+template <class Step>
+bool succeeds(Step step) {
+  try {
+    step();
+    return true;
+  } catch (const Error &error) {
+    complain(error.what());
+    return false;
+  }
+}
+
+void reportReplaced(const std::string &name, uint64_t count, const std::string &encoding) {
+  const char *verb = count == 1 ? " is" : "s are";
+  complain(fmt::format("{}: {} byte sequence{} not valid {}; each was replaced", printable(name),
+                       count, verb, printable(encoding))
+               .c_str());
+}
+
+// The exit code for this file.
+int copy(const Arguments &arguments, const std::string &path, UConverter *converter,
+         OutputFile &out) {
+  std::optional<TextStream> in;
+  std::string text;
+  bool isRead = succeeds([&] { in.emplace(path, converter); });
+  do {
+    isRead = isRead && succeeds([&] { text = in->read(); });
     out.write(text);
+  } while (isRead && !text.empty());
+  if (in && in->replaced() != 0) {
+    reportReplaced(in->name(), in->replaced(), arguments.encoding);
+    return isRead ? exitFailed : exitUsage;
   }
-  if (in.badSequences() != 0) {
-    throw failure("{}: {} byte sequences are no text of {}; a substitute stands for each",
-                  arguments.path, in.badSequences(), arguments.encoding);
+  return isRead ? exitDone : exitUsage;
+}
+
+int copyAll(const Arguments &arguments) {
+  const converter opened = openEncoding("--encoding", arguments.encoding);
+  OutputFile out("-");
+  int code = exitDone;
+  for (const std::string &path : arguments.paths) {
+    code = std::max(code, copy(arguments, path, opened.get(), out));
   }
+  out.commit();
+  return code;
 }
 
 } // namespace
@@ -42,17 +77,15 @@ void copy(const Arguments &arguments) {
 Command catCommand() {
   const auto arguments = std::make_shared<Arguments>();
   Command command;
-  command.operands = {{"FILE", "file to read; - is standard input", into(arguments->path), 1}};
+  command.operands = {{"FILE", "files to read, one after another; - is standard input",
+                       into(arguments->paths), 1, Operand::anyNumber}};
   command.options = {{.name = "encoding",
                       .metavar = "NAME",
-                      .help = "the file's encoding",
+                      .help = "the files' encoding",
                       .take = into(arguments->encoding),
                       .isRequired = true}};
   command.notes = notes;
-  command.run = [arguments] {
-    copy(*arguments);
-    return exitDone;
-  };
+  command.run = [arguments] { return copyAll(*arguments); };
   return command;
 }
 
