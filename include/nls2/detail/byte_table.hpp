@@ -17,7 +17,7 @@ public:
   // Asks a path whose policy is to replace what is bad and to pad nothing. False when the pair of
   // pages does not allow a table.
   bool build(field_path &path) noexcept {
-    if (!is_single_byte(path.from()) || !is_stateless(path.to())) {
+    if (!is_single_byte(ucnv_getType(path.from())) || !is_stateless(ucnv_getType(path.to()))) {
       return false;
     }
     for (std::size_t byte = 0; byte < rows_.size(); ++byte) {
@@ -66,29 +66,6 @@ private:
   std::uint64_t row(char byte) const noexcept { return rows_[static_cast<unsigned char>(byte)]; }
   static std::size_t size_of(std::uint64_t row) noexcept {
     return static_cast<std::size_t>(row >> size_shift);
-  }
-
-  static bool is_single_byte(UConverter *converter) noexcept {
-    const UConverterType type = ucnv_getType(converter);
-    return type == UCNV_SBCS || type == UCNV_LATIN_1 || type == UCNV_US_ASCII;
-  }
-  // Neither shifts nor a signature.
-  static bool is_stateless(UConverter *converter) noexcept {
-    switch (ucnv_getType(converter)) {
-    case UCNV_SBCS:
-    case UCNV_MBCS:
-    case UCNV_LATIN_1:
-    case UCNV_US_ASCII:
-    case UCNV_UTF8:
-    case UCNV_CESU8:
-    case UCNV_UTF16_BigEndian:
-    case UCNV_UTF16_LittleEndian:
-    case UCNV_UTF32_BigEndian:
-    case UCNV_UTF32_LittleEndian:
-      return true;
-    default:
-      return false;
-    }
   }
 
   bool learn(field_path &path, char byte) noexcept {

@@ -4,6 +4,7 @@
 
 #include "nls2/code_page.hpp"
 #include "nls2/detail/bad_text.hpp"
+#include "nls2/detail/page_traits.hpp"
 
 #include <algorithm>
 #include <cstring>
@@ -16,9 +17,8 @@ namespace nls2::detail {
 // Two open converters with the policy's callbacks, and a buffer for the text between them. It stays
 // where it is made, since ICU's converters point at its count.
 //
-// ICU resets a converter that comes to the end of its input without an error. So the converters are
-// in their initial states whenever a field begins, and are reset by hand after errors only; but
-// those of ISO 2022 forget the header that some of them begin with.
+// The converters are in their initial states whenever a field begins: ICU resets them at the end of
+// input that converts, and errors are followed by a reset by hand.
 class field_path {
 public:
   field_path(code_page from, code_page to, const field_policy &policy,
@@ -50,12 +50,10 @@ public:
     return policy_.width != 0 ? std::min(policy_.width, out.size()) : out.size();
   }
 
-  // The bytes of output that are enough for any field of `bytes` bytes. In the pages named a byte
-  // can stand for a supplementary character or a sequence.
+  // The bytes of output that are enough for any field of `bytes` bytes.
   std::size_t max_size(std::size_t bytes) const noexcept {
-    const UConverterType type = ucnv_getType(from());
-    const bool two = type == UCNV_SCSU || type == UCNV_ISCII || type == UCNV_SBCS;
-    return ((two ? 2 : 1) * bytes + 10) * static_cast<std::size_t>(ucnv_getMaxCharSize(to()));
+    const std::size_t units = can_grow_in_units(ucnv_getType(from())) ? 2 * bytes : bytes;
+    return (units + 10) * static_cast<std::size_t>(ucnv_getMaxCharSize(to()));
   }
 
   void translate(std::span<const char> field, std::span<char> out, field_result &result) noexcept {
@@ -108,20 +106,14 @@ private:
     return make_status(error);
   }
 
-  // How the destination writes a blank after text. In the pages of the first list that depends on
-  // the text, which may leave a mode open; in those of the second the first character of all brings
-  // a signature or a header.
   void learn_pages() noexcept {
-    const UConverterType source = ucnv_getType(from());
-    null_is_zero_byte_ = source == UCNV_SBCS || source == UCNV_MBCS || source == UCNV_LATIN_1 ||
-                         source == UCNV_US_ASCII || source == UCNV_UTF8 ||
-                         source == UCNV_EBCDIC_STATEFUL;
     const UConverterType type = ucnv_getType(to());
-    blank_depends_on_text_ = type == UCNV_UTF7 || type == UCNV_IMAP_MAILBOX || type == UCNV_SCSU ||
-                             type == UCNV_ISCII || type == UCNV_HZ || type == UCNV_COMPOUND_TEXT ||
-                             (type >= UCNV_LMBCS_1 && type <= UCNV_LMBCS_LAST);
-    needs_reset_ = type == UCNV_ISO_2022;
-    first_brings_more_ = type == UCNV_UTF16 || type == UCNV_UTF32 || type == UCNV_ISO_2022;
+    null_is_zero_byte_ = null_is_zero_byte(ucnv_getType(from()));
+    blank_depends_on_text_ = blank_depends_on_text(type);
+    first_brings_more_ = first_brings_more(type);
+    needs_reset_ = needs_reset(type);
+    cuts_bytes_ = ucnv_getType(from()) == UCNV_UTF8 && !needs_reset_ &&
+                  (policy_.padding == padding::strip || !blank_depends_on_text_);
     units_[0] = units_[1] = u' ';
     std::array<char, 32> written = {};
     UErrorCode error = U_ZERO_ERROR;
@@ -280,7 +272,34 @@ private:
     return static_cast<std::size_t>(std::find(begin, begin + text, u'\0') - begin);
   }
 
+  // A field of UTF-8 that ends in ASCII is cut where it is, and goes straight through; nothing is
+  // to be seen in UTF-16. False where that does not do.
+  bool cut_and_straight(std::span<const char> field, std::span<char> out,
+                        field_result &result) noexcept {
+    std::size_t text = field.size();
+    std::size_t blanks = 0;
+    for (; text > 0; --text) {
+      const char last = field[text - 1];
+      if (last != ' ' && last != '\t' && last != '\0') {
+        break;
+      }
+      blanks += last != '\0' ? 1 : 0;
+    }
+    if (text == 0 || field[text - 1] < 0x21 || field[text - 1] > 0x7E ||
+        std::memchr(field.data(), 0, text) != nullptr) {
+      return false;
+    }
+    straight(field.first(text), out, result);
+    if (result && policy_.padding != padding::strip) {
+      add_blanks(blanks, out, result);
+    }
+    return true;
+  }
+
   void padded(std::span<const char> field, std::span<char> out, field_result &result) noexcept {
+    if (cuts_bytes_ && cut_and_straight(field, out, result)) {
+      return;
+    }
     UErrorCode error = U_ZERO_ERROR;
     std::size_t text = decode(field, error);
     if (failed(error)) {
@@ -368,6 +387,7 @@ private:
   std::array<char, 8> blank_ = {}; // as it is written after other text
   std::size_t blank_size_ = 0;     // 0: the destination page has no blank
   bool needs_reset_ = false;
+  bool cuts_bytes_ = false;
   bool null_is_zero_byte_ = false;
   bool blank_depends_on_text_ = false;
   bool first_brings_more_ = false;
