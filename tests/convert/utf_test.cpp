@@ -2,8 +2,7 @@
 // of output.
 
 #include "nls2.h"
-#include "support/icu_probe.h"
-#include "support/live_locale.h"
+#include "support/call_cases.h"
 #include "support/recording_host.h"
 
 #include <algorithm>
@@ -17,12 +16,6 @@ namespace {
 using support::exact;
 using support::LiveLocale;
 
-#if defined(__SANITIZE_ADDRESS__)
-constexpr int slack = 0; // the sanitizer guards the ends
-#else
-constexpr int slack = 4;
-#endif
-
 // Both calls take (target, capacity, status) and must agree on all of it, the canaries included,
 // with every capacity up to two more than are needed.
 template <class Unit, class Library, class Icu>
@@ -30,7 +23,8 @@ void sweep(int32_t successStatus, Library library, Icu icu) {
   UErrorCode error = U_ZERO_ERROR;
   const int32_t needed = icu(static_cast<Unit *>(nullptr), 0, &error);
   for (int32_t capacity = 0; capacity <= needed + 2; ++capacity) {
-    const std::basic_string<Unit> canaries(static_cast<size_t>(capacity + slack), Unit{0x55});
+    const std::basic_string<Unit> canaries(static_cast<size_t>(capacity) + support::canaries,
+                                           Unit{0x55});
     const auto ours = exact(canaries);
     const auto bare = exact(canaries);
     int32_t status = 99;
