@@ -1,6 +1,7 @@
 // A locale's code page and UTF-8 or UTF-16: against the same ICU calls made bare, with every size
 // of output.
 
+#include "convert/translate_oracle.h"
 #include "nls2.h"
 #include "support/call_cases.h"
 #include "support/recording_host.h"
@@ -37,16 +38,6 @@ void sweep(int32_t successStatus, Library library, Icu icu) {
   }
 }
 
-std::string encoded(UConverter *converter, const std::u16string &text) {
-  UErrorCode error = U_ZERO_ERROR;
-  std::string bytes(16 + 8 * text.size(), '\0');
-  bytes.resize(static_cast<size_t>(ucnv_fromUChars(converter, bytes.data(),
-                                                   static_cast<int32_t>(bytes.size()), text.data(),
-                                                   static_cast<int32_t>(text.size()), &error)));
-  EXPECT_TRUE(U_SUCCESS(error));
-  return bytes;
-}
-
 // The length itself, and -1 where a terminator can stand for it.
 template <class Unit, class Check>
 void withBothLengths(const std::basic_string<Unit> &text, Check check) {
@@ -59,10 +50,9 @@ void withBothLengths(const std::basic_string<Unit> &text, Check check) {
 void sweepAll(const NLS2_Locale *locale, const char *icuName, const std::u16string &text) {
   UErrorCode error = U_ZERO_ERROR;
   const icu::LocalUConverterPointer page(ucnv_open(icuName, &error));
-  const icu::LocalUConverterPointer utf8(ucnv_open("utf-8", &error));
   ASSERT_TRUE(U_SUCCESS(error)) << icuName;
   UConverter *converter = page.getAlias();
-  withBothLengths(encoded(converter, text), [=](const char *from, int32_t n) {
+  withBothLengths(oracle::encode({0, icuName, 1}, text), [=](const char *from, int32_t n) {
     sweep<char>(
         0, [=](char *to, int32_t m, auto *e) { return NLS2_toUTF8(locale, from, n, to, m, e); },
         [=](char *to, int32_t m, auto *e) {
@@ -72,7 +62,7 @@ void sweepAll(const NLS2_Locale *locale, const char *icuName, const std::u16stri
         0, [=](UChar *to, int32_t m, auto *e) { return NLS2_toUTF16(locale, from, n, to, m, e); },
         [=](UChar *to, int32_t m, auto *e) { return ucnv_toUChars(converter, to, m, from, n, e); });
   });
-  withBothLengths(encoded(utf8.getAlias(), text), [=](const char *from, int32_t n) {
+  withBothLengths(oracle::encode({0, "utf-8", 1}, text), [=](const char *from, int32_t n) {
     sweep<char>( // whose status a success never sets
         99, [=](char *to, int32_t m, auto *e) { return NLS2_fromUTF8(locale, to, m, from, n, e); },
         [=](char *to, int32_t m, auto *e) {
