@@ -21,6 +21,10 @@ if(ZELNLS2_BUILD_TOOL)
   set_target_properties(nls2 PROPERTIES INSTALL_RPATH "$ORIGIN/${_lib_from_bin}")
   install(TARGETS nls2 DESTINATION ${CMAKE_INSTALL_BINDIR})
   install(FILES ${PROJECT_SOURCE_DIR}/docs/nls2.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
+  install(
+    FILES ${PROJECT_SOURCE_DIR}/completions/nls2.bash
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions
+    RENAME nls2)
 endif()
 
 install(
