@@ -99,6 +99,27 @@ TextFault Decoder::invalidBytes(std::size_t consumed) const {
           consumed - length};
 }
 
+std::string Decoder::encode(const std::string &utf8) const {
+  if (isUtf8_) {
+    return utf8;
+  }
+  std::u16string units(utf8.size() + 1, u'\0');
+  int32_t length = 0;
+  UErrorCode error = U_ZERO_ERROR;
+  u_strFromUTF8WithSub(units.data(), static_cast<int32_t>(units.size()), &length, utf8.data(),
+                       static_cast<int32_t>(utf8.size()), 0xFFFD, nullptr, &error);
+  std::string bytes(static_cast<std::size_t>(UCNV_GET_MAX_BYTES_FOR_STRING(
+                        length, static_cast<int32_t>(ucnv_getMaxCharSize(page_.converter())))),
+                    '\0');
+  length = ucnv_fromUChars(page_.converter(), bytes.data(), static_cast<int32_t>(bytes.size()),
+                           units.data(), length, &error);
+  if (U_FAILURE(error)) {
+    throw std::bad_alloc();
+  }
+  bytes.resize(static_cast<std::size_t>(length));
+  return bytes;
+}
+
 std::optional<TextFault> Decoder::cutNulls() {
   if (std::count(text().begin(), text().end(), u'\0') == 0) { // faster than to look for the first
     return {};

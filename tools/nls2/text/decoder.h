@@ -39,6 +39,9 @@ public:
   std::optional<TextFault> cutNulls();
   void cutBlanks(); // tabs and all space characters
 
+  // A text in the page; characters that the page lacks become its substitution character.
+  std::string encode(const std::string &utf8) const;
+
   bool isUtf8() const { return isUtf8_; }
   const CodePage &page() const { return page_; }
 

@@ -21,6 +21,8 @@ public:
   // Whether the pattern occurs in a line; why it cannot be searched where its bytes are at fault.
   std::optional<TextFault> search(std::string_view line, bool &found);
 
+  const Decoder &decoder() const { return decoder_; }
+
 private:
   std::u16string_view folded(std::u16string_view text);
 
