@@ -1,7 +1,7 @@
 // Owners, and what makes them: code pages, languages, locale objects and bundles.
 
 #include "cpp/failure.h"
-#include "support/icu_probe.h"
+#include "support/probe.h"
 
 namespace {
 

@@ -2,9 +2,9 @@
 
 #include "commands.h"
 #include "errors.h"
-#include "io/line_reader.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
+#include "text/line_reader.h"
 #include "text/text_search.h"
 
 #include <memory>

@@ -1,9 +1,9 @@
 // nls2 sort: lines or records in the order of a language.
 
 #include "commands.h"
-#include "io/line_reader.h"
 #include "io/output_file.h"
 #include "text/line_order.h"
+#include "text/line_reader.h"
 #include "text/sorted_lines.h"
 
 #include <memory>

@@ -1,6 +1,6 @@
 // The lines of a file, or its records of one length, one after another.
 
-#include "io/line_reader.h"
+#include "text/line_reader.h"
 
 #include "codepage/code_page.h"
 #include "errors.h"
