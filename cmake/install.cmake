@@ -34,6 +34,11 @@ if(ZELNLS2_BUILD_TOOL)
     FILES ${PROJECT_SOURCE_DIR}/docs/nls2.1
     DESTINATION ${CMAKE_INSTALL_MANDIR}/man1
     COMPONENT command)
+  install(
+    FILES ${PROJECT_SOURCE_DIR}/completions/nls2.bash
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions
+    COMPONENT command
+    RENAME nls2)
 endif()
 
 install(
