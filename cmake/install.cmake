@@ -35,6 +35,10 @@ if(ZELNLS2_BUILD_TOOL)
     DESTINATION ${CMAKE_INSTALL_MANDIR}/man1
     COMPONENT command)
   install(
+    FILES ${PROJECT_SOURCE_DIR}/docs/nls2.7
+    DESTINATION ${CMAKE_INSTALL_MANDIR}/man7
+    COMPONENT command)
+  install(
     FILES ${PROJECT_SOURCE_DIR}/completions/nls2.bash
     DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions
     COMPONENT command
