@@ -2,23 +2,25 @@
 // NLS2_GetThreadLocale.
 
 #include "locale/locale_map.h"
-#include "locale/object_lines.h"
+#include "locale/trace_object.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 #include <unicode/uclean.h>
 
 namespace {
 
+using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
-// Either of them keeps what the default locale gave the new object.
+// With either of them the new object keeps the defaults.
 constexpr uint32_t keepDefaultOptions = 0x2 | NLS2_LOCALE_DEFAULT;
 
-// A record is found by its id, or by a code page that stands in both its columns; whichever of the
-// two comes first in the table.
+// A record is found by its id, or by a code page that is in both its columns, whichever comes
+// first in the table.
 const LocaleMapEntry *findRequested(uint32_t languageId, uint32_t codepage) {
   return nls2::locale::findEntry([=](const LocaleMapEntry &entry) {
     return entry.languageId == languageId ||
@@ -29,7 +31,7 @@ const LocaleMapEntry *findRequested(uint32_t languageId, uint32_t codepage) {
 NLS2_Locale *allocate(Trace trace, int32_t *pStatus) {
   int32_t status = U_ZERO_ERROR;
   NLS2_Locale *pLocale = NLS2_allocateLocale(&status);
-  if (status != U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(trace, "Could not allocate a locale structure.");
     *pStatus = status;
   }
@@ -86,7 +88,7 @@ NLS2_Locale *NLS2_GetThreadLocale() {
   const Frame frame(anchor);
   int32_t status = U_ZERO_ERROR;
   NLS2_Locale *pLocale = NLS2_GetLocale(0, 0, 0, &status);
-  if (status != U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "Error %d obtaining Thread Locale.", status);
   }
   return pLocale;

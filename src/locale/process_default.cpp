@@ -2,6 +2,8 @@
 
 #include "locale/process_default.h"
 
+#include "trace/status.h"
+
 #include <unicode/ucnv.h>
 #include <unicode/uloc.h>
 
@@ -12,8 +14,8 @@ namespace {
 constexpr const char *usAscii = "US-ASCII";
 constexpr const char *usEbcdic = "ibm-37_P100-1995"; // ICU's canonical name of CCSID 37
 
-// Meant to tell an ASCII machine from an EBCDIC one, but "1" is 0x31 on the one and 0xF1 on the
-// other, never 0x19. Callers have come to rely on US EBCDIC.
+// Meant to distinguish an ASCII machine from an EBCDIC one, but "1" is 0x31 on the one and 0xF1
+// on the other, never 0x19. Callers have come to rely on US EBCDIC.
 const char *fallbackCodepageName(trace::Trace trace) {
   constexpr const char *probe = "1";
   NLS2_TRACE(trace, "ICU returned null codepage, Force it to be ASCII or EBCDIC.");
@@ -37,7 +39,7 @@ int32_t setDefaultCodepage(trace::Trace trace, NLS2_Locale *pLocale) {
   NLS2_TRACE(trace, "Retrieve codepage based on codepage name. %s.", name);
   int32_t status = U_ZERO_ERROR;
   pLocale->codepage = NLS2_GetCodepageId(name, &status);
-  if (status != U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(trace, "Could not get codepage based on codepage name.");
   }
   return status;

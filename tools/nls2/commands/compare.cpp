@@ -1,10 +1,9 @@
 // nls2 compare: two strings by the rules of a language.
 
-#include "answer.h"
 #include "commands.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
-#include "text/string_order.h"
+#include "text/line_order.h"
 
 #include <fmt/core.h>
 #include <memory>
@@ -14,12 +13,11 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr const char *help =
-    R"(Prints -1 where A sorts before B, 1 where B sorts before A, 0 where they are equal. The order
-counts case, accents and punctuation. A and B are bytes of the code page, at most 32767 each.
-
-Exit codes, as cmp has them: 0 equal, 1 not equal, 2 anything that went wrong. An argument that
-begins with a dash goes behind --.)";
+constexpr const char *notes =
+    R"(Prints -1 if A sorts before B, 1 if B sorts before A, 0 if they are equal. The order counts case,
+accents and punctuation. A and B are bytes of the code page.
+Exit codes: 0 equal, 1 not equal, 2 anything that went wrong.
+)";
 
 struct Arguments {
   LocaleOptions locale;
@@ -28,33 +26,35 @@ struct Arguments {
   std::string b;
 };
 
-void require(StringOrder &order, const char *name, const std::string &text) {
-  if (const auto refusal = order.refusal(text)) {
-    throw Failure(fmt::format("{}: {}", name, *refusal));
+std::string keyOf(LineOrder &order, const char *name, const std::string &text) {
+  if (const auto fault = order.makeKey(text)) {
+    throw failure("{}", describe(name, *fault));
   }
+  return std::string(order.key());
 }
 
 bool areEqual(const Arguments &arguments) {
-  StringOrder order(arguments.locale, arguments.ignoreTrailing);
-  require(order, "A", arguments.a);
-  require(order, "B", arguments.b);
-  const int32_t result = order.compare(arguments.a, arguments.b);
-  OutputFile("-").write(fmt::format("{}\n", result));
-  return result == 0;
+  LineOrder order(arguments.locale, arguments.ignoreTrailing);
+  const std::string a = keyOf(order, "A", arguments.a);
+  const std::string b = keyOf(order, "B", arguments.b);
+  OutputFile("-").write(a < b ? "-1\n" : a > b ? "1\n" : "0\n");
+  return a == b;
 }
 
 } // namespace
 
-void addCompareCommand(CLI::App &app) {
-  CLI::App &command =
-      *app.add_subcommand("compare", "Compare two strings by the rules of a language");
+Command compareCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  addLocaleOptions(command, arguments->locale);
-  command.add_flag("--ignore-trailing", arguments->ignoreTrailing, "trailing blanks do not count");
-  command.add_option("A", arguments->a, "the first string")->required();
-  command.add_option("B", arguments->b, "the second string")->required();
-  command.footer(help);
-  command.callback([arguments] { answer([&] { return areEqual(*arguments); }); });
+  Command command;
+  command.operands = {{"A", "the first string", into(arguments->a), 1},
+                      {"B", "the second string", into(arguments->b), 1}};
+  command.options = localeOptions(arguments->locale);
+  command.options.push_back({.name = "ignore-trailing",
+                             .help = "trailing blanks do not count",
+                             .take = into(arguments->ignoreTrailing)});
+  command.notes = notes;
+  command.run = [arguments] { return areEqual(*arguments) ? exitDone : exitFailed; };
+  return command;
 }
 
 } // namespace nls2::tool
