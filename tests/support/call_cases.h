@@ -1,7 +1,7 @@
 // Calls of the library as cases. In a room's *.cases files these keys stand in a case:
 //
 //   plain CALL -> ANSWER   a call without tracing, and once more with detail lines
-//   call CALL              a call whose whole trace follows, a line for each of:
+//   call CALL              a call whose whole trace follows, on as many lines as read well:
 //   | a detail line        dump bytes
 //   calls NAME = value     a function of the library called inside, folded to this line
 //   icu NAME               a call of ICU's; host lock; host unlock
