@@ -110,7 +110,8 @@ Result runTool(const std::vector<std::string> &arguments, std::string_view input
 
 Result runShell(const std::string &line, std::string_view input, const std::string &directory) {
   const std::string path = "PATH=" + std::filesystem::path(NLS2_TOOL).parent_path().string();
-  return runCommand({"/bin/sh", "-c", path + ":$PATH; " + line}, input, directory);
+  return runCommand({"/bin/sh", "-c", path + ":$PATH FAULTS=" TOOL_FAULTS "; " + line}, input,
+                    directory);
 }
 
 Result runTool(const std::string &line, std::string_view input, const std::string &directory) {
