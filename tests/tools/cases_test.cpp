@@ -26,8 +26,8 @@ namespace {
 
 using support::CaseLine;
 
-const std::vector<std::string> keys{"run", "shell", "example", "in",   "out",  "has", "err",
-                                    "exit", "LC_ALL", "file",    "left", "gone"};
+const std::vector<std::string> keys{"run", "shell", "example", "in",   "out",  "has",
+                                    "err", "exit",  "LC_ALL",  "file", "left", "gone"};
 
 struct Run {
   std::vector<std::string> arguments;

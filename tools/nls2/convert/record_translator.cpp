@@ -30,13 +30,14 @@ bool isUtf16Or32(const CodePage &page) {
          type == UCNV_UTF16_LittleEndian;
 }
 
-// As it is behind a record's text, without a signature. A page in which it would depend on that
-// text is one that does not have it.
+// As it is after a record's text, without a signature. Pages that change their mode for U+0085 have
+// no bytes that always mean it.
 std::string encodedNewline(const CodePage &page, Newline newline) {
   std::string bytes;
   for (const char16_t character : textOf(newline)) {
     const auto encoded = page.encoded(character);
-    if (!encoded || (encoded->signatureLength != 0 && !isUtf16Or32(page))) {
+    const bool changesMode = encoded && encoded->signatureLength != 0 && character > 0x7F;
+    if (!encoded || (changesMode && !isUtf16Or32(page))) {
       throw usageError("--newline: code page {} has no U+{:04X}", page.number(),
                        static_cast<unsigned>(character));
     }
