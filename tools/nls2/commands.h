@@ -9,6 +9,7 @@ Command catCommand();
 Command codepagesCommand();
 Command compareCommand();
 Command detectCommand();
+Command dumpCommand();
 Command findCommand();
 Command localesCommand();
 Command sortCommand();

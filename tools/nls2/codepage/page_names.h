@@ -29,12 +29,15 @@ std::optional<int32_t> windowsPage(const std::string &name);
 // The converters of ICU's that have this name, where it means several tables; else none.
 std::vector<std::string> meaningsOf(const std::string &name);
 
-// The number that opens what ICU opens for the name: its CCSID, the number of the library's Windows
-// name, or one of the numbers with names.
+// The number that opens what ICU opens for the name: that of the library's Windows name, else the
+// CCSID or one of the numbers with names. Nothing where there is none, or the name means several
+// tables.
 std::optional<int32_t> numberOf(const std::string &name);
 
 // All names: ICU's converters with their aliases, and the library's Windows names.
 std::vector<std::string> allPageNames();
+// Those that numberOf() finds a number for, sorted.
+std::vector<std::string> namesWithNumbers();
 
 // " (did you mean cp037?)" for a name that is unknown, or a number that has a Windows name.
 std::string nearPages(const std::string &asked);

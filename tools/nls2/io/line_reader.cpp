@@ -58,6 +58,7 @@ std::size_t LineReader::findEnd() {
 }
 
 void LineReader::fill() {
+  dropped_ += start_;
   buffer_.erase(0, start_);
   scanned_ -= start_;
   start_ = 0;
@@ -68,38 +69,49 @@ void LineReader::fill() {
   ended_ = got == 0;
 }
 
+// The line from start_ to there is the last one.
+void LineReader::begin(std::size_t end, std::string_view &line) {
+  ++number_;
+  offset_ = dropped_ + start_;
+  line = std::string_view(buffer_).substr(start_, end - start_);
+  if (line.size() > Decoder::mostBytes) {
+    fail({fmt::format("it has more than {} bytes", Decoder::mostBytes), {}});
+  }
+}
+
 bool LineReader::next(std::string_view &line) {
   std::size_t end = findEnd();
-  while (end == std::string::npos && !ended_) {
+  while (end == std::string::npos && !ended_ && buffer_.size() - start_ <= Decoder::mostBytes) {
     fill();
     end = findEnd();
   }
   if (end == std::string::npos) {
     return last(line);
   }
-  ++number_;
-  line = std::string_view(buffer_).substr(start_, end - start_);
+  begin(end, line);
   start_ = scanned_ = end + format_.terminator.size();
   return true;
 }
 
 bool LineReader::last(std::string_view &line) {
-  line = std::string_view(buffer_).substr(start_);
-  start_ = scanned_ = buffer_.size();
-  if (line.empty()) {
+  if (start_ == buffer_.size()) {
     return false;
   }
-  ++number_;
+  begin(buffer_.size(), line);
+  start_ = scanned_ = buffer_.size();
   if (format_.terminator.empty()) {
-    fail(fmt::format("the input ends after {} of {} bytes; is --record-length {} right?",
-                     line.size(), format_.recordLength, format_.recordLength));
+    fail({fmt::format("the input ends after {} of {} bytes; is --record-length {} right?",
+                      line.size(), format_.recordLength, format_.recordLength),
+          {}});
   }
   return true;
 }
 
-void LineReader::fail(const std::string &reason) const {
-  throw failure("{}: {} {}: {}", input_.name(), format_.terminator.empty() ? "record" : "line",
-                number_, reason);
+void LineReader::fail(const TextFault &fault) const {
+  const char *unit = format_.terminator.empty() ? "record" : "line";
+  throw failure(
+      "{}",
+      describe(fmt::format("{}: {} {} at byte {}", input_.name(), unit, number_, offset_), fault));
 }
 
 } // namespace nls2::tool

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "io/input_file.h"
+#include "text/decoder.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -11,7 +12,7 @@
 namespace nls2::tool {
 
 struct LineFormat {
-  std::string terminator;       // behind every line, at a multiple of its length from the line's
+  std::string terminator;       // after every line, at a multiple of its length from the line's
                                 // start; empty for records
   std::size_t recordLength = 0; // of records
 };
@@ -29,8 +30,8 @@ public:
   // need not have its terminator, a last record must be whole. Throws Error.
   bool next(std::string_view &line);
 
-  // Throws Error with the file's name and the last line's number.
-  [[noreturn]] void fail(const std::string &reason) const;
+  // Throws Error with the file's name, the last line's number and its first byte's offset.
+  [[noreturn]] void fail(const TextFault &fault) const;
 
   const std::string &name() const { return input_.name(); }
   uint64_t number() const { return number_; } // of the last line, from 1
@@ -39,12 +40,15 @@ private:
   std::size_t findEnd();
   void fill();
   bool last(std::string_view &line);
+  void begin(std::size_t end, std::string_view &line);
 
   InputFile input_;
   const LineFormat format_;
   std::string buffer_;
   std::size_t start_ = 0;   // of the next line
   std::size_t scanned_ = 0; // no terminator ends before this place
+  uint64_t dropped_ = 0;    // bytes that were before the buffer
+  uint64_t offset_ = 0;     // of the last line
   uint64_t number_ = 0;
   bool ended_ = false;
 };
