@@ -13,8 +13,6 @@
 namespace nls2::tool {
 
 constexpr int32_t utf8Page = 1208;
-constexpr int32_t utf16lePage = 57359;
-constexpr int32_t utf7Page = 57366;
 
 // The number of a code page that an option gives by number or by name. Whether the number opens is
 // seen when the page is. Throws usageError.

@@ -103,7 +103,7 @@ void OutputFile::open(const std::string &path) {
     throw failure("cannot write {}: it is a symbolic link that leads nowhere", name_);
   }
   replacedPath_ = path;
-  temporary_ = std::make_unique<TemporaryFile>(path, 0666);
+  temporary_ = std::make_unique<TemporaryFile>(path, name_, 0666);
   fd_ = temporary_->fd();
 }
 
@@ -124,7 +124,7 @@ void OutputFile::replaceFile(const std::string &path, const struct stat &existin
     throw failure("cannot write {}: it is another user's, in a directory with the sticky bit",
                   name_);
   }
-  temporary_ = std::make_unique<TemporaryFile>(replacedPath_, 0600);
+  temporary_ = std::make_unique<TemporaryFile>(replacedPath_, name_, 0600);
   fd_ = temporary_->fd();
   copyAttributes(replacedPath_, existing, fd_);
 }
