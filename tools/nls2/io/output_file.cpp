@@ -3,6 +3,7 @@
 #include "io/output_file.h"
 
 #include "errors.h"
+#include "memory.h"
 #include "io/file_attributes.h"
 
 #include <cerrno>
@@ -103,7 +104,7 @@ void OutputFile::open(const std::string &path) {
     throw failure("cannot write {}: it is a symbolic link that leads nowhere", name_);
   }
   replacedPath_ = path;
-  temporary_ = std::make_unique<TemporaryFile>(path, 0666);
+  temporary_ = std::make_unique<TemporaryFile>(path, name_, 0666);
   fd_ = temporary_->fd();
 }
 
@@ -124,7 +125,7 @@ void OutputFile::replaceFile(const std::string &path, const struct stat &existin
     throw failure("cannot write {}: it is another user's, in a directory with the sticky bit",
                   name_);
   }
-  temporary_ = std::make_unique<TemporaryFile>(replacedPath_, 0600);
+  temporary_ = std::make_unique<TemporaryFile>(replacedPath_, name_, 0600);
   fd_ = temporary_->fd();
   copyAttributes(replacedPath_, existing, fd_);
 }
@@ -167,6 +168,7 @@ void OutputFile::flush() {
 
 // Closing a second descriptor makes a file system report lost bytes, and standard output stays.
 void OutputFile::commit(bool sync) {
+  requireMemory(); // what ICU made without it must not take a file's place
   flush();
   if (temporary_) {
     temporary_->publish(sync);
