@@ -8,7 +8,6 @@
 #include "near_names.h"
 #include "options.h"
 
-#include <algorithm>
 #include <limits>
 
 namespace nls2::tool {
@@ -103,22 +102,6 @@ std::optional<EncodedCharacter> CodePage::encoded(char16_t character) const {
     return {};
   }
   return EncodedCharacter{two.substr(one.size()), 2 * one.size() - two.size()};
-}
-
-std::string translateText(int32_t to, int32_t from, std::string_view text, int32_t &status) {
-  constexpr std::size_t most = std::numeric_limits<int32_t>::max();
-  std::string out(std::min(4 * text.size() + 16, most), '\0');
-  for (;;) {
-    int32_t consumed = 0;
-    const int32_t written =
-        NLS2_TranslateString(to, out.data(), static_cast<int32_t>(out.size()), from, text.data(),
-                             static_cast<int32_t>(text.size()), &consumed, 0, &status);
-    if (status != U_BUFFER_OVERFLOW_ERROR || out.size() == most) {
-      out.resize(static_cast<std::size_t>(written));
-      return out;
-    }
-    out.resize(std::min(2 * out.size(), most));
-  }
 }
 
 } // namespace nls2::tool

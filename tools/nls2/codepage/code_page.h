@@ -49,8 +49,4 @@ private:
   nls2::converter converter_;
 };
 
-// A text from one code page to another as it is, in a buffer that grows until it fits. The status
-// is the library's; the text is empty on failure.
-std::string translateText(int32_t to, int32_t from, std::string_view text, int32_t &status);
-
 } // namespace nls2::tool

@@ -73,8 +73,7 @@ private:
   void print(const std::string &prefix, std::string_view line) {
     isPrinting_ = true;
     if (!prefix.empty()) {
-      int32_t status = 0;
-      output_.put(translateText(arguments_.locale.codepage, utf8Page, prefix, status));
+      output_.put(search_.decoder().encode(prefix));
     }
     output_.put(line);
     output_.put(format_.terminator);

@@ -47,8 +47,9 @@ std::size_t LineReader::findEnd() {
     return end <= buffer_.size() ? end : std::string::npos;
   }
   const std::size_t unit = format_.terminator.size();
-  std::size_t end = buffer_.find(format_.terminator, scanned_);
-  while (end != std::string::npos && (end - start_) % unit != 0) {
+  std::size_t end = unit == 1 ? buffer_.find(format_.terminator.front(), scanned_)
+                              : buffer_.find(format_.terminator, scanned_);
+  while (unit != 1 && end != std::string::npos && (end - start_) % unit != 0) {
     end = buffer_.find(format_.terminator, end + 1);
   }
   if (end == std::string::npos) {

@@ -3,6 +3,7 @@
 #include "io/output_file.h"
 
 #include "errors.h"
+#include "memory.h"
 #include "io/file_attributes.h"
 
 #include <algorithm>
@@ -177,6 +178,7 @@ void OutputFile::flush() {
 
 // Closing a second descriptor makes a file system report lost bytes, and standard output stays.
 void OutputFile::commit(bool sync) {
+  requireMemory(); // what ICU made without it must not take a file's place
   flush();
   if (temporary_) {
     temporary_->publish(sync);

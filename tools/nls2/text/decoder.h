@@ -19,6 +19,9 @@ struct TextFault {
 // "a, column 3: ..." or "a: ...".
 std::string describe(const std::string &place, const TextFault &fault);
 
+// Whether all bytes are below 0x80.
+bool isAscii(std::string_view bytes);
+
 // For one thread at a time.
 class Decoder {
 public:
@@ -36,10 +39,14 @@ public:
   std::optional<TextFault> cutNulls();
   void cutBlanks(); // tabs and all space characters
 
+  // A text in the page; characters that the page lacks become its substitution character.
+  std::string encode(const std::string &utf8) const;
+
+  bool isUtf8() const { return isUtf8_; }
   const CodePage &page() const { return page_; }
 
 private:
-  void widenAscii(std::string_view bytes, std::size_t count);
+  bool decodeUtf8(std::string_view bytes);
   TextFault invalidBytes(std::size_t consumed) const;
 
   const CodePage page_;

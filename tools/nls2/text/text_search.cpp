@@ -14,6 +14,17 @@ namespace nls2::tool {
 
 namespace {
 
+// Most lines are ASCII, whose folding is a loop over many units at once. False for other text, of
+// which the output has nothing of use.
+bool foldAscii(std::u16string_view text, char16_t *folded) {
+  char16_t all = 0;
+  for (const char16_t unit : text) {
+    all |= unit;
+    *folded++ = static_cast<char16_t>(unit + (unit >= u'A' && unit <= u'Z' ? 0x20 : 0));
+  }
+  return all < 0x80;
+}
+
 // Whether the page has all of these characters, and not only substitutes for them.
 bool hasAll(const CodePage &page, std::u16string_view text) {
   UErrorCode error = U_ZERO_ERROR;
@@ -67,11 +78,16 @@ TextSearch::TextSearch(const LocaleOptions &locale, const std::string &pattern, 
   if (ignoreCase) {
     folding_ = hasDotlessI(locale) ? U_FOLD_CASE_EXCLUDE_SPECIAL_I : U_FOLD_CASE_DEFAULT;
     pattern_ = folded(pattern_);
+  } else if (decoder_.isUtf8()) {
+    utf8Pattern_ = pattern;
   }
 }
 
 std::u16string_view TextSearch::folded(std::u16string_view text) {
   folded_.resize(std::max(folded_.size(), text.size() + 1));
+  if (folding_ == U_FOLD_CASE_DEFAULT && foldAscii(text, folded_.data())) {
+    return {folded_.data(), text.size()};
+  }
   for (;;) {
     UErrorCode error = U_ZERO_ERROR;
     const auto length = static_cast<std::size_t>(
@@ -88,6 +104,10 @@ std::u16string_view TextSearch::folded(std::u16string_view text) {
 }
 
 std::optional<TextFault> TextSearch::search(std::string_view line, bool &found) {
+  if (!utf8Pattern_.empty() && isAscii(line) && line.find('\0') == line.npos) {
+    found = line.find(utf8Pattern_) != line.npos;
+    return {};
+  }
   std::optional<TextFault> fault = decoder_.decode(line);
   if (!fault) {
     fault = decoder_.cutNulls();

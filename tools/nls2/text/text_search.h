@@ -21,6 +21,8 @@ public:
   // Whether the pattern occurs in a line; why it cannot be searched where its bytes are at fault.
   std::optional<TextFault> search(std::string_view line, bool &found);
 
+  const Decoder &decoder() const { return decoder_; }
+
 private:
   std::u16string_view folded(std::u16string_view text);
 
@@ -28,7 +30,8 @@ private:
   const bool ignoreCase_;
   uint32_t folding_ = 0; // U_FOLD_CASE_*
   std::u16string pattern_;
-  std::u16string folded_; // the last line
+  std::string utf8Pattern_; // where lines of ASCII may be searched as bytes; else empty
+  std::u16string folded_;   // the last line
 };
 
 } // namespace nls2::tool
