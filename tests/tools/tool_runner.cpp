@@ -21,6 +21,7 @@ namespace {
 pid_t spawn(const std::vector<std::string> &command, const TempDir &streams,
             const std::string &directory) {
   std::vector<char *> argv;
+  argv.reserve(command.size() + 1);
   for (const std::string &argument : command) {
     argv.push_back(const_cast<char *>(argument.c_str()));
   }

@@ -122,8 +122,8 @@ bool RecordReader::readLines(RecordBatch &batch) {
 // The last line may have no end.
 void RecordReader::findLines(RecordBatch &batch) {
   const std::string_view text = batch.bytes.bytes();
-  const uint64_t most = left_ < mostRecords_ ? std::min<uint64_t>(left_ + toSkip_, mostRecords_)
-                                             : mostRecords_;
+  const uint64_t most =
+      left_ < mostRecords_ ? std::min<uint64_t>(left_ + toSkip_, mostRecords_) : mostRecords_;
   while (batch.lines.size() < most) {
     const auto line = ends_->lineAt(text, scanned_);
     if (!line) {

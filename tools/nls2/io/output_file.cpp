@@ -6,6 +6,7 @@
 #include "memory.h"
 #include "io/file_attributes.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <charconv>
 #include <climits>
@@ -32,11 +33,26 @@ std::string resolved(const std::string &path) {
 // The file that a path leads to, through symbolic links: a link stays a link when its file is
 // replaced.
 std::string realPathOf(const std::string &path) {
-  const std::string real = resolved(path);
+  std::string real = resolved(path);
   if (real.empty()) {
     throw failure("cannot write {}: {}", printable(path), std::strerror(errno));
   }
   return real;
+}
+
+std::optional<int> numberIn(const std::string &text) {
+  int number = -1;
+  const char *end = text.data() + text.size();
+  const auto [stop, error] = std::from_chars(text.data(), end, number);
+  return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
+}
+
+// Where a symbolic link leads; empty for everything else.
+std::string targetOf(const std::string &path) {
+  std::string target(PATH_MAX, '\0');
+  const ssize_t length = readlink(path.c_str(), target.data(), target.size());
+  target.resize(static_cast<std::size_t>(std::max<ssize_t>(length, 0)));
+  return target;
 }
 
 // The number in /proc/self/fd/NUMBER, to which /dev/stdout, /dev/fd/NUMBER and links of users lead.
@@ -44,23 +60,17 @@ std::string realPathOf(const std::string &path) {
 std::optional<int> descriptorOf(std::string path) {
   const std::string ours = "/proc/" + std::to_string(getpid()) + "/";
   for (int links = 0; links < 40; ++links) {
-    const std::size_t slash = path.rfind('/');
-    const std::string directory = slash == std::string::npos ? "." : path.substr(0, slash + 1);
-    const std::string name = slash == std::string::npos ? path : path.substr(slash + 1);
+    const std::size_t name = path.rfind('/') + 1; // 0 without a slash
+    const std::string directory = name == 0 ? "./" : path.substr(0, name);
     const std::string real = resolved(directory);
     if (real.starts_with(ours) && real.ends_with("/fd")) {
-      int number = -1;
-      const char *end = name.data() + name.size();
-      const auto [stop, error] = std::from_chars(name.data(), end, number);
-      return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
+      return numberIn(path.substr(name));
     }
-    std::string target(PATH_MAX, '\0');
-    const ssize_t length = readlink(path.c_str(), target.data(), target.size());
-    if (length <= 0) {
+    const std::string target = targetOf(path);
+    if (target.empty()) {
       return {};
     }
-    target.resize(static_cast<std::size_t>(length));
-    path = target.starts_with("/") ? target : directory + "/" + target;
+    path = target.starts_with("/") ? target : directory + target;
   }
   return {};
 }
