@@ -76,6 +76,16 @@ std::string listed(Names &names) {
   return text;
 }
 
+// A sanitizer's heap begins where addresses end in zero bits: in a trace its first blocks look like
+// small numbers, so the text gets a block beyond those.
+std::unique_ptr<char[]> farBlock(const std::string &text) {
+  std::vector<std::unique_ptr<char[]>> near;
+  while (near.empty() || low32(near.back().get()) < 0x10000) {
+    near.push_back(exact(text));
+  }
+  return std::move(near.back());
+}
+
 bool isWord(char c) { return std::isalnum(static_cast<unsigned char>(c)) != 0 || c == '-'; }
 
 void replaceWord(std::string &text, const std::string &word, const std::string &with) {
@@ -299,7 +309,7 @@ Words::Words(const std::string &call) {
   stream >> word;
   while (stream >> word) {
     words_.push_back(word == "''" ? "" : CaseLine{"", word, call}.bytes());
-    texts_.push_back(word == "null" ? nullptr : exact(words_.back()));
+    texts_.push_back(word == "null" ? nullptr : farBlock(words_.back()));
     if (word[0] == 'L' && std::isdigit(static_cast<unsigned char>(word[1])) != 0 && word != "L0") {
       const std::size_t slash = word.find('/');
       auto &live = live_[word];
