@@ -243,7 +243,7 @@ void expectCall(Trace expected, const Functions &functions, const Settings &sett
       actual.text.replace(at, found - at, "... ");
     }
   }
-  EXPECT_EQ(difference(broken(expected.text), broken(actual.text), ".", place), "");
+  EXPECT_EQ(difference(broken(expected.text), broken(actual.text), ACTUAL_FOLDER, place), "");
 }
 
 void expectPlain(const Functions &functions, Settings settings, const CaseLine &line) {
