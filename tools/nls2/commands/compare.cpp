@@ -1,13 +1,10 @@
 // nls2 compare: two strings by the rules of a language.
 
 #include "commands.h"
-#include "io/output_file.h"
-#include "locale/locale_option.h"
+#include "io/print.h"
 #include "text/line_order.h"
 
-#include <fmt/core.h>
 #include <memory>
-#include <string>
 
 namespace nls2::tool {
 
@@ -20,41 +17,38 @@ Exit codes: 0 equal, 1 not equal, 2 anything that went wrong.
 )";
 
 struct Arguments {
-  LocaleOptions locale;
-  bool ignoreTrailing = false;
-  std::string a;
-  std::string b;
+  OrderOptions order;
+  std::string a, b;
 };
 
 std::string keyOf(LineOrder &order, const char *name, const std::string &text) {
-  if (const auto fault = order.makeKey(text)) {
-    throw failure("{}", describe(name, *fault));
+  try {
+    return std::string(order.keyOf(text));
+  } catch (const TextFault &fault) {
+    throw failure("{}{}", name, fault.what());
   }
-  return std::string(order.key());
 }
 
-bool areEqual(const Arguments &arguments) {
-  LineOrder order(arguments.locale, arguments.ignoreTrailing);
+ExitCode compare(const Arguments &arguments) {
+  LineOrder order(arguments.order);
   const std::string a = keyOf(order, "A", arguments.a);
   const std::string b = keyOf(order, "B", arguments.b);
-  OutputFile("-").write(a < b ? "-1\n" : a > b ? "1\n" : "0\n");
-  return a == b;
+  print(a < b ? "-1\n" : a > b ? "1\n" : "0\n");
+  return a == b ? exitDone : exitFailed;
 }
 
 } // namespace
 
 Command compareCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {{"A", "the first string", into(arguments->a), 1},
-                      {"B", "the second string", into(arguments->b), 1}};
-  command.options = localeOptions(arguments->locale);
-  command.options.push_back({.name = "ignore-trailing",
-                             .help = "trailing blanks do not count",
-                             .take = into(arguments->ignoreTrailing)});
-  command.notes = notes;
-  command.run = [arguments] { return areEqual(*arguments) ? exitDone : exitFailed; };
-  return command;
+  return {.operands = {{"A", "the first string", into(arguments->a), 1},
+                       {"B", "the second string", into(arguments->b), 1}},
+          .options = localeOptions(arguments->order.locale,
+                                   {{.name = "ignore-trailing",
+                                     .help = "trailing blanks do not count",
+                                     .take = into(arguments->order.ignoreTrailing)}}),
+          .notes = notes,
+          .run = [arguments] { return compare(*arguments); }};
 }
 
 } // namespace nls2::tool

@@ -4,11 +4,12 @@
 #include "io/output_file.h"
 #include "text/line_order.h"
 #include "text/line_reader.h"
-#include "text/sorted_lines.h"
 
+#include <algorithm>
+#include <cstring>
+#include <endian.h>
 #include <memory>
-#include <string>
-#include <vector>
+#include <memory_resource>
 
 namespace nls2::tool {
 
@@ -22,79 +23,103 @@ memory. OUT may be one of the FILEs.
 )";
 
 struct Arguments {
-  LocaleOptions locale;
-  bool ignoreTrailing = false;
-  int32_t recordLength = 0;
+  OrderOptions order;
+  std::size_t recordLength = 0;
   std::vector<std::string> inputs;
   std::string output = "-";
 };
 
-void readLines(const std::string &path, const LineFormat &format, LineOrder &order,
-               SortedLines &lines) {
-  LineReader reader(path, format);
-  for (std::string_view line; reader.next(line);) {
-    if (const auto fault = order.makeKey(line)) {
-      reader.fail(*fault);
+// A line with its sort key. Most comparisons need the first bytes of the keys only, and those are
+// beside each other.
+struct KeyedLine {
+  uint64_t prefix;   // of the key, in an order that compares as its bytes do
+  const char *bytes; // the key, and after it the line
+  uint32_t keyLength;
+  uint32_t lineLength;
+
+  std::string_view key() const { return {bytes, keyLength}; }
+  std::string_view line() const { return {bytes + keyLength, lineLength}; }
+  bool operator<(const KeyedLine &other) const {
+    return prefix != other.prefix ? prefix < other.prefix : key() < other.key();
+  }
+};
+
+class Lines {
+public:
+  // Keeps copies of both. A key has no zero byte but its last.
+  void add(std::string_view line, std::string_view key) {
+    auto *const bytes = static_cast<char *>(memory_.allocate(key.size() + line.size(), 1));
+    std::copy(line.begin(), line.end(), std::copy(key.begin(), key.end(), bytes));
+    uint64_t prefix = 0;
+    std::memcpy(&prefix, key.data(), std::min(key.size(), sizeof prefix));
+    lines_.push_back({be64toh(prefix), bytes, static_cast<uint32_t>(key.size()),
+                      static_cast<uint32_t>(line.size())});
+  }
+
+  // Lines with equal keys are in the order in which they were added.
+  const std::vector<KeyedLine> &sorted() {
+    std::stable_sort(lines_.begin(), lines_.end());
+    return lines_;
+  }
+
+private:
+  std::pmr::monotonic_buffer_resource memory_{std::size_t{1} << 20};
+  std::vector<KeyedLine> lines_;
+};
+
+void readLines(LineReader &&reader, LineOrder &order, Lines &lines) {
+  while (const auto line = reader.next()) {
+    try {
+      lines.add(*line, order.keyOf(*line));
+    } catch (const TextFault &fault) {
+      reader.fail(fault.what());
     }
-    lines.add(line, order.key());
   }
 }
 
-void sortFiles(const Arguments &arguments) {
-  LineOrder order(arguments.locale, arguments.ignoreTrailing);
-  LineFormat format;
-  if (arguments.recordLength != 0) {
-    format.recordLength = static_cast<std::size_t>(arguments.recordLength);
-  } else {
-    format.terminator = lineTerminator(arguments.locale.codepage);
-  }
-  SortedLines lines;
-  for (const std::string &path : arguments.inputs) {
-    readLines(path, format, order, lines);
+int sortFiles(const Arguments &arguments) {
+  LineOrder order(arguments.order);
+  const std::string terminator =
+      arguments.recordLength == 0 ? lineTerminator(arguments.order.locale.codepage) : "";
+  Lines lines;
+  for (const std::string &path : inputsOf(arguments.inputs)) {
+    readLines(LineReader(path, terminator, arguments.recordLength), order, lines);
   }
   OutputFile output(arguments.output);
-  lines.sort();
-  lines.forEach([&](std::string_view line) {
-    output.put(line);
-    output.put(format.terminator);
-  });
+  for (const KeyedLine &each : lines.sorted()) {
+    output.put(each.line());
+    output.put(terminator);
+  }
   output.flush();
   output.commit();
+  return exitDone;
 }
 
 } // namespace
 
 Command sortCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {{"FILE", "files to read; standard input if - or not given",
-                       into(arguments->inputs), 0, Operand::anyNumber}};
-  command.options = localeOptions(arguments->locale);
-  const auto add = [&](const Option &option) { command.options.push_back(option); };
-  add({.name = "ignore-trailing",
-       .help = "trailing blanks do not count",
-       .take = into(arguments->ignoreTrailing)});
-  add({.name = "record-length",
-       .metavar = "N",
-       .help = "sort records of N bytes instead of lines",
-       .take = [arguments](const std::string &text) {
-         arguments->recordLength =
-             parseNumber("--record-length", text, 1, int32_t{Decoder::mostBytes});
-       }});
-  add({.name = "output",
-       .letter = 'o',
-       .metavar = "OUT",
-       .help = "file to write; standard output if - or not given",
-       .take = into(arguments->output)});
-  command.notes = notes;
-  command.run = [arguments] {
-    if (arguments->inputs.empty()) {
-      arguments->inputs.emplace_back("-");
-    }
-    sortFiles(*arguments);
-    return exitDone;
+  const auto takeLength = [arguments](const std::string &text) {
+    arguments->recordLength = static_cast<std::size_t>(
+        parseNumber("--record-length", text, 1, int32_t{Decoder::mostBytes}));
   };
-  return command;
+  return {.operands = {{"FILE", "files to read; standard input if - or not given",
+                        into(arguments->inputs), 0, Operand::anyNumber}},
+          .options = localeOptions(arguments->order.locale,
+                                   {{.name = "ignore-trailing",
+                                     .help = "trailing blanks do not count",
+                                     .take = into(arguments->order.ignoreTrailing)},
+                                    {.name = "record-length",
+                                     .metavar = "N",
+                                     .help = "sort records of N bytes instead of lines",
+                                     .take = takeLength},
+                                    {.name = "output",
+                                     .letter = 'o',
+                                     .metavar = "OUT",
+                                     .help = "file to write; standard output if - or not given",
+                                     .take = into(arguments->output)}}),
+          .notes = notes,
+          .run = [arguments] { return sortFiles(*arguments); }};
 }
 
 } // namespace nls2::tool

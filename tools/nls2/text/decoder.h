@@ -2,25 +2,58 @@
 #pragma once
 
 #include "codepage/code_page.h"
+#include "errors.h"
 
+#include <algorithm>
 #include <cstddef>
-#include <optional>
+#include <new>
 #include <string>
 #include <string_view>
+#include <unicode/uchar.h>
+#include <unicode/unistr.h>
+#include <unicode/ustring.h>
+#include <unicode/utf16.h>
 
 namespace nls2::tool {
 
-// Why a text cannot be used, and at which of its bytes where one is to blame.
-struct TextFault {
-  std::string reason;
-  std::optional<std::size_t> offset;
+// A text that cannot be used. The message goes after the text's place: ", column 3: ..." or ": ...".
+class TextFault : public Error {
+public:
+  explicit TextFault(const std::string &text) : Error(exitFailed, text) {}
 };
 
-// "a, column 3: ..." or "a: ...".
-std::string describe(const std::string &place, const TextFault &fault);
+// Whether all bytes are below 0x80. Looks at every one, which the compiler does for many at once.
+inline bool isAscii(std::string_view bytes) {
+  unsigned char all = 0;
+  for (const char byte : bytes) {
+    all |= static_cast<unsigned char>(byte);
+  }
+  return all < 0x80;
+}
 
-// Whether all bytes are below 0x80.
-bool isAscii(std::string_view bytes);
+// A text without the nulls at its end. Throws TextFault where text follows a null.
+inline std::u16string_view withoutNulls(std::u16string_view text) {
+  if (std::count(text.begin(), text.end(), u'\0') == 0) { // faster than to look for the first
+    return text;
+  }
+  const std::size_t null = text.find(u'\0');
+  if (text.find_first_not_of(u'\0', null) != text.npos) {
+    throw TextFault(": text follows a null (U+0000), where it would not be seen");
+  }
+  return text.substr(0, null);
+}
+
+// A text without the tabs and space characters at its end.
+inline std::u16string_view withoutBlanks(std::u16string_view text) {
+  for (std::size_t end = text.size(); end > 0; text = text.substr(0, end)) {
+    UChar32 character = 0;
+    U16_PREV(text.data(), 0, end, character);
+    if (!u_isblank(character)) {
+      break;
+    }
+  }
+  return text;
+}
 
 // For one thread at a time.
 class Decoder {
@@ -28,31 +61,93 @@ public:
   static constexpr std::size_t mostBytes = std::size_t{1} << 30;
 
   // Throws usageError where the page does not open; `option` is who named it.
-  Decoder(int32_t page, const char *option);
+  Decoder(int32_t page, const char *option)
+      : page_(page, option), isUtf8_(ucnv_getType(page_.converter()) == UCNV_UTF8) {
+    UErrorCode error = U_ZERO_ERROR;
+    ucnv_setToUCallBack(page_.converter(), UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr,
+                        &error);
+  }
 
-  // Decodes a text of at most mostBytes. Bytes that are not valid in the page are a fault.
-  std::optional<TextFault> decode(std::string_view bytes);
-  // The last text that decode() accepted, valid until the next call.
-  std::u16string_view text() const { return {units_.data(), length_}; }
-
-  // Cuts nulls off the text's end; more text after a null is a fault.
-  std::optional<TextFault> cutNulls();
-  void cutBlanks(); // tabs and all space characters
+  // A text, valid until the next call. Throws TextFault where there are more than mostBytes, and
+  // where some are not valid in the page. UTF-8 goes without the converter, which takes longer to
+  // start than a short line to decode.
+  std::u16string_view decode(std::string_view bytes) {
+    if (bytes.size() > mostBytes) {
+      throw TextFault(
+          fmt::format(": {} bytes are too many; the most is {}", bytes.size(), mostBytes));
+    }
+    units_.resize(std::max(units_.size(), bytes.size() + 1));
+    if (isUtf8_ && isAscii(bytes)) {
+      std::copy(bytes.begin(), bytes.end(), units_.begin());
+      return {units_.data(), bytes.size()};
+    }
+    UErrorCode error = isUtf8_ ? U_ZERO_ERROR : U_UNSUPPORTED_ERROR; // which makes it do nothing
+    int32_t length = 0;
+    u_strFromUTF8(units_.data(), static_cast<int32_t>(units_.size()), &length, bytes.data(),
+                  static_cast<int32_t>(bytes.size()), &error);
+    return U_SUCCESS(error) ? std::u16string_view(units_.data(), static_cast<std::size_t>(length))
+                            : convert(bytes);
+  }
 
   // A text in the page; characters that the page lacks become its substitution character.
-  std::string encode(const std::string &utf8) const;
+  std::string encode(const icu::UnicodeString &text) const {
+    const int32_t most =
+        UCNV_GET_MAX_BYTES_FOR_STRING(text.length(), ucnv_getMaxCharSize(page_.converter()));
+    std::string bytes(static_cast<std::size_t>(most), '\0');
+    UErrorCode error = U_ZERO_ERROR;
+    const int32_t length = text.extract(bytes.data(), most, page_.converter(), error);
+    if (U_FAILURE(error)) {
+      throw std::bad_alloc();
+    }
+    bytes.resize(static_cast<std::size_t>(length));
+    return bytes;
+  }
 
   bool isUtf8() const { return isUtf8_; }
   const CodePage &page() const { return page_; }
 
 private:
-  bool decodeUtf8(std::string_view bytes);
-  TextFault invalidBytes(std::size_t consumed) const;
+  std::u16string_view convert(std::string_view bytes) {
+    const char *source = bytes.data();
+    std::size_t length = 0;
+    ucnv_resetToUnicode(page_.converter());
+    for (;; units_.resize(2 * units_.size())) {
+      UErrorCode error = U_ZERO_ERROR;
+      UChar *target = units_.data() + length;
+      ucnv_toUnicode(page_.converter(), &target, units_.data() + units_.size(), &source,
+                     bytes.data() + bytes.size(), nullptr, true, &error);
+      length = static_cast<std::size_t>(target - units_.data());
+      if (U_SUCCESS(error)) {
+        return {units_.data(), length};
+      }
+      if (error == U_MEMORY_ALLOCATION_ERROR) {
+        throw std::bad_alloc();
+      }
+      if (error != U_BUFFER_OVERFLOW_ERROR) {
+        throw invalidBytes(static_cast<std::size_t>(source - bytes.data()));
+      }
+    }
+  }
+
+  // `consumed` bytes end with those that are to blame.
+  TextFault invalidBytes(std::size_t consumed) const {
+    char bytes[32];
+    int8_t count = sizeof bytes;
+    UErrorCode error = U_ZERO_ERROR;
+    ucnv_getInvalidChars(page_.converter(), bytes, &count, &error);
+    const auto length = std::min(static_cast<std::size_t>(U_FAILURE(error) ? 0 : count), consumed);
+    std::string hex;
+    for (const char byte : std::string_view(bytes, length)) {
+      hex += fmt::format(" {:02X}", static_cast<unsigned char>(byte));
+    }
+    return TextFault(fmt::format(", column {}: the byte{}{} {} not valid in code page {}",
+                                 consumed - length + 1, length == 1 ? "" : "s", hex,
+                                 length == 1 ? "is" : "are", page_.number()));
+  }
 
   const CodePage page_;
-  bool isUtf8_;
+  const bool isUtf8_;
   std::u16string units_;
-  std::size_t length_ = 0;
 };
 
 } // namespace nls2::tool

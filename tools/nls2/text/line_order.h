@@ -4,33 +4,66 @@
 #include "locale/locale_option.h"
 #include "text/decoder.h"
 
-#include <memory>
-#include <optional>
+#include <new>
 #include <string>
 #include <string_view>
 #include <unicode/localpointer.h>
 #include <unicode/ucol.h>
+#include <vector>
 
 namespace nls2::tool {
+
+struct OrderOptions {
+  LocaleOptions locale;
+  bool ignoreTrailing = false;
+};
 
 // Gives every text a key; the keys' bytes compare as the library's comparison orders the texts. For
 // one thread at a time.
 class LineOrder {
 public:
   // Throws usageError.
-  LineOrder(const LocaleOptions &locale, bool ignoreTrailing);
+  explicit LineOrder(const OrderOptions &options)
+      : decoder_(options.locale.codepage, "--codepage"), ignoreTrailing_(options.ignoreTrailing) {
+    const std::string locale = orderLocale(options.locale);
+    UErrorCode error = U_ZERO_ERROR;
+    collator_.adoptInstead(ucol_open(locale.c_str(), &error));
+    if (error == U_MEMORY_ALLOCATION_ERROR) {
+      throw std::bad_alloc();
+    }
+    if (U_FAILURE(error)) {
+      throw failure("cannot open the order of {}: {}", locale, statusText(error));
+    }
+    ucol_setStrength(collator_.getAlias(), UCOL_TERTIARY);
+  }
 
-  // Makes the key of a text; why there is none where its bytes are at fault.
-  std::optional<TextFault> makeKey(std::string_view bytes);
-  // The last key, valid until the next call.
-  std::string_view key() const { return {key_.data(), length_}; }
+  // Valid until the next call. Throws TextFault. The library's comparison makes nulls of trailing
+  // blanks; the collator ignores nulls, so that cutting them off is the same.
+  std::string_view keyOf(std::string_view bytes) {
+    std::u16string_view text = decoder_.decode(bytes);
+    if (ignoreTrailing_) {
+      text = withoutBlanks(withoutNulls(text));
+    }
+    for (;;) {
+      const int32_t length = ucol_getSortKey(
+          collator_.getAlias(), text.data(), static_cast<int32_t>(text.size()),
+          reinterpret_cast<uint8_t *>(key_.data()), static_cast<int32_t>(key_.size()));
+      if (length <= 0) { // also the key of an empty text has a byte, its terminator
+        throw std::bad_alloc();
+      }
+      const auto needed = static_cast<std::size_t>(length);
+      if (needed <= key_.size()) {
+        return {key_.data(), needed};
+      }
+      key_.resize(needed);
+    }
+  }
 
 private:
   Decoder decoder_;
   const bool ignoreTrailing_;
   icu::LocalUCollatorPointer collator_;
-  std::string key_;
-  std::size_t length_ = 0;
+  std::string key_ = std::string(256, '\0');
 };
 
 } // namespace nls2::tool
