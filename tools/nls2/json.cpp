@@ -53,19 +53,25 @@ Json &Json::set(const char *key, Json value) {
   return *this;
 }
 
+// The dump does not pass on every failure of its callback, so that is kept here.
 std::string Json::text() const {
-  const auto append = [](const char *bytes, std::size_t length, void *text) noexcept {
+  struct Output {
+    std::string text;
+    bool isWhole = true;
+  } output;
+  const auto append = [](const char *bytes, std::size_t length, void *to) noexcept {
+    auto &out = *static_cast<Output *>(to);
     try {
-      static_cast<std::string *>(text)->append(bytes, length);
-      return 0;
+      out.text.append(bytes, length);
     } catch (const std::bad_alloc &) {
-      return -1;
+      out.isWhole = false;
     }
+    return out.isWhole ? 0 : -1;
   };
-  std::string text;
-  require(json_dump_callback(value_.get(), append, &text,
-                             JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9)) == 0);
-  return text + "\n";
+  const int result = json_dump_callback(value_.get(), append, &output,
+                                        JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9));
+  require(result == 0 && output.isWhole);
+  return output.text + "\n";
 }
 
 } // namespace nls2::tool

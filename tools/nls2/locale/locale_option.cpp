@@ -107,21 +107,6 @@ std::string localeOfLanguage(const std::string &name) {
   return best;
 }
 
-// " (did you mean ...?)": the language's locale first, then names of similar spelling.
-std::string suggestions(const std::string &name) {
-  std::set<std::string> known;
-  for (const LocaleMapEntry &entry : locale_records()) {
-    known.insert({entry.localeName, entry.shortName});
-  }
-  std::vector<std::string> names =
-      nearNames(withoutSuffixes(name), std::vector(known.begin(), known.end()));
-  if (const std::string ofLanguage = localeOfLanguage(name); !ofLanguage.empty()) {
-    std::erase(names, ofLanguage);
-    names.insert(names.begin(), ofLanguage);
-  }
-  return didYouMean(names);
-}
-
 std::string parseLocale(const std::string &text) {
   const std::optional<uint32_t> id = wholeNumber(text);
   const LocaleMapEntry *entry = id ? find_record(language_id(*id)) : nullptr;
@@ -129,7 +114,7 @@ std::string parseLocale(const std::string &text) {
   if (known.empty()) {
     throw usageError("--locale: \"{}\" is not a known locale{}; `nls2 locales` lists names and "
                      "language ids",
-                     printable(text), suggestions(text));
+                     printable(text), localesNear(text));
   }
   return known;
 }
@@ -146,6 +131,21 @@ std::pair<const char *, std::string> environmentLocale() {
 }
 
 } // namespace
+
+// The language's locale first, then names of similar spelling.
+std::string localesNear(const std::string &name) {
+  std::set<std::string> known;
+  for (const LocaleMapEntry &entry : locale_records()) {
+    known.insert({entry.localeName, entry.shortName});
+  }
+  std::vector<std::string> names =
+      nearNames(withoutSuffixes(name), std::vector(known.begin(), known.end()));
+  if (const std::string ofLanguage = localeOfLanguage(name); !ofLanguage.empty()) {
+    std::erase(names, ofLanguage);
+    names.insert(names.begin(), ofLanguage);
+  }
+  return didYouMean(names);
+}
 
 std::vector<Option> localeOptions(LocaleOptions &options, const std::vector<Option> &own) {
   std::vector<Option> all = {
@@ -174,7 +174,7 @@ std::string orderLocale(const LocaleOptions &options) {
   }
   if (locale.empty()) {
     throw usageError("{}: \"{}\" is not a known locale{}; give --locale", variable, printable(name),
-                     suggestions(name));
+                     localesNear(name));
   }
   return locale;
 }

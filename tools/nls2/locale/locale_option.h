@@ -16,6 +16,9 @@ struct LocaleOptions {
   int32_t codepage = utf8Page;
 };
 
+// " (did you mean de_DE?)" for a name that is not in the table.
+std::string localesNear(const std::string &name);
+
 // The two options, and after them a command's own.
 std::vector<Option> localeOptions(LocaleOptions &options, const std::vector<Option> &own);
 
