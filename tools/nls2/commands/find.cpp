@@ -3,7 +3,8 @@
 #include "commands.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
-#include "text/line_reader.h"
+#include "memory.h"
+#include "text/lines.h"
 
 #include <memory>
 
@@ -43,9 +44,6 @@ bool hasAll(const Decoder &decoder, const icu::UnicodeString &text) {
   UErrorCode error = U_ZERO_ERROR;
   const icu::UnicodeString back(bytes.data(), static_cast<int32_t>(bytes.size()),
                                 decoder.page().converter(), error);
-  if (error == U_MEMORY_ALLOCATION_ERROR) {
-    throw std::bad_alloc();
-  }
   return U_SUCCESS(error) && back == text;
 }
 
@@ -67,7 +65,7 @@ void requireCharacters(const Decoder &decoder, const icu::UnicodeString &pattern
 
 std::u16string decodedPattern(const std::string &pattern) {
   try {
-    return std::u16string(Decoder(utf8Page, "PATTERN").decode(pattern));
+    return std::u16string(Decoder(utf8Page).decode(pattern));
   } catch (const TextFault &fault) {
     throw usageError("PATTERN{}", fault.what());
   }
@@ -78,7 +76,7 @@ class TextSearch {
 public:
   // Throws usageError where the code page lacks a character of the pattern.
   explicit TextSearch(const Arguments &arguments)
-      : decoder_(arguments.locale.codepage, "--codepage"), ignoreCase_(arguments.ignoreCase),
+      : decoder_(arguments.locale.codepage), ignoreCase_(arguments.ignoreCase),
         pattern_(decodedPattern(arguments.pattern)) {
     requireCharacters(decoder_, {pattern_.data(), static_cast<int32_t>(pattern_.size())});
     if (ignoreCase_) {
@@ -103,8 +101,8 @@ public:
 
   // UTF-8 as the lines' code page has it.
   std::string encode(const std::string &utf8) const {
-    return utf8.empty() || decoder_.isUtf8() ? utf8
-                                             : decoder_.encode(icu::UnicodeString::fromUTF8(utf8));
+    const bool isSame = utf8.empty() || decoder_.isUtf8();
+    return isSame ? utf8 : decoder_.encode(icu::UnicodeString::fromUTF8(utf8));
   }
 
 private:
@@ -113,19 +111,18 @@ private:
     if (folding_ == U_FOLD_CASE_DEFAULT && foldAscii(text, folded_.data())) {
       return {folded_.data(), text.size()};
     }
-    for (;;) {
-      UErrorCode error = U_ZERO_ERROR;
-      const auto length = static_cast<std::size_t>(
-          u_strFoldCase(folded_.data(), static_cast<int32_t>(folded_.size()), text.data(),
-                        static_cast<int32_t>(text.size()), folding_, &error));
-      if (U_SUCCESS(error)) {
-        return {folded_.data(), length};
-      }
-      if (error != U_BUFFER_OVERFLOW_ERROR) {
-        throw std::bad_alloc();
-      }
+    UErrorCode error = U_ZERO_ERROR;
+    const auto length = static_cast<std::size_t>(
+        u_strFoldCase(folded_.data(), static_cast<int32_t>(folded_.size()), text.data(),
+                      static_cast<int32_t>(text.size()), folding_, &error));
+    if (error == U_BUFFER_OVERFLOW_ERROR) {
       folded_.resize(length + 1);
+      return folded(text);
     }
+    if (U_FAILURE(error)) {
+      throw std::bad_alloc();
+    }
+    return {folded_.data(), length};
   }
 
   Decoder decoder_;
@@ -153,16 +150,15 @@ public:
 private:
   // A file that fails does not keep the others from being searched. Output that fails ends the run.
   void searchFile(const std::string &path) {
-    std::string prefix;
-    if (arguments_.inputs.size() > 1) {
-      prefix = (path == "-" ? "standard input" : path) + ":";
-    }
+    const std::string name = (path == "-" ? "standard input" : path) + ":";
+    const std::string prefix = arguments_.inputs.size() > 1 ? name : "";
     std::optional<LineReader> reader;
     for (;;) {
       std::optional<std::string_view> line;
       try {
         line = nextMatch(reader ? *reader : reader.emplace(path, terminator_));
       } catch (const Error &error) {
+        requireMemory(); // without it the text may be valid
         output_.flush();
         complain(error.what());
         failed_ = true;

@@ -122,8 +122,7 @@ std::string parseLocale(const std::string &text) {
 // The variable that names the environment's locale, and the name.
 std::pair<const char *, std::string> environmentLocale() {
   for (const char *variable : {"LC_ALL", "LC_COLLATE", "LANG"}) {
-    const char *value = std::getenv(variable);
-    if (value != nullptr && *value != '\0') {
+    if (const char *value = std::getenv(variable); value != nullptr && *value != '\0') {
       return {variable, value};
     }
   }
