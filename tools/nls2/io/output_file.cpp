@@ -3,8 +3,8 @@
 #include "io/output_file.h"
 
 #include "errors.h"
-#include "memory.h"
 #include "io/file_attributes.h"
+#include "memory.h"
 
 #include <algorithm>
 #include <cerrno>
