@@ -9,6 +9,7 @@
 #include <limits>
 #include <optional>
 #include <string>
+#include <type_traits>
 #include <vector>
 
 namespace nls2::tool {
@@ -61,13 +62,24 @@ enum class Request { work, help, version };
 Request parse(const Command &command, int argc, char **argv);
 
 std::string helpOf(const CommandEntry &entry, const Command &command);
+std::string helpLine(const std::string &what, const char *help);
 
 // Values. `option` is what messages name.
 int32_t parseNumber(const char *option, const std::string &text, int32_t least, int32_t most);
 std::optional<uint32_t> wholeNumber(const std::string &text); // decimal or 0x...; never octal
 
-Take into(std::string &value);
-Take into(std::vector<std::string> &values);
-Take into(bool &flag);
+// Keeps the value as a text or an optional one, appends it to a list, or sets a flag.
+template <class Value>
+Take into(Value &value) {
+  return [&value](const std::string &text) {
+    if constexpr (std::is_same_v<Value, bool>) {
+      value = true;
+    } else if constexpr (std::is_same_v<Value, std::vector<std::string>>) {
+      value.push_back(text);
+    } else {
+      value = text;
+    }
+  };
+}
 
 } // namespace nls2::tool
