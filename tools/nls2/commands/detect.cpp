@@ -38,7 +38,7 @@ std::string beginningOf(const std::string &path) {
   std::array<char, longestSignature> buffer;
   std::size_t length = 0;
   std::size_t got = 0;
-  while ((got = file.read(buffer.data() + length, buffer.size() - length, -1)) > 0) {
+  while ((got = file.read(buffer.data() + length, buffer.size() - length)) > 0) {
     length += got;
   }
   return {buffer.data(), length};

@@ -32,7 +32,7 @@ int dump(const Arguments &arguments) {
   OutputFile out("-");
   std::string bytes(chunkBytes, '\0');
   std::size_t left = arguments.recordLength; // of the record
-  for (std::size_t got = 0; (got = in.read(bytes.data(), bytes.size(), -1)) > 0;) {
+  for (std::size_t got = 0; (got = in.read(bytes.data(), bytes.size())) > 0;) {
     std::string text;
     for (std::string_view rest(bytes.data(), got); !rest.empty();) {
       const std::size_t length = left != 0 ? std::min(left, rest.size()) : rest.size();

@@ -2,7 +2,7 @@
 #pragma once
 
 #include <string>
-#include <sys/types.h>
+#include <sys/stat.h>
 
 namespace nls2::tool {
 
@@ -17,6 +17,9 @@ public:
   TemporaryFile &operator=(const TemporaryFile &) = delete;
 
   int fd() const { return fd_; }
+  // Gives it owner, mode, access list and extended attributes of the target, as far as that is
+  // allowed. It is never open to more users than the target. Throws Error.
+  void copyAttributes(const struct stat &target);
   // Closes it and gives it the name, in place of the file that has it now; `sync` also waits for
   // the disk. Throws Error.
   void publish(bool sync);
@@ -24,10 +27,9 @@ public:
 private:
   friend void removeTemporaryFiles();
 
-  void openNamed(mode_t mode);
-  void giveTemporaryName();
-  void enlist();
-  void leaveList();
+  template <typename Make>
+  void takeFreeName(Make make);
+  void giveUpName();
   [[noreturn]] void fail() const;
 
   const std::string target_;

@@ -65,7 +65,7 @@ void LineReader::fill() {
   start_ = 0;
   const std::size_t have = buffer_.size();
   buffer_.resize(have + chunkLength);
-  const std::size_t got = input_.read(buffer_.data() + have, chunkLength, -1);
+  const std::size_t got = input_.read(buffer_.data() + have, chunkLength);
   buffer_.resize(have + got);
   ended_ = got == 0;
 }
