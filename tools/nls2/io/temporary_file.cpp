@@ -26,27 +26,10 @@ constexpr std::array endingSignals{SIGHUP,    SIGINT,  SIGQUIT, SIGTERM,  SIGALR
                                    SIGUSR1,   SIGUSR2, SIGXCPU, SIGPIPE,  SIGPOLL,
                                    SIGVTALRM, SIGPROF, SIGPWR,  SIGSTKFLT};
 
-// The files that a signal handler has to remove. The list changes only while the signals are held
-// back, and while no other thread of the process could get them in this one's place.
-TemporaryFile *volatile firstNamed = nullptr;
-
-} // namespace
-
-void removeTemporaryFiles() {
-  for (TemporaryFile *file = firstNamed; file != nullptr; file = file->next_) {
-    if (file->toRemove_ != nullptr) {
-      unlink(file->toRemove_);
-    }
-  }
-}
-
-namespace {
-
-extern "C" void removeAndDie(int signal) {
-  removeTemporaryFiles();
-  std::signal(signal, SIG_DFL);
-  raise(signal); // delivered on return from the handler
-}
+// The names that a signal handler has to remove, with room for more than a command ever has. They
+// change only while the signals are held back, and while no other thread of the process could get
+// them in this one's place.
+std::array<const char *volatile, 8> namesToRemove{};
 
 // Signals that the caller had ignored, as nohup does, stay ignored.
 void catchEndingSignals() {
@@ -54,7 +37,7 @@ void catchEndingSignals() {
     struct sigaction action = {};
     sigaction(signal, nullptr, &action);
     if (action.sa_handler == SIG_DFL) {
-      action.sa_handler = removeAndDie;
+      action.sa_handler = endBySignal;
       sigaction(signal, &action, nullptr);
     }
   }
@@ -64,10 +47,7 @@ class SignalsHeldBack {
 public:
   SignalsHeldBack() {
     sigset_t set;
-    sigemptyset(&set);
-    for (const int signal : endingSignals) {
-      sigaddset(&set, signal);
-    }
+    sigfillset(&set);
     pthread_sigmask(SIG_BLOCK, &set, &before_);
   }
   ~SignalsHeldBack() { pthread_sigmask(SIG_SETMASK, &before_, nullptr); }
@@ -101,7 +81,11 @@ std::string valueOf(const std::string &path, const char *name) {
 } // namespace
 
 void endBySignal(int signal) {
-  removeTemporaryFiles();
+  for (const char *name : namesToRemove) {
+    if (name != nullptr) {
+      unlink(name);
+    }
+  }
   std::signal(signal, SIG_DFL);
   sigset_t set;
   sigemptyset(&set);
@@ -159,18 +143,13 @@ void TemporaryFile::takeFreeName(Make make) {
     throw failure("cannot write {}: no new file in its directory: {}", shownName_,
                   std::strerror(errno));
   }
-  toRemove_ = name_.c_str();
-  next_ = firstNamed;
-  firstNamed = this;
+  *std::find(namesToRemove.begin(), namesToRemove.end(), nullptr) = name_.c_str();
 }
 
 void TemporaryFile::giveUpName() {
-  toRemove_ = nullptr;
-  TemporaryFile *volatile *place = &firstNamed;
-  while (*place != this) {
-    place = &(*place)->next_;
+  for (const char *volatile &name : namesToRemove) {
+    name = name == name_.c_str() ? nullptr : name;
   }
-  *place = next_;
   name_.clear();
 }
 

@@ -25,8 +25,6 @@ public:
   void publish(bool sync);
 
 private:
-  friend void removeTemporaryFiles();
-
   template <typename Make>
   void takeFreeName(Make make);
   void giveUpName();
@@ -34,13 +32,12 @@ private:
 
   const std::string target_;
   const std::string shownName_;
-  std::string name_;                        // the temporary name, while there is one
-  const char *volatile toRemove_ = nullptr; // the same, for a signal handler
-  TemporaryFile *volatile next_ = nullptr;  // in the list of those that have a name
+  std::string name_; // the temporary name, while there is one
   int fd_ = -1;
 };
 
-// Ends the process as this signal does when nobody handles it; temporary files are removed.
+// Ends the process as this signal does when nobody handles it; temporary files are removed. A signal
+// handler may call it.
 [[noreturn]] void endBySignal(int signal);
 
 } // namespace nls2::tool
