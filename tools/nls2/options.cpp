@@ -180,17 +180,6 @@ std::string helpOf(const CommandEntry &entry, const Command &command) {
   return text + command.notes + "See nls2(1).\n";
 }
 
-int32_t parseNumber(const char *option, const std::string &text, int32_t least, int32_t most) {
-  const char *end = text.data() + text.size();
-  int32_t number = 0;
-  const auto [stop, error] = std::from_chars(text.data(), end, number);
-  if (error != std::errc() || stop != end || number < least || number > most) {
-    throw usageError("{}: \"{}\" is not a number from {} to {}", option, printable(text), least,
-                     most);
-  }
-  return number;
-}
-
 std::optional<uint32_t> wholeNumber(const std::string &text) {
   const bool hexadecimal = text.starts_with("0x") || text.starts_with("0X");
   const char *start = text.data() + (hexadecimal ? 2 : 0);

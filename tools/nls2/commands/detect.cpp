@@ -37,7 +37,7 @@ std::string beginningOf(const std::string &path) {
   InputFile file(path);
   std::string bytes(longestSignature, '\0');
   std::size_t length = 0;
-  while (const std::size_t got = file.read(bytes.data() + length, bytes.size() - length, -1)) {
+  while (const std::size_t got = file.read(bytes.data() + length, bytes.size() - length)) {
     length += got;
   }
   bytes.resize(length);

@@ -146,7 +146,7 @@ int dumpFile(const Arguments &arguments) {
   OutputFile out("-");
   std::string bytes(std::size_t{64} * 1024, '\0');
   int32_t done = 0; // of the record
-  while (const std::size_t got = in.read(bytes.data(), bytes.size(), -1)) {
+  while (const std::size_t got = in.read(bytes.data(), bytes.size())) {
     for (std::size_t i = 0; i < got; ++i) {
       dump.add(bytes[i]);
       if (arguments.recordLength != 0 && ++done == arguments.recordLength) {
