@@ -50,7 +50,7 @@ AT(TRC1_UnitBlock, markLength, 80, 44);
 AT(TRC1_UnitBlock, reserved, 84, 48);
 AT(TRC1_UnitBlock, buildStamp, 96, 56);
 
-HOLDS(sizeof(TRC1_EntryBlock) == (sizeof(void *) == 8 ? 56 : 44));
+HOLDS(sizeof(TRC1_EntryBlock) == (sizeof(void *) == 8 ? 56 : 40));
 AT(TRC1_EntryBlock, unit, 0, 0);
 AT(TRC1_EntryBlock, functionName, 8, 4);
 AT(TRC1_EntryBlock, functionNameLength, 16, 8);
