@@ -1,19 +1,15 @@
-# The facts that NLS2_BuildStamp tells. string(TIMESTAMP) takes SOURCE_DATE_EPOCH where it is set, and
-# a reproducible build must not name its host either.
+# Writes the text that NLS2_BuildStamp returns, as a string literal. Run in the build, with -D for each
+# name used here. string(TIMESTAMP) takes SOURCE_DATE_EPOCH if it is set, and a reproducible build must
+# not name its host either.
 
-string(TOUPPER "${CMAKE_BUILD_TYPE}" _type)
-string(STRIP "${CMAKE_CXX_FLAGS} ${CMAKE_CXX_FLAGS_${_type}}" ZELNLS2_STAMP_OPTIONS)
-string(TIMESTAMP ZELNLS2_STAMP_DATE "%Y-%m-%dT%H:%M:%SZ" UTC)
-if(DEFINED ENV{SOURCE_DATE_EPOCH})
-  set(ZELNLS2_STAMP_HOST "")
-else()
-  cmake_host_system_information(RESULT ZELNLS2_STAMP_HOST QUERY HOSTNAME)
-  string(PREPEND ZELNLS2_STAMP_HOST " on ")
+file(READ ${OPTIONS_FILE} options)
+string(TIMESTAMP date "%Y-%m-%dT%H:%M:%SZ" UTC)
+set(host "")
+if(NOT DEFINED ENV{SOURCE_DATE_EPOCH})
+  cmake_host_system_information(RESULT host QUERY HOSTNAME)
+  string(PREPEND host " on ")
 endif()
-set(ZELNLS2_STAMP
-    "zelnls2 ${PROJECT_VERSION}, ${CMAKE_CXX_COMPILER_ID} ${CMAKE_CXX_COMPILER_VERSION}, options \
-${ZELNLS2_STAMP_OPTIONS}, built${ZELNLS2_STAMP_HOST} at ${ZELNLS2_STAMP_DATE}")
-string(REPLACE "\\" "\\\\" ZELNLS2_STAMP "${ZELNLS2_STAMP}")
-string(REPLACE "\"" "\\\"" ZELNLS2_STAMP "${ZELNLS2_STAMP}")
-configure_file(${CMAKE_CURRENT_LIST_DIR}/build_stamp.inc.in ${CMAKE_CURRENT_BINARY_DIR}/build_stamp.inc
-               @ONLY)
+set(stamp "zelnls2 ${VERSION}, ${COMPILER}, options ${options}, built${host} at ${date}")
+string(REPLACE "\\" "\\\\" stamp "${stamp}")
+string(REPLACE "\"" "\\\"" stamp "${stamp}")
+file(WRITE ${OUTPUT} "\"${stamp}\"\n")

@@ -9,41 +9,41 @@
 
 namespace {
 
-// The word's values. A holder that finds `Contended` at its release has somebody to wake; one that
-// finds `Held` saves the system call.
-enum LockState : uint32_t { Free = 0, Held = 1, Contended = 2 };
+// The word's values. A holder that finds `contended` at its release has somebody to wake; one that
+// finds `held` saves the system call.
+enum LockState : uint32_t { unlocked = 0, held = 1, contended = 2 };
 
 #if defined(SYS_futex)
-constexpr long FutexCall = SYS_futex;
+constexpr long futexCall = SYS_futex;
 #else
-constexpr long FutexCall = SYS_futex_time64;
+constexpr long futexCall = SYS_futex_time64;
 #endif
 
 void waitWhileContended(uint32_t *word) {
-  syscall(FutexCall, word, FUTEX_WAIT_PRIVATE, Contended, nullptr, nullptr, 0);
+  syscall(futexCall, word, FUTEX_WAIT_PRIVATE, contended, nullptr, nullptr, 0);
 }
 
 void wakeOne(uint32_t *word) {
-  syscall(FutexCall, word, FUTEX_WAKE_PRIVATE, 1, nullptr, nullptr, 0);
+  syscall(futexCall, word, FUTEX_WAKE_PRIVATE, 1, nullptr, nullptr, 0);
 }
 
 } // namespace
 
 extern "C" void SYS1_GetLock(void *lock) {
   auto *word = static_cast<uint32_t *>(lock);
-  uint32_t expected = Free;
-  if (__atomic_compare_exchange_n(word, &expected, Held, false, __ATOMIC_ACQUIRE,
+  uint32_t expected = unlocked;
+  if (__atomic_compare_exchange_n(word, &expected, held, false, __ATOMIC_ACQUIRE,
                                   __ATOMIC_RELAXED)) {
     return;
   }
-  while (__atomic_exchange_n(word, Contended, __ATOMIC_ACQUIRE) != Free) {
+  while (__atomic_exchange_n(word, contended, __ATOMIC_ACQUIRE) != unlocked) {
     waitWhileContended(word);
   }
 }
 
 extern "C" void SYS1_ReleaseLock(void *lock) {
   auto *word = static_cast<uint32_t *>(lock);
-  if (__atomic_exchange_n(word, Free, __ATOMIC_RELEASE) == Contended) {
+  if (__atomic_exchange_n(word, unlocked, __ATOMIC_RELEASE) == contended) {
     wakeOne(word);
   }
 }

@@ -71,7 +71,9 @@ const Settings &settings() {
 }
 
 // One line: the constructor opens it with what all lines share, the destructor ends it. Lines of
-// several threads do not mix, since the stream stays locked in between.
+// several threads do not mix, since the stream stays locked in between. Thread cancellation is held
+// back for as long: writing is a cancellation point, and a cancelled thread would leave the stream
+// locked for good.
 class Line {
 public:
   Line(const TRC1_EntryBlock *anchor, uint32_t line) : file_(settings().file) {
@@ -81,6 +83,7 @@ public:
     gmtime_r(&now.tv_sec, &day);
     char date[sizeof "2007-03-09T19:13:31"];
     std::strftime(date, sizeof date, "%Y-%m-%dT%H:%M:%S", &day);
+    pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelState_);
     flockfile(file_);
     std::fprintf(file_, "%s.%06ldZ %ld %.*s:%" PRIu32 " ", date, now.tv_nsec / 1000,
                  syscall(SYS_gettid), static_cast<int>(anchor->functionNameLength),
@@ -90,6 +93,7 @@ public:
     std::fputc('\n', file_);
     std::fflush(file_);
     funlockfile(file_);
+    pthread_setcancelstate(cancelState_, nullptr);
   }
   Line(const Line &) = delete;
   Line &operator=(const Line &) = delete;
@@ -98,6 +102,7 @@ public:
 
 private:
   FILE *file_;
+  int cancelState_ = 0;
 };
 
 // A detail line's text without its newline; a newline inside would break the line in two.

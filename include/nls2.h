@@ -33,6 +33,11 @@
 
 #include <unicode/utypes.h>
 
+#define NLS2_VERSION_MAJOR 0
+#define NLS2_VERSION_MINOR 1
+#define NLS2_VERSION_PATCH 0
+#define NLS2_VERSION_STRING "0.1.0"
+
 #ifdef __cplusplus
 extern "C" {
 #endif

@@ -4,5 +4,6 @@
 
 #include "nls2/code_page.hpp"
 #include "nls2/error.hpp"
+#include "nls2/field_translator.hpp"
 
 #endif

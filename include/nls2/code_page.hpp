@@ -10,8 +10,8 @@
 
 namespace nls2 {
 
-// A code page by its number: a CCSID, or one of the private numbers from 57352 up. Any number may be
-// held; whether it opens is seen when a converter is made.
+// A code page by its number: a CCSID, or one of the private numbers from 57352 up. Any number may
+// be held; whether it opens is seen when a converter is made.
 class code_page {
 public:
   constexpr explicit code_page(std::int32_t number) noexcept : number_(number) {}

@@ -2,6 +2,7 @@
 
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 #include <unicode/localpointer.h>
@@ -9,6 +10,7 @@
 
 namespace {
 
+using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
@@ -21,7 +23,7 @@ UErrorCode traceCcsid(Trace trace, const UConverter *converter) {
   UErrorCode error = U_ZERO_ERROR;
   const int32_t ccsid = ucnv_getCCSID(converter, &error);
   NLS2_TRACE(trace, "CCSID for this converter is %d", ccsid);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(trace, "Error retrieving CCSID for converter %X.", nls2::trace::low32(converter));
   }
   return error;
@@ -36,21 +38,21 @@ int32_t NLS2_GetCodepageName(int32_t codepageId, char *nameBuffer, uint32_t /*bu
   int32_t twoNull = 0;
   int32_t status = U_ZERO_ERROR;
   icu::LocalUConverterPointer converter(NLS2_MapCodepageIdToName(codepageId, &twoNull, &status));
-  if (status > U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "ICU converter for codepage not found.%d", status);
     return frame.result(status);
   }
   if (frame.detail()) {
     const UErrorCode error = traceCcsid(frame, converter.getAlias());
-    if (error > U_ZERO_ERROR) {
+    if (failed(error)) {
       return frame.result(int32_t{error});
     }
   }
   UErrorCode error = U_ZERO_ERROR;
   const char *name = ucnv_getName(converter.getAlias(), &error);
-  if (error > U_ZERO_ERROR || name == nullptr) {
+  if (failed(error) || name == nullptr) {
     NLS2_TRACE(frame, "Converter codepage name not found.");
-    return frame.result(int32_t{error > U_ZERO_ERROR ? error : U_MISSING_RESOURCE_ERROR});
+    return frame.result(int32_t{failed(error) ? error : U_MISSING_RESOURCE_ERROR});
   }
   // Most names live in ICU's shared data, but that of 57365 lives in the converter and goes with
   // it.
@@ -76,7 +78,7 @@ uint32_t NLS2_GetCodepageId(const char *codepageName, int32_t *status) {
   NLS2_TRACE(frame, "Opening ICU converter for codepage name %s.", shownName);
   UErrorCode error = U_ZERO_ERROR;
   icu::LocalUConverterPointer converter(ucnv_open(codepageName, &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Could not open ICU converter based on codepage name.");
     *status = error;
     return frame.result(0U);
@@ -85,7 +87,7 @@ uint32_t NLS2_GetCodepageId(const char *codepageName, int32_t *status) {
   NLS2_TRACE(frame, "Retrieve the CCSID for this converter.");
   error = U_ZERO_ERROR;
   auto codepage = static_cast<uint32_t>(ucnv_getCCSID(converter.getAlias(), &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "CCSID number not found for Codepage name.");
     *status = error;
     return frame.result(0U);
@@ -94,7 +96,7 @@ uint32_t NLS2_GetCodepageId(const char *codepageName, int32_t *status) {
     NLS2_TRACE(frame, "ICU cannot find a CCSID for this codepage named %s", shownName);
     int32_t searchStatus = U_ZERO_ERROR;
     codepage = NLS2_MapWindowsNameToCCSID(shownName, &searchStatus);
-    if (searchStatus != U_ZERO_ERROR) {
+    if (failed(searchStatus)) {
       NLS2_TRACE(frame, "Codepage name is not CCSID nor Windows.");
       *status = NLS2_ERR_INVALID_PARAMETER;
       leaveOpen(converter);

@@ -6,6 +6,7 @@
 #include "locale/registry.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
@@ -14,6 +15,7 @@
 namespace {
 
 using icu::LocalUConverterPointer;
+using nls2::failed;
 using nls2::codepage::openMapped;
 using nls2::trace::Frame;
 using nls2::trace::low32;
@@ -43,8 +45,8 @@ int32_t NLS2_ConversionRatio(const NLS2_Locale *pDestinationLocale,
   *pStatus = U_ZERO_ERROR;
   NLS2_TRACE(frame, "Input parameters: pDestinationLocale %X, pSourceLocale %X.",
              low32(pDestinationLocale), low32(pSourceLocale));
-  if (NLS2_ValidateLocale(pDestinationLocale) != U_ZERO_ERROR ||
-      NLS2_ValidateLocale(pSourceLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pDestinationLocale)) ||
+      failed(nls2::locale::validateLocale(pSourceLocale))) {
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);
   }
@@ -54,13 +56,13 @@ int32_t NLS2_ConversionRatio(const NLS2_Locale *pDestinationLocale,
   }
   int32_t status = U_ZERO_ERROR;
   LocalUConverterPointer destination(openMapped(pDestinationLocale, &status));
-  if (status > U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "Could not map destination codepage id to name. %d", status);
     *pStatus = status;
     return frame.result(1);
   }
   const LocalUConverterPointer source(openMapped(pSourceLocale, &status));
-  if (status > U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "Could not map source codepage id to name. %d", status);
     *pStatus = status;
     return frame.result(1);
@@ -75,7 +77,7 @@ int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t /*i
                     int32_t *pStatus) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_Strlen");
   Frame frame(anchor);
-  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);
   }
@@ -83,14 +85,14 @@ int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t /*i
   nls2::codepage::Utf16Text text; // given back after the converter
   UErrorCode error = U_ZERO_ERROR;
   const LocalUConverterPointer converter(nls2::codepage::openAsCcsid(pLocale, &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Error opening converter for codepage %d.", pLocale->codepage);
     *pStatus = error;
     return frame.result(0);
   }
   NLS2_TRACE(frame, "Pre-flight to determine size of output buffer.");
   error = nls2::codepage::measure(text, converter.getAlias(), pString, -1);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Error pre-flighting to UChars %d.", error);
     *pStatus = error;
     return frame.result(0);
@@ -101,7 +103,7 @@ int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t /*i
     return frame.result(0);
   }
   error = nls2::codepage::convert(text, converter.getAlias(), pString, -1);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Error converting string to UChar %d", error);
     *pStatus = error;
     return frame.result(0);
@@ -115,7 +117,7 @@ int32_t NLS2_ByteLength(const NLS2_Locale *pLocale, const char *pCharacter, int3
   *pStatus = U_ZERO_ERROR;
   NLS2_TRACE(frame, "Input parameters: pLocale %X, pCharacter %X.", low32(pLocale),
              low32(pCharacter));
-  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     NLS2_TRACE(frame, "Invalid locale.");
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);

@@ -4,6 +4,7 @@
 
 #include "codepage/utf16_text.h"
 #include "trace/memory.h"
+#include "trace/status.h"
 
 #include <algorithm>
 #include <cstring>
@@ -22,9 +23,8 @@ struct Field {
   int32_t sourceLength = 0;        // units of the whole source
   int32_t textLength = 0;          // units up to the first null, trailing blanks cut off
   int32_t trailingBlanks = 0;
+  int32_t room = 0; // bytes of the destination beside the terminator
 };
-
-bool failed(UErrorCode status) { return status > U_ZERO_ERROR; }
 
 bool isFailedPreflight(UErrorCode status) {
   return failed(status) && status != U_BUFFER_OVERFLOW_ERROR;
@@ -44,7 +44,8 @@ bool measureSource(const PaddedTranslation &call, Field &field) {
   return true;
 }
 
-// Room for the source and for a destination of one unit a byte, and a zero unit behind either.
+// As many units as the source has, or as the destination has bytes if that is more, and a zero
+// unit.
 bool allocateUnits(const PaddedTranslation &call, Field &field) {
   NLS2_TRACE(call.trace, "Allocate memory to hold entire utf16 string.");
   const auto units = static_cast<uint64_t>(std::max(call.buffers.destLen, field.sourceLength)) + 1;
@@ -69,8 +70,8 @@ bool convertSource(const PaddedTranslation &call, Field &field) {
   return true;
 }
 
-// Clears the blanks and nulls at the end; nulls among them are not counted as blanks. A null that
-// is left cuts the text where it stands.
+// Clears the blanks and nulls at the end; nulls among them are not counted as blanks. The
+// first null that is left ends the text.
 void trim(const PaddedTranslation &call, Field &field) {
   UChar *units = field.units.get();
   codepage::clearTrailing(units, field.sourceLength, [&field](UChar32 character) {
@@ -83,8 +84,8 @@ void trim(const PaddedTranslation &call, Field &field) {
   NLS2_TRACE(call.trace, "Resulting non-space filled string length is %d.", field.textLength);
 }
 
-// Sets destLen to what is left beside the terminator; the text must fit in it whatever the options.
-bool fitText(PaddedTranslation &call, const Field &field) {
+// The text must fit beside the terminator whatever the options.
+bool fitText(const PaddedTranslation &call, Field &field) {
   UErrorCode status = U_ZERO_ERROR;
   const int32_t needed = ucnv_fromUChars(call.destConverter.getAlias(), nullptr, 0,
                                          field.units.get(), field.textLength, &status);
@@ -92,21 +93,20 @@ bool fitText(PaddedTranslation &call, const Field &field) {
     NLS2_TRACE(call.trace, "Error pre-flighting temp buffer to destination cp %d.", status);
     return call.fail(status);
   }
-  if (call.has(NLS2_STRING_TERMINATE)) {
-    call.buffers.destLen -= call.terminatorLength();
-  }
-  if (needed > call.buffers.destLen) {
+  field.room =
+      call.buffers.destLen - (call.has(NLS2_STRING_TERMINATE) ? call.terminatorLength() : 0);
+  if (needed > field.room) {
     NLS2_TRACE(call.trace, "Destination buffer must be at least %d bytes in length.", needed);
     return call.fail(U_BUFFER_OVERFLOW_ERROR);
   }
   return true;
 }
 
-// Writes the first `length` units into the destination; the result is the bytes that they take.
+// Writes the first `length` units into the destination. Returns the bytes that they take.
 int32_t writeUnits(const PaddedTranslation &call, const Field &field, int32_t length,
                    UErrorCode &status) {
   status = U_ZERO_ERROR;
-  return ucnv_fromUChars(call.destConverter.getAlias(), call.buffers.dest, call.buffers.destLen,
+  return ucnv_fromUChars(call.destConverter.getAlias(), call.buffers.dest, field.room,
                          field.units.get(), length, &status);
 }
 
@@ -124,55 +124,57 @@ int32_t writeStripped(PaddedTranslation &call, Field &field) {
   release(call, field);
   if (failed(status)) {
     NLS2_TRACE(call.trace, "Error converting to destination %d.", status);
-    return call.fail(status);
+    call.fail(status);
+    return 0;
   }
   return field.textLength + (call.has(NLS2_STRING_TERMINATE) ? call.terminatorLength() : 0);
 }
 
-// This path has always left its buffer and both converters behind, and callers' leak accounting
-// knows it: TERMINATE beside bits that mean nothing is a mistake to mend in the caller.
+// This path has always leaked its buffer and both converters, and callers' leak accounting expects
+// it. TERMINATE with meaningless bits is a bug of the caller's.
 int32_t refuseOptionAndLeak(PaddedTranslation &call, Field &field) {
   NLS2_TRACE(call.trace, "Invalid option specified.");
   static_cast<void>(field.units.release());
   call.sourceConverter.orphan();
   call.destConverter.orphan();
-  return call.fail(NLS2_ERR_INVALID_OPTION);
+  call.fail(NLS2_ERR_INVALID_OPTION);
+  return 0;
 }
 
-// How many units the padded field has. It is set against destLen, a count of bytes: exact for a
+// How many units the padded field has. It is compared with the room, a count of bytes: exact for a
 // page in which every unit of the field takes one byte.
 int32_t paddedLength(const PaddedTranslation &call, const Field &field) {
   NLS2_TRACE(call.trace, "Option is string file and or strip trailing.");
-  int32_t maximumBufferLength = 0;
+  int32_t paddedUnits = 0;
   if (call.has(NLS2_STRING_TRAILING)) {
     NLS2_TRACE(call.trace, "NLS2_STRING_TRAILING set.");
-    maximumBufferLength = std::min(field.textLength + field.trailingBlanks, call.buffers.destLen);
-    NLS2_TRACE(call.trace, "maximumBufferLength is adjusted to %d.", maximumBufferLength);
+    paddedUnits = std::min(field.textLength + field.trailingBlanks, field.room);
+    NLS2_TRACE(call.trace, "maximumBufferLength is adjusted to %d.", paddedUnits);
   }
   if (call.has(NLS2_STRING_FILL)) {
     NLS2_TRACE(call.trace, "NLS2_STRING_FILL set.");
-    maximumBufferLength = call.buffers.destLen;
-    NLS2_TRACE(call.trace, "maximumBufferLength is adjusted to %d.", maximumBufferLength);
+    paddedUnits = field.room;
+    NLS2_TRACE(call.trace, "maximumBufferLength is adjusted to %d.", paddedUnits);
   }
-  return maximumBufferLength;
+  return paddedUnits;
 }
 
-void appendBlanks(Field &field, int32_t maximumBufferLength) {
-  for (int32_t i = field.textLength; i < maximumBufferLength; ++i) {
+void appendBlanks(Field &field, int32_t paddedUnits) {
+  for (int32_t i = field.textLength; i < paddedUnits; ++i) {
     field.units[static_cast<std::size_t>(i)] = fillCharacter;
   }
 }
 
-// Where text of several bytes a unit leaves too little room for all blanks, one more attempt drops
-// as many units as there are bytes too many: exact while a blank is one byte.
-bool writePadded(const PaddedTranslation &call, const Field &field, int32_t maximumBufferLength) {
+// Text of several bytes a unit can leave too little room for all blanks. Then retry once with one
+// unit fewer for each byte too many: exact while a blank is one byte.
+bool writePadded(const PaddedTranslation &call, const Field &field, int32_t paddedUnits) {
   UErrorCode status = U_ZERO_ERROR;
-  const int32_t written = writeUnits(call, field, maximumBufferLength, status);
+  const int32_t written = writeUnits(call, field, paddedUnits, status);
   if (status == U_BUFFER_OVERFLOW_ERROR) {
     NLS2_TRACE(call.trace, "Overflowed buffer because of blanks, possible problem.");
-    const int32_t excess = written - call.buffers.destLen;
+    const int32_t excess = written - field.room;
     NLS2_TRACE(call.trace, "Reduce amount to convert by %d.characters to fit", excess);
-    writeUnits(call, field, maximumBufferLength - excess, status);
+    writeUnits(call, field, paddedUnits - excess, status);
   }
   if (failed(status)) {
     NLS2_TRACE(call.trace, "Error converting from UChars to destination codepage %d.", status);
@@ -181,8 +183,8 @@ bool writePadded(const PaddedTranslation &call, const Field &field, int32_t maxi
   return true;
 }
 
-int32_t storeTerminator(const PaddedTranslation &call) {
-  int32_t amountWritten = call.buffers.destLen;
+int32_t storeTerminator(const PaddedTranslation &call, const Field &field) {
+  int32_t amountWritten = field.room;
   if (call.has(NLS2_STRING_TERMINATE)) {
     for (int32_t i = 0; i < call.terminatorLength(); ++i) {
       call.buffers.dest[amountWritten++] = 0;
@@ -192,20 +194,19 @@ int32_t storeTerminator(const PaddedTranslation &call) {
 }
 
 int32_t writeField(PaddedTranslation &call, Field &field) {
-  const int32_t maximumBufferLength = paddedLength(call, field);
-  appendBlanks(field, maximumBufferLength);
-  if (!writePadded(call, field, maximumBufferLength)) {
+  const int32_t paddedUnits = paddedLength(call, field);
+  appendBlanks(field, paddedUnits);
+  if (!writePadded(call, field, paddedUnits)) {
     return 0;
   }
   release(call, field);
-  return storeTerminator(call);
+  return storeTerminator(call, field);
 }
 
 } // namespace
 
 int32_t translateWithPadding(PaddedTranslation &call) {
   NLS2_TRACE(call.trace, "Converting with options %X.", call.options);
-  const int32_t bufferLength = call.buffers.destLen;
   Field field;
   if (!measureSource(call, field) || !allocateUnits(call, field) || !convertSource(call, field)) {
     return 0;
@@ -222,12 +223,13 @@ int32_t translateWithPadding(PaddedTranslation &call) {
   } else {
     amountWritten = refuseOptionAndLeak(call, field);
   }
-  if (*call.pStatus != U_ZERO_ERROR) {
+  if (failed(*call.pStatus)) {
     return 0;
   }
-  NLS2_TRACE(call.trace, "Output parameters. destLen %d,amountWritten %d", call.buffers.destLen,
+  NLS2_TRACE(call.trace, "Output parameters. destLen %d,amountWritten %d", field.room,
              amountWritten);
-  call.trace.dump(call.buffers.dest, static_cast<uint32_t>(std::min(amountWritten, bufferLength)));
+  call.trace.dump(call.buffers.dest,
+                  static_cast<uint32_t>(std::min(amountWritten, call.buffers.destLen)));
   return amountWritten;
 }
 

@@ -9,7 +9,7 @@
 
 namespace nls2::convert {
 
-// Lengths in bytes; a negative sourceLen stands for a null-terminated source.
+// Lengths in bytes; a negative sourceLen means a null-terminated source.
 struct Buffers {
   char *dest;
   int32_t destLen;
@@ -29,9 +29,10 @@ struct PaddedTranslation {
 
   bool has(uint32_t option) const { return (options & option) != 0; }
   int32_t terminatorLength() const { return twoNullTerminator ? 2 : 1; }
-  int32_t fail(int32_t status) const {
+  // False, for a step to return.
+  bool fail(int32_t status) const {
     *pStatus = status;
-    return 0;
+    return false;
   }
   void closeConverters() {
     sourceConverter.adoptInstead(nullptr);
@@ -40,7 +41,7 @@ struct PaddedTranslation {
 };
 
 // Converts the source through a UTF-16 work buffer, in which its trailing blanks are cut off and
-// the blanks asked for are put on. The result is the function's.
+// the requested blanks are appended. Returns NLS2_TranslateString's result.
 int32_t translateWithPadding(PaddedTranslation &call);
 
 } // namespace nls2::convert

@@ -2,9 +2,11 @@
 // NLS2_UnicodeToString.
 
 #include "codepage/locale_converter.h"
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <algorithm>
 #include <cstdint>
@@ -14,6 +16,7 @@
 namespace {
 
 using icu::LocalUConverterPointer;
+using nls2::failed;
 using nls2::trace::BoundedText;
 using nls2::trace::Frame;
 using nls2::trace::low32;
@@ -50,20 +53,20 @@ int32_t NLS2_StringToUnicode(const NLS2_Locale *pLocale, char *dest, int32_t dle
              low32(pLocale), BoundedText(dest, std::max(dlen, 0)).c_str(), dlen,
              BoundedText(src, slen).c_str(), slen);
   *status = U_ZERO_ERROR;
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     *status = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);
   }
   UErrorCode error = U_ZERO_ERROR;
   const LocalUConverterPointer codepage(nls2::codepage::openAsCcsid(pLocale, &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Error opening source code converter. %d", error);
     *status = error;
     return frame.result(0);
   }
   error = U_ZERO_ERROR;
   const LocalUConverterPointer unicode(ucnv_open(utf8, &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Error opening UTF-8 Converter. %d", error);
     *status = error;
     return frame.result(0);
@@ -71,7 +74,7 @@ int32_t NLS2_StringToUnicode(const NLS2_Locale *pLocale, char *dest, int32_t dle
   error = U_ZERO_ERROR;
   const int32_t distance =
       convertInPlace(unicode.getAlias(), codepage.getAlias(), dest, dlen, src, slen, error);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Could not map source codepage id to name. %d", error);
     *status = error;
     return frame.result(0);
@@ -87,19 +90,19 @@ int32_t NLS2_UnicodeToString(const NLS2_Locale *pLocale, char *dest, int32_t dle
              low32(pLocale), BoundedText(dest, std::max(dlen, 0)).c_str(), dlen,
              BoundedText(src, slen).c_str(), slen);
   *status = U_ZERO_ERROR;
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     *status = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);
   }
   UErrorCode error = U_ZERO_ERROR;
   const LocalUConverterPointer unicode(ucnv_open(utf8, &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     *status = error;
     return frame.result(0);
   }
   error = U_ZERO_ERROR;
   const LocalUConverterPointer codepage(nls2::codepage::openAsCcsid(pLocale, &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Could not open CCSID converter for codepage %d", pLocale->codepage);
     *status = error;
     return frame.result(0);
@@ -107,7 +110,7 @@ int32_t NLS2_UnicodeToString(const NLS2_Locale *pLocale, char *dest, int32_t dle
   error = U_ZERO_ERROR;
   const int32_t distance =
       convertInPlace(codepage.getAlias(), unicode.getAlias(), dest, dlen, src, slen, error);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Could not convert source to destination %d", error);
     *status = error;
     return frame.result(0);

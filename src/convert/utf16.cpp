@@ -4,6 +4,7 @@
 #include "locale/registry.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
@@ -11,18 +12,19 @@
 namespace {
 
 using icu::LocalUConverterPointer;
+using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
-enum class Direction { ToUtf16, FromUtf16 };
+enum class Direction { toUtf16, fromUtf16 };
 
 // `convert` does ICU's part with the open converter; its result is the length.
 template <Direction direction, class Convert>
 int32_t throughConverter(Trace trace, const NLS2_Locale *pLocale, int32_t *status,
                          Convert convert) {
-  constexpr bool toUtf16 = direction == Direction::ToUtf16;
+  constexpr bool toUtf16 = direction == Direction::toUtf16;
   *status = U_ZERO_ERROR;
-  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     if constexpr (toUtf16) {
       NLS2_TRACE(trace, "Invalid locale.");
     }
@@ -31,14 +33,14 @@ int32_t throughConverter(Trace trace, const NLS2_Locale *pLocale, int32_t *statu
   }
   int32_t openStatus = U_ZERO_ERROR;
   LocalUConverterPointer converter(nls2::codepage::openMapped(pLocale, &openStatus));
-  if (openStatus > U_ZERO_ERROR) {
+  if (failed(openStatus)) {
     NLS2_TRACE(trace, "Error %d acquiring converter.", openStatus);
     *status = openStatus;
     return 0;
   }
   UErrorCode error = U_ZERO_ERROR;
   const int32_t length = convert(converter.getAlias(), &error);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     if constexpr (toUtf16) {
       NLS2_TRACE(trace, "Error %d converting string from UTF16.", error);
     } else {
@@ -58,7 +60,7 @@ int32_t NLS2_toUTF16(const NLS2_Locale *pLocale, const char *pSource, int32_t so
                      UChar *pTarget, int32_t targetLength, int32_t *status) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_toUTF16");
   Frame frame(anchor);
-  return frame.result(throughConverter<Direction::ToUtf16>(
+  return frame.result(throughConverter<Direction::toUtf16>(
       frame, pLocale, status, [=](UConverter *converter, UErrorCode *error) {
         return ucnv_toUChars(converter, pTarget, targetLength, pSource, sourceLength, error);
       }));
@@ -68,7 +70,7 @@ int32_t NLS2_fromUTF16(const NLS2_Locale *pLocale, const UChar *pSource, int32_t
                        char *pTarget, int32_t sourceLength, int32_t *status) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_fromUTF16");
   Frame frame(anchor);
-  return frame.result(throughConverter<Direction::FromUtf16>(
+  return frame.result(throughConverter<Direction::fromUtf16>(
       frame, pLocale, status, [=](UConverter *converter, UErrorCode *error) {
         return ucnv_fromUChars(converter, pTarget, targetLength, pSource, sourceLength, error);
       }));

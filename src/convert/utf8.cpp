@@ -5,6 +5,7 @@
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <algorithm>
 #include <unicode/localpointer.h>
@@ -13,6 +14,7 @@
 namespace {
 
 using icu::LocalUConverterPointer;
+using nls2::failed;
 using nls2::trace::BoundedText;
 using nls2::trace::Frame;
 using nls2::trace::low32;
@@ -20,14 +22,14 @@ using nls2::trace::Trace;
 
 constexpr const char *utf8 = "utf-8";
 
-enum class Direction { ToUtf8, FromUtf8 };
+enum class Direction { toUtf8, fromUtf8 };
 
 // One line for both directions; it labels its arguments as NLS2_toUTF8 has them. An output with a
 // negative capacity has no text at all.
 template <Direction direction>
 void traceInput(Trace trace, const NLS2_Locale *pLocale, const char *second, int32_t third,
                 const char *fourth, int32_t fifth) {
-  constexpr bool toUtf8 = direction == Direction::ToUtf8;
+  constexpr bool toUtf8 = direction == Direction::toUtf8;
   NLS2_TRACE(
       trace,
       "Input parameters: pLocale %X, pSource %s, sourceLength %d, pTarget %s, targetLength %d.",
@@ -39,14 +41,14 @@ void traceInput(Trace trace, const NLS2_Locale *pLocale, const char *second, int
 template <Direction direction>
 int32_t convertByName(Trace trace, const NLS2_Locale *pLocale, char *target, int32_t targetLength,
                       const char *source, int32_t sourceLength, int32_t *status) {
-  constexpr bool toUtf8 = direction == Direction::ToUtf8;
-  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
+  constexpr bool toUtf8 = direction == Direction::toUtf8;
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     *status = NLS2_ERR_INVALID_LOCALE;
     return 0;
   }
   int32_t openStatus = U_ZERO_ERROR;
   LocalUConverterPointer converter(nls2::codepage::openMapped(pLocale, &openStatus));
-  if (openStatus > U_ZERO_ERROR) {
+  if (failed(openStatus)) {
     if constexpr (toUtf8) {
       NLS2_TRACE(trace, "Error opening converter for CCSID %d.", pLocale->codepage);
     } else {
@@ -60,7 +62,7 @@ int32_t convertByName(Trace trace, const NLS2_Locale *pLocale, char *target, int
   if constexpr (toUtf8) {
     NLS2_TRACE(trace, "Converter name returned is %s.", nls2::trace::text(name));
   }
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(trace, "Error %d acquiring corresponding name of converter.", error);
     *status = error;
     return 0;
@@ -71,7 +73,7 @@ int32_t convertByName(Trace trace, const NLS2_Locale *pLocale, char *target, int
   error = U_ZERO_ERROR;
   const int32_t length = ucnv_convert(toUtf8 ? utf8 : name, toUtf8 ? name : utf8, target,
                                       targetLength, source, sourceLength, &error);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     if constexpr (toUtf8) {
       NLS2_TRACE(trace, "Error converting string to UTF-8  %d.", error);
     } else {
@@ -92,8 +94,8 @@ int32_t NLS2_toUTF8(const NLS2_Locale *pLocale, const char *pSource, int32_t sou
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_toUTF8");
   Frame frame(anchor);
   *status = U_ZERO_ERROR;
-  traceInput<Direction::ToUtf8>(frame, pLocale, pSource, sourceLength, pTarget, targetLength);
-  return frame.result(convertByName<Direction::ToUtf8>(frame, pLocale, pTarget, targetLength,
+  traceInput<Direction::toUtf8>(frame, pLocale, pSource, sourceLength, pTarget, targetLength);
+  return frame.result(convertByName<Direction::toUtf8>(frame, pLocale, pTarget, targetLength,
                                                        pSource, sourceLength, status));
 }
 
@@ -102,7 +104,7 @@ int32_t NLS2_fromUTF8(const NLS2_Locale *pLocale, char *pTarget, int32_t targetL
                       const char *pSource, int32_t sourceLength, int32_t *status) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_fromUTF8");
   Frame frame(anchor);
-  traceInput<Direction::FromUtf8>(frame, pLocale, pTarget, targetLength, pSource, sourceLength);
-  return frame.result(convertByName<Direction::FromUtf8>(frame, pLocale, pTarget, targetLength,
+  traceInput<Direction::fromUtf8>(frame, pLocale, pTarget, targetLength, pSource, sourceLength);
+  return frame.result(convertByName<Direction::fromUtf8>(frame, pLocale, pTarget, targetLength,
                                                          pSource, sourceLength, status));
 }

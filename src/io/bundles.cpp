@@ -1,17 +1,20 @@
 // Resource bundles: NLS2_ResourceOpen, NLS2_ResourceClose, NLS2_GetStringByKey.
 
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <unicode/ures.h>
 
+using nls2::failed;
 using nls2::trace::Frame;
 
 UResourceBundle *NLS2_ResourceOpen(const char *packageName, const NLS2_Locale *pLocale,
                                    int32_t *pStatus) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_ResourceOpen");
   Frame frame(anchor);
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(static_cast<UResourceBundle *>(nullptr));
   }

@@ -1,36 +1,26 @@
 // Unicode file streams: NLS2_OpenStream, NLS2_CloseStream, NLS2_WriteString, NLS2_ReadString,
 // NLS2_Fputs, NLS2_Fgets, NLS2_Fflush, NLS2_Frewind, NLS2_detectUnicodeSignature.
 
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <algorithm>
-#include <type_traits>
 #include <unicode/ucnv.h>
 #include <unicode/ustdio.h>
 
 namespace {
 
+using nls2::failed;
 using nls2::trace::BoundedText;
 using nls2::trace::Frame;
 using nls2::trace::low32;
 using nls2::trace::text;
 
-// What every function with a locale object does: the object is looked up and not used any further.
-template <class Result, class... Parameters>
-Result callIfValid(const NLS2_Locale *pLocale, std::type_identity_t<Result> refused,
-                   Result (*function)(Parameters...),
-                   std::type_identity_t<Parameters>... arguments) {
-  return NLS2_ValidateLocale(pLocale) == U_ZERO_ERROR ? function(arguments...) : refused;
-}
-
-int32_t closeStream(UFILE *file) {
-  if (file != nullptr) {
-    u_fclose(file);
-  }
-  return U_ZERO_ERROR;
-}
+// All that a stream's function does with its locale object: the object is not used any further.
+bool isLive(const NLS2_Locale *pLocale) { return !failed(nls2::locale::validateLocale(pLocale)); }
 
 } // namespace
 
@@ -40,15 +30,21 @@ UFILE *NLS2_OpenStream(const NLS2_Locale *pLocale, const char *filename, const c
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocale %X, filename %s, permissions %s, encoding %s ",
              low32(pLocale), text(filename), text(permissions), text(encoding));
-  return frame.result(
-      callIfValid(pLocale, nullptr, u_fopen, filename, permissions, nullptr, encoding));
+  return frame.result(isLive(pLocale) ? u_fopen(filename, permissions, nullptr, encoding)
+                                      : nullptr);
 }
 
 int32_t NLS2_CloseStream(const NLS2_Locale *pLocale, UFILE *file) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_CloseStream");
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocale %X, file %X.", low32(pLocale), low32(file));
-  return frame.result(callIfValid(pLocale, NLS2_ERR_INVALID_LOCALE, closeStream, file));
+  if (!isLive(pLocale)) {
+    return frame.result(int32_t{NLS2_ERR_INVALID_LOCALE});
+  }
+  if (file != nullptr) {
+    u_fclose(file);
+  }
+  return frame.result(0);
 }
 
 int32_t NLS2_WriteString(const NLS2_Locale *pLocale, const UChar *pSource, int32_t len,
@@ -57,13 +53,13 @@ int32_t NLS2_WriteString(const NLS2_Locale *pLocale, const UChar *pSource, int32
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocale %X, pSource %s, len %d, fileHandle %X.",
              low32(pLocale), BoundedText(pSource, len).c_str(), len, low32(fileHandle));
-  return frame.result(callIfValid(pLocale, 0, u_file_write, pSource, len, fileHandle));
+  return frame.result(isLive(pLocale) ? u_file_write(pSource, len, fileHandle) : 0);
 }
 
 int32_t NLS2_ReadString(const NLS2_Locale *pLocale, UFILE *fileHandle, UChar *pDest, int32_t len) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_ReadString");
   Frame frame(anchor);
-  return frame.result(callIfValid(pLocale, 0, u_file_read, pDest, len, fileHandle));
+  return frame.result(isLive(pLocale) ? u_file_read(pDest, len, fileHandle) : 0);
 }
 
 int32_t NLS2_Fputs(const NLS2_Locale *pLocale, const UChar *pString, UFILE *fileHandle) {
@@ -71,7 +67,7 @@ int32_t NLS2_Fputs(const NLS2_Locale *pLocale, const UChar *pString, UFILE *file
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocale %X, pString %s, fileHandle %X.", low32(pLocale),
              BoundedText(pString, -1).c_str(), low32(fileHandle));
-  return frame.result(callIfValid(pLocale, 0, u_fputs, pString, fileHandle));
+  return frame.result(isLive(pLocale) ? u_fputs(pString, fileHandle) : 0);
 }
 
 UChar *NLS2_Fgets(const NLS2_Locale *pLocale, UFILE *fileHandle, UChar *pDest, int32_t len) {
@@ -79,7 +75,7 @@ UChar *NLS2_Fgets(const NLS2_Locale *pLocale, UFILE *fileHandle, UChar *pDest, i
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocale %X, fileHandle %X, pDest %s, len %d.",
              low32(pLocale), low32(fileHandle), BoundedText(pDest, std::max(len, 0)).c_str(), len);
-  return frame.result(callIfValid(pLocale, nullptr, u_fgets, pDest, len, fileHandle));
+  return frame.result(isLive(pLocale) ? u_fgets(pDest, len, fileHandle) : nullptr);
 }
 
 void NLS2_Fflush(UFILE *fileHandle) {

@@ -2,14 +2,17 @@
 // NLS2_GetLocaleCodepageId.
 
 #include "locale/locale_map.h"
-#include "locale/object_lines.h"
+#include "locale/registry.h"
+#include "locale/trace_object.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 
 namespace {
 
+using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
@@ -43,7 +46,7 @@ uint32_t NLS2_GetLocaleNumInfo(const NLS2_Locale *pLocale, uint32_t type, int32_
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_GetLocaleNumInfo");
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocale %X, type %d.", nls2::trace::low32(pLocale), type);
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     NLS2_TRACE(frame, "Invalid locale.");
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0U);
@@ -69,7 +72,7 @@ int32_t NLS2_SetLocaleNumInfo(NLS2_Locale *pLocaleToChange, uint32_t attribute, 
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameters: pLocaleToChange %X, attribute %d, value %d, options %d.",
              nls2::trace::low32(pLocaleToChange), attribute, value, options);
-  if (NLS2_ValidateLocale(pLocaleToChange) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocaleToChange))) {
     NLS2_TRACE(frame, "Invalid locale structure.");
     return frame.result(int32_t{NLS2_ERR_INVALID_LOCALE});
   }
@@ -95,7 +98,7 @@ uint32_t NLS2_GetLocaleCodepageId(const NLS2_Locale *pLocale, int32_t *pStatus) 
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameter: pLocale %X.", nls2::trace::low32(pLocale));
   *pStatus = U_ZERO_ERROR;
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     NLS2_TRACE(frame, "Invalid locale.");
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0U);

@@ -2,15 +2,17 @@
 // NLS2_GetThreadLocale.
 
 #include "locale/locale_map.h"
-#include "locale/object_lines.h"
+#include "locale/trace_object.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 #include <unicode/uclean.h>
 
 namespace {
 
+using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
@@ -29,7 +31,7 @@ const LocaleMapEntry *findRequested(uint32_t languageId, uint32_t codepage) {
 NLS2_Locale *allocate(Trace trace, int32_t *pStatus) {
   int32_t status = U_ZERO_ERROR;
   NLS2_Locale *pLocale = NLS2_allocateLocale(&status);
-  if (status != U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(trace, "Could not allocate a locale structure.");
     *pStatus = status;
   }
@@ -86,7 +88,7 @@ NLS2_Locale *NLS2_GetThreadLocale() {
   const Frame frame(anchor);
   int32_t status = U_ZERO_ERROR;
   NLS2_Locale *pLocale = NLS2_GetLocale(0, 0, 0, &status);
-  if (status != U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "Error %d obtaining Thread Locale.", status);
   }
   return pLocale;

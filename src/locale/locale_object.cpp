@@ -6,6 +6,7 @@
 #include "locale/registry.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstdlib>
 #include <cstring>
@@ -13,6 +14,7 @@
 
 namespace {
 
+using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
@@ -38,7 +40,7 @@ bool takeBaseName(Trace trace, const char *name, BaseName &baseName) {
   std::memset(baseName, 0, sizeof baseName);
   UErrorCode status = U_ZERO_ERROR;
   uloc_getBaseName(name, baseName, sizeof baseName, &status);
-  if (status > U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(trace, "Error getting locale base name. %d", status);
     return false;
   }
@@ -75,7 +77,7 @@ NLS2_Locale *NLS2_allocateLocale(int32_t *pStatus) {
   }
   NLS2_TRACE(frame, "Preparing to initialize Locale structure.");
   const int32_t status = NLS2_initLocaleObject(pLocale);
-  if (status != U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "Error initializing locale object %d", status);
     std::free(pLocale);
     *pStatus = status;
@@ -96,7 +98,7 @@ int32_t NLS2_initLocaleObject(NLS2_Locale *pLocale) {
   }
   NLS2_TRACE(frame, "Retrieve codepage name using locale basename %s.", baseName);
   const int32_t status = nls2::locale::setDefaultCodepage(frame, pLocale);
-  if (status == U_ZERO_ERROR) {
+  if (!failed(status)) {
     NLS2_TRACE(frame, "Locale object successfully initialized.");
   }
   return frame.result(status);
@@ -111,7 +113,7 @@ int32_t NLS2_ReleaseLocale(NLS2_Locale *pNLS2_Locale) {
   Frame frame(anchor);
   NLS2_TRACE(frame, "Input parameter: pNLS2_Locale %X.", nls2::trace::low32(pNLS2_Locale));
   NLS2_TRACE(frame, "Releasing Locale object %X.", nls2::trace::low32(pNLS2_Locale));
-  if (NLS2_ValidateLocale(pNLS2_Locale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pNLS2_Locale))) {
     NLS2_TRACE(frame, "Invalid locale specified.");
     return frame.result(int32_t{NLS2_ERR_INVALID_PARAMETER});
   }

@@ -4,11 +4,13 @@
 #include "locale/process_default.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 
 namespace {
 
+using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
@@ -37,7 +39,7 @@ int32_t applyToThreadLocale(Trace trace, const LocaleMapEntry &entry) {
   pLocale->languageId = entry.languageId;
   NLS2_TRACE(trace, "Locale language id is %d.", entry.languageId);
   const int32_t status = nls2::locale::setDefaultCodepage(trace, pLocale);
-  if (status == U_ZERO_ERROR) {
+  if (!failed(status)) {
     std::strcpy(pLocale->icuLocale, entry.localeName);
   }
   return status;
@@ -61,7 +63,7 @@ int32_t NLS2_SetLocaleFromNative(const char *pPosixID, uint32_t options) {
   if ((options & NLS2_THREAD_LOCALE) != 0) {
     NLS2_TRACE(frame, "This is a thread locale request.");
     const int32_t status = applyToThreadLocale(frame, *entry);
-    if (status != U_ZERO_ERROR) {
+    if (failed(status)) {
       return frame.result(status);
     }
   }
@@ -81,7 +83,7 @@ NLS2_Locale *NLS2_ConvertNativeLocale(const void * /*pNativeLocale*/, uint32_t o
   NLS2_TRACE(frame, "Setting the locale based on default.");
   int32_t status = U_ZERO_ERROR; // not handed on: a failure shows as null with status 0
   NLS2_Locale *pLocale = NLS2_allocateLocale(&status);
-  if (status != U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "Cannot allocate a locale structure. %d", status);
   }
   return pLocale;

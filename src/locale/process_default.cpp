@@ -2,6 +2,8 @@
 
 #include "locale/process_default.h"
 
+#include "trace/status.h"
+
 #include <unicode/ucnv.h>
 #include <unicode/uloc.h>
 
@@ -37,7 +39,7 @@ int32_t setDefaultCodepage(trace::Trace trace, NLS2_Locale *pLocale) {
   NLS2_TRACE(trace, "Retrieve codepage based on codepage name. %s.", name);
   int32_t status = U_ZERO_ERROR;
   pLocale->codepage = NLS2_GetCodepageId(name, &status);
-  if (status != U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(trace, "Could not get codepage based on codepage name.");
   }
   return status;

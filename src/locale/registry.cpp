@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <cstdlib>
+#include <pthread.h>
 
 static_assert(sizeof(NLS2_Locale) == 144 + sizeof(void *));
 static_assert(offsetof(NLS2_Locale, codepage) == 4);
@@ -25,16 +26,21 @@ void set(NLS2_Locale *&link, NLS2_Locale *object) {
   __atomic_store_n(&link, object, __ATOMIC_SEQ_CST);
 }
 
+// Holds the list's lock, and thread cancellation back with it: a host's trace call may be a
+// cancellation point, and a cancelled thread runs no destructor of this library, which is built
+// without exceptions. The lock would stay held for good.
 class ListLock {
 public:
   explicit ListLock(trace::Trace trace, const char *releaseLine)
       : trace_(trace), releaseLine_(releaseLine) {
     NLS2_TRACE(trace_, "Acquire lock on linked-list.");
+    pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelState_);
     SYS1_GetLock(&LocaleObjectList_Lock);
   }
   ~ListLock() {
     trace_.line(releaseLine_);
     SYS1_ReleaseLock(&LocaleObjectList_Lock);
+    pthread_setcancelstate(cancelState_, nullptr);
   }
   ListLock(const ListLock &) = delete;
   ListLock &operator=(const ListLock &) = delete;
@@ -42,6 +48,7 @@ public:
 private:
   trace::Trace trace_;
   const char *releaseLine_;
+  int cancelState_ = 0;
 };
 
 // Where an object stands: `current` is the object, or null at the list's end.

@@ -32,12 +32,8 @@ void giveWay(unsigned attempt) {
     sched_yield();
     return;
   }
-  // A sleep is a cancellation point, and the caller holds the list's lock.
-  int cancelState = 0;
-  pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelState);
   const timespec moment{0, 50'000};
   nanosleep(&moment, nullptr);
-  pthread_setcancelstate(cancelState, &cancelState);
 }
 
 void waitForRound(uint32_t round) {

@@ -26,7 +26,8 @@ private:
   std::atomic<uint32_t> &count_;
 };
 
-// Returns when every walk that was under way at the call has ended. One caller at a time.
+// Returns when every walk that was under way at the call has ended. One caller at a time, with
+// thread cancellation held back.
 void waitForWalkers();
 
 namespace detail {

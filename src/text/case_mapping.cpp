@@ -2,8 +2,10 @@
 
 #include "codepage/locale_converter.h"
 #include "codepage/utf16_text.h"
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 #include <unicode/localpointer.h>
@@ -14,6 +16,7 @@
 namespace {
 
 using icu::LocalUConverterPointer;
+using nls2::failed;
 using nls2::codepage::Utf16Text;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
@@ -52,14 +55,14 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   NLS2_TRACE(frame, "Input parameters: pLocale %X, dest %X, dlen %d, src %X, slen %d,options %x.",
              nls2::trace::low32(pLocale), nls2::trace::low32(dest), dlen, nls2::trace::low32(src),
              slen, options);
-  if (NLS2_ValidateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     return frame.result(int32_t{NLS2_ERR_INVALID_LOCALE});
   }
   Utf16Text text; // the converter goes first
   Utf16Text mapped;
   UErrorCode error = U_ZERO_ERROR;
   LocalUConverterPointer converter(nls2::codepage::openAsCcsid(pLocale, &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     return frame.result(int32_t{error});
   }
   // Unlike elsewhere, ICU's report that a first pass has no room is a failure here, so that only an
@@ -67,7 +70,7 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   const auto length = static_cast<int32_t>(std::strlen(src));
   error = U_ZERO_ERROR;
   text.length = ucnv_toUChars(converter.getAlias(), nullptr, 0, src, length, &error);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     return frame.result(int32_t{error});
   }
   if (!nls2::codepage::allocate(text, frame)) {
@@ -76,7 +79,7 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
     return frame.result(int32_t{NLS2_ERR_NO_MEMORY});
   }
   error = nls2::codepage::convert(text, converter.getAlias(), src, length);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     return frame.result(int32_t{error});
   }
   // The output is the mapped text, its terminator and the unit behind that.
@@ -86,14 +89,14 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   }
   std::memset(mapped.units.get(), 0, mapped.size());
   error = mapCase(frame, pLocale, text, mapped, options);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Error occurred during mapping %d.", error);
     return frame.result(int32_t{error});
   }
   error = U_ZERO_ERROR;
   const int32_t written = ucnv_fromUChars(converter.getAlias(), dest, dlen, mapped.units.get(),
                                           mapped.length + 1, &error);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(frame, "Error occurred during conversion %d.", error);
     return frame.result(int32_t{error});
   }

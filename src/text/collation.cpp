@@ -2,9 +2,11 @@
 
 #include "codepage/locale_converter.h"
 #include "codepage/utf16_text.h"
+#include "locale/registry.h"
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 #include <unicode/localpointer.h>
@@ -17,13 +19,14 @@ namespace {
 
 using icu::LocalUCollatorPointer;
 using icu::LocalUConverterPointer;
+using nls2::failed;
 using nls2::codepage::Utf16Text;
 using nls2::trace::BoundedText;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
 // Which of the two strings a line speaks of.
-enum class Which { First, Second };
+enum class Which { first, second };
 
 // One more character of a walk: its size, asked for once for the step and once for the sum. Its
 // status is not looked at, since the object is known to be live.
@@ -41,7 +44,7 @@ int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, i
   int64_t offset = 0;
   int64_t sum = 0;
   if (given < 0) {
-    if constexpr (which == Which::First) {
+    if constexpr (which == Which::first) {
       NLS2_TRACE(trace, "Determine length of string 1 by looking for null.");
     } else {
       NLS2_TRACE(trace, "Determine length of string 2 by looking for null.");
@@ -51,7 +54,7 @@ int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, i
     }
     NLS2_TRACE(trace, "Cumulative byte length determined is %d.", static_cast<int16_t>(sum));
   } else {
-    if constexpr (which == Which::First) {
+    if constexpr (which == Which::first) {
       NLS2_TRACE(trace, "String 1 is not null terminated, search for last character.");
     } else {
       NLS2_TRACE(trace, "String 2 is not null terminated, search for last character.");
@@ -69,9 +72,9 @@ int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, i
 template <Which which>
 bool convertString(Trace trace, LocalUConverterPointer &converter, Utf16Text &text,
                    const char *string, int16_t length, int32_t *pStatus) {
-  constexpr bool first = which == Which::First;
+  constexpr bool first = which == Which::first;
   UErrorCode error = nls2::codepage::measure(text, converter.getAlias(), string, length);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     if constexpr (first) {
       NLS2_TRACE(trace, "Error pre-flighting String 1 to UChars %d", error);
     } else {
@@ -89,7 +92,7 @@ bool convertString(Trace trace, LocalUConverterPointer &converter, Utf16Text &te
   }
   std::memset(text.units.get(), 0, text.size());
   error = nls2::codepage::convert(text, converter.getAlias(), string, length);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     if constexpr (first) {
       NLS2_TRACE(trace, "Error converting String 1 to UChars");
     } else {
@@ -113,7 +116,7 @@ int32_t compare(Trace trace, const NLS2_Locale *pLoc, Utf16Text &text1, Utf16Tex
   NLS2_TRACE(trace, "Preparing to open collator using locale %s", pLoc->icuLocale);
   UErrorCode error = U_ZERO_ERROR;
   const LocalUCollatorPointer collator(ucol_open(pLoc->icuLocale, &error));
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(trace, "Error %d opening collator for locale %s", error, pLoc->icuLocale);
     *pStatus = error;
     return 0;
@@ -155,7 +158,7 @@ int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t Stri
   if ((options & CHARBASED) != 0) {
     NLS2_TRACE(frame, "CHARBASED Option specified %X", options);
   }
-  if (NLS2_ValidateLocale(pLoc) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLoc))) {
     NLS2_TRACE(frame, "Invalid locale.");
     *pStatus = NLS2_ERR_INVALID_LOCALE;
     return frame.result(0);
@@ -163,7 +166,7 @@ int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t Stri
   NLS2_TRACE(frame, "Acquire Converter for CodePage %d.", pLoc->codepage);
   int32_t status = U_ZERO_ERROR;
   LocalUConverterPointer converter(nls2::codepage::openMapped(pLoc, &status));
-  if (status > U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "Error %d acquiring Converter.", status);
     *pStatus = status;
     return frame.result(0);
@@ -172,14 +175,14 @@ int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t Stri
   int16_t length2 = String2Length;
   if ((options & CHARBASED) != 0) {
     NLS2_TRACE(frame, "CHARBASED option selected.");
-    length1 = walkedLength<Which::First>(frame, pLoc, pString1, length1);
+    length1 = walkedLength<Which::first>(frame, pLoc, pString1, length1);
     NLS2_TRACE(frame, "Computing length of string 2");
-    length2 = walkedLength<Which::Second>(frame, pLoc, pString2, length2);
+    length2 = walkedLength<Which::second>(frame, pLoc, pString2, length2);
   }
   Utf16Text text1;
   Utf16Text text2;
-  if (!convertString<Which::First>(frame, converter, text1, pString1, length1, pStatus) ||
-      !convertString<Which::Second>(frame, converter, text2, pString2, length2, pStatus)) {
+  if (!convertString<Which::first>(frame, converter, text1, pString1, length1, pStatus) ||
+      !convertString<Which::second>(frame, converter, text2, pString2, length2, pStatus)) {
     return frame.result(0);
   }
   converter.adoptInstead(nullptr);

@@ -6,6 +6,7 @@
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 #include <unicode/localpointer.h>
@@ -15,6 +16,7 @@
 namespace {
 
 using icu::LocalUConverterPointer;
+using nls2::failed;
 using nls2::codepage::Utf16Text;
 using nls2::trace::BoundedText;
 using nls2::trace::Frame;
@@ -23,7 +25,7 @@ using nls2::trace::Trace;
 constexpr int32_t searchFailed = -1;
 
 // Which of the two strings a line speaks of.
-enum class Which { First, Second };
+enum class Which { first, second };
 
 // What a call holds. Release before a line or after it: callers' traces know which.
 struct Search {
@@ -55,7 +57,7 @@ bool openConverter(Search &search) {
   NLS2_TRACE(search.trace, "Opening converter for codepage %d.", search.pLocale->codepage);
   int32_t status = U_ZERO_ERROR;
   search.converter.adoptInstead(nls2::codepage::openMapped(search.pLocale, &status));
-  if (status > U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(search.trace, "Could not map Codepage ID %d to Name", search.pLocale->codepage);
     return false;
   }
@@ -68,7 +70,7 @@ bool convertString1(Search &search, const char *string, int32_t length) {
   UConverter *converter = search.converter.getAlias();
   NLS2_TRACE(trace, "Pre-flight string1 to determine size of output needed.");
   UErrorCode error = nls2::codepage::measure(search.text1, converter, string, length);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     NLS2_TRACE(trace, "Could not pre-flight first string to UChars");
     return false;
   }
@@ -79,7 +81,7 @@ bool convertString1(Search &search, const char *string, int32_t length) {
   }
   NLS2_TRACE(trace, "Convert string1 to UChars.");
   error = nls2::codepage::convert(search.text1, converter, string, length);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     search.release();
     NLS2_TRACE(trace, "Could convert string1 to UChars %d", error);
     return false;
@@ -92,7 +94,7 @@ bool convertString2(Search &search, const char *string, int32_t length) {
   UConverter *converter = search.converter.getAlias();
   NLS2_TRACE(trace, "Pre-flight string2 to determine buffer size needed.");
   UErrorCode error = nls2::codepage::measure(search.text2, converter, string, length);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     search.releaseAllButText1();
     NLS2_TRACE(trace, "Could not pre-flight string2 to UChars %d", error);
     return false;
@@ -105,7 +107,7 @@ bool convertString2(Search &search, const char *string, int32_t length) {
   }
   NLS2_TRACE(trace, "Convert string2 to UChars.");
   error = nls2::codepage::convert(search.text2, converter, string, length);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     search.release();
     NLS2_TRACE(trace, "Could convert string 2 to UChars %d", error);
     return false;
@@ -126,7 +128,7 @@ UErrorCode toLower(const Search &search, const Utf16Text &source, Utf16Text &low
 template <Which which>
 bool lowerString(Search &search, const Utf16Text &source, Utf16Text &lower) {
   const Trace trace = search.trace;
-  constexpr bool first = which == Which::First;
+  constexpr bool first = which == Which::first;
   lower.length = u_strlen(source.units.get());
   const auto bytes = static_cast<int32_t>(lower.size());
   if constexpr (first) {
@@ -143,7 +145,7 @@ bool lowerString(Search &search, const Utf16Text &source, Utf16Text &lower) {
   NLS2_TRACE(trace, "Memory allocated.");
   trace.line(first ? "Convert string1 to lower.\n" : "Convert string2 to lower.\n");
   const UErrorCode error = toLower(search, source, lower);
-  if (error > U_ZERO_ERROR) {
+  if (failed(error)) {
     search.release();
     if constexpr (first) {
       NLS2_TRACE(trace, "Could not convert to lower case %d", error);
@@ -174,8 +176,8 @@ int32_t find(Search &search, uint32_t options) {
     return answer(search, u_strstr(search.text1.units.get(), search.text2.units.get()));
   }
   NLS2_TRACE(search.trace, "IGNORECASE option detected");
-  if (!lowerString<Which::First>(search, search.text1, search.lower1) ||
-      !lowerString<Which::Second>(search, search.text2, search.lower2)) {
+  if (!lowerString<Which::first>(search, search.text1, search.lower1) ||
+      !lowerString<Which::second>(search, search.text2, search.lower2)) {
     return searchFailed;
   }
   NLS2_TRACE(search.trace, "Look for string2 in string1.");
@@ -193,7 +195,7 @@ int32_t NLS2_Findstr(const NLS2_Locale *pLocale, const char *pString1, int32_t l
              "options %x.",
              nls2::trace::low32(pLocale), BoundedText(pString1, len1).c_str(), len1,
              BoundedText(pString2, len2).c_str(), len2, options);
-  if (nls2::locale::validateLocale(pLocale) != U_ZERO_ERROR) {
+  if (failed(nls2::locale::validateLocale(pLocale))) {
     NLS2_TRACE(frame, "Invalid locale object.");
     return frame.result(searchFailed);
   }

@@ -4,6 +4,6 @@
 
 const char *NLS2_BuildStamp() {
   return
-#include "build_stamp.inc" // a string literal, written when the build is configured
+#include "build_stamp.inc" // a string literal, written by cmake/build_stamp.cmake
       ;
 }

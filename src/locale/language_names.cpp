@@ -4,10 +4,12 @@
 #include "locale/locale_map.h"
 #include "nls2.h"
 #include "trace/frame.h"
+#include "trace/status.h"
 
 #include <cstring>
 #include <unicode/uloc.h>
 
+using nls2::failed;
 using nls2::trace::Frame;
 
 int32_t NLS2_GetLanguageName(uint32_t languageId, char *nameBuffer, int32_t bufferLength) {
@@ -23,7 +25,7 @@ int32_t NLS2_GetLanguageName(uint32_t languageId, char *nameBuffer, int32_t buff
   NLS2_TRACE(frame, "Found languageID in table.");
   UErrorCode status = U_ZERO_ERROR;
   uloc_getLanguage(entry->localeName, nameBuffer, bufferLength, &status);
-  if (status > U_ZERO_ERROR) {
+  if (failed(status)) {
     NLS2_TRACE(frame, "Error %d retrieving language name from ICU.", status);
     return frame.result(int32_t{status});
   }

@@ -1,0 +1,11 @@
+// The one test of a status.
+#pragma once
+
+#include <cstdint>
+
+namespace nls2 {
+
+// True for a failure: ICU's warnings are negative, and successes. For UErrorCode as well.
+constexpr bool failed(int32_t status) { return status > 0; }
+
+} // namespace nls2

@@ -1,0 +1,61 @@
+// A thread that is cancelled inside the host's trace calls leaves the registry usable. This program
+// is its own host: every trace call is a cancellation point.
+
+#include "nls2.h"
+#include "trc1.h"
+
+#include <atomic>
+#include <gtest/gtest.h>
+#include <pthread.h>
+#include <unistd.h>
+
+namespace {
+
+// The trace call of the thread at which it is cancelled; not yet counted down to 0 afterwards if
+// it made fewer.
+std::atomic<int> callsLeft{0};
+
+void mayBeCancelled() {
+  if (--callsLeft == 0) {
+    pthread_cancel(pthread_self());
+  }
+  pthread_testcancel();
+}
+
+void *makeAndRelease(void *) {
+  int32_t status = 0;
+  NLS2_Locale *pLocale = NLS2_GetLocale(0x03480001, 37, 0, &status);
+  NLS2_ReleaseLocale(pLocale);
+  return nullptr;
+}
+
+// What the cancelled thread had made and not released is still live.
+void releaseAll() {
+  while (pLocaleObjectList != nullptr) {
+    ASSERT_EQ(NLS2_ReleaseLocale(pLocaleObjectList), 0);
+  }
+}
+
+} // namespace
+
+uint32_t TRC1_Sync(TRC1_EntryBlock *) { return TRC1_FLAG_DETAIL | TRC1_FLAG_EVENTS; }
+void TRC1_Event(TRC1_EntryBlock *, uint32_t, uint32_t, ...) { mayBeCancelled(); }
+void TRC1_Printf(TRC1_EntryBlock *, uint32_t, const char *, ...) { mayBeCancelled(); }
+void TRC1_Dump(TRC1_EntryBlock *, uint32_t, const void *, uint32_t, uint32_t) { mayBeCancelled(); }
+
+TEST(Cancellation, AtAnyTraceCallLeavesTheListUnlocked) {
+  alarm(30); // a lock that stays held would make the next call wait for ever
+  void *result = PTHREAD_CANCELED;
+  int calls = 0;
+  while (result == PTHREAD_CANCELED) {
+    callsLeft = ++calls;
+    pthread_t thread{};
+    ASSERT_EQ(pthread_create(&thread, nullptr, makeAndRelease, nullptr), 0);
+    ASSERT_EQ(pthread_join(thread, &result), 0);
+    // Held back inside the lock, it is acted upon at the next trace call.
+    EXPECT_EQ(result == PTHREAD_CANCELED, callsLeft <= 0) << "cancelled at trace call " << calls;
+    callsLeft = 0;
+    releaseAll();
+  }
+  EXPECT_GT(calls, 30);
+}
