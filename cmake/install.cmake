@@ -10,7 +10,9 @@ install(
   TARGETS zelnls2 zelhost
   EXPORT zelnls2Targets
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR})
-install(FILES ${PROJECT_SOURCE_DIR}/include/nls2.h DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
+install(FILES ${PROJECT_SOURCE_DIR}/include/nls2.h ${PROJECT_SOURCE_DIR}/include/nls2.hpp
+        DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
+install(DIRECTORY ${PROJECT_SOURCE_DIR}/include/nls2 DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
 install(FILES ${PROJECT_SOURCE_DIR}/docs/zelnls2.3 DESTINATION ${CMAKE_INSTALL_MANDIR}/man3)
 install(FILES ${PROJECT_SOURCE_DIR}/host/trc1.h ${PROJECT_SOURCE_DIR}/host/sys1.h
         DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/zelnls2)
@@ -19,6 +21,10 @@ if(ZELNLS2_BUILD_TOOL)
   set_target_properties(nls2 PROPERTIES INSTALL_RPATH "$ORIGIN/${_lib_from_bin}")
   install(TARGETS nls2 DESTINATION ${CMAKE_INSTALL_BINDIR})
   install(FILES ${PROJECT_SOURCE_DIR}/docs/nls2.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
+  install(
+    FILES ${PROJECT_SOURCE_DIR}/completions/nls2.bash
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions
+    RENAME nls2)
 endif()
 
 install(

@@ -9,7 +9,7 @@
 
 namespace {
 
-// The word's values. A holder that finds `contended` at its release has somebody to wake; one that
+// The word's values. A holder that finds `contended` at its release has a waiter to wake; one that
 // finds `held` saves the system call.
 enum LockState : uint32_t { unlocked = 0, held = 1, contended = 2 };
 

@@ -1,8 +1,8 @@
 /* sys1.h - the lock service that the library asks of its host.
  *
  * A lock object is 28 bytes of zero-initialised storage, aligned for a 32-bit word, whose contents
- * belong to the service: nobody initialises or destroys it. It is held only around changes to the
- * library's list of locale objects, never across a call of ICU. As with trc1.h, a host's own
+ * belong to the service: it is neither initialised nor destroyed. It is held only around changes
+ * to the library's list of locale objects, never across a call of ICU. As with trc1.h, a host's own
  * definitions replace those of libzelhost.so.
  */
 #ifndef SYS1_H

@@ -2,7 +2,7 @@
 //
 // It is off unless the environment asks for it when the process starts:
 //   ZELHOST_TRACE       "events", "detail" or "all": what to write
-//   ZELHOST_TRACE_FILE  the file to append to; standard error where it is not set
+//   ZELHOST_TRACE_FILE  the file to append to; standard error if it is not set
 
 #include "trc1.h"
 
@@ -73,7 +73,7 @@ const Settings &settings() {
 // One line: the constructor opens it with what all lines share, the destructor ends it. Lines of
 // several threads do not mix, since the stream stays locked in between. Thread cancellation is held
 // back for as long: writing is a cancellation point, and a cancelled thread would leave the stream
-// locked for good.
+// locked for ever.
 class Line {
 public:
   Line(const TRC1_EntryBlock *anchor, uint32_t line) : file_(settings().file) {

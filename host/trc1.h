@@ -4,7 +4,7 @@
  * holds a default implementation that its definitions replace.
  *
  * Each function of the library owns one TRC1_EntryBlock, its anchor. On entry the library compares
- * the word that `sync` points at with `cachedSync`; where they are equal it uses `cachedFlags`, and
+ * the word that `sync` points at with `cachedSync`; if they are equal it uses `cachedFlags`, and
  * otherwise it calls TRC1_Sync. A host that changes its trace settings therefore changes the word
  * that `sync` points at, and the next call of each function asks anew.
  *
@@ -52,7 +52,7 @@ enum {
 /* Values of TRC1_EntryBlock::attributes. */
 enum { TRC1_ENTRY_EXPORTED = 0x200, TRC1_ENTRY_PRIVATE = 0x800 };
 
-/* One a library. Lengths are in bytes, without the terminator. */
+/* One for the library. Lengths are in bytes, without the terminator. */
 typedef struct TRC1_UnitBlock {
   uint32_t formatVersion;
   uint32_t attributes;
@@ -70,7 +70,7 @@ typedef struct TRC1_UnitBlock {
   const char *(*buildStamp)(void);
 } TRC1_UnitBlock;
 
-/* One a function: its anchor. The library writes none of it after load. */
+/* One for each function: its anchor. The library writes none of it after load. */
 typedef struct TRC1_EntryBlock {
   TRC1_UnitBlock *unit;
   const char *functionName;

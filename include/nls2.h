@@ -1,5 +1,9 @@
 /* nls2.h - the interface of libzelnls2: text in many languages and code pages.
  *
+ * Translates fields between numbered code pages, and compares, searches and reads text by the rules
+ * of a language, over ICU. examples/translate_field.c shows the shortest use; C++ programs have
+ * nls2.hpp as well.
+ *
  * Conventions. They hold for every function unless its comment says otherwise.
  *
  *  1. Lengths. Byte strings are measured in bytes, UTF-16 text in 16-bit units; each comment says
@@ -11,20 +15,23 @@
  *  4. Language ids are numbers: a country number in the upper 16 bits (ISO 3166 numeric, with
  *     exceptions) and the library's language number in the lower 16. localeMap holds them all.
  *  5. A status is a signed 32-bit word: 0 is success, a positive value a failure, a negative value
- *     a warning of ICU's and so a success. Values 32 and 36 to 39 are this library's (NLS2_ERR_*),
- *     all others are ICU's UErrorCode, passed on unchanged; u_errorName() names those.
+ *     an ICU warning and therefore a success. Values 32 and 36 to 39 are this library's
+ *     (NLS2_ERR_*), all others are ICU's UErrorCode, passed on unchanged; u_errorName() names
+ *     those.
  *  6. A status comes back in one of two ways: stored through a last argument pStatus, with a result
- *     of 0 or null on failure; or as the result itself.
+ *     of 0 or null on failure; or as the result itself. NLS2_Findstr alone has no status: its
+ *     result is the answer, or -1.
  *  7. Outputs on failure are as they were, except where "partial output" is noted.
- *  8. No pointer argument is tested for null. Null is undefined behaviour where not noted.
- *  9. Buffers without a length argument, or with one that is "traced only", are written without a
- *     bound: the comment says how much room is needed.
+ *  8. No pointer argument is tested for null. Passing null is undefined behaviour unless noted.
+ *  9. Buffers without a length argument, or with one that is not used or only traced, are written
+ *     without a bound: the comment says how much room is needed.
  * 10. Handles that a function returns belong to the caller, who closes them as its comment says.
- * 11. Threads. Every function may be called from any thread at any time. One object or handle must
- *     not be used by two threads while one of them changes or closes it.
+ * 11. Threads. Every function may be called from any thread at any time, but not from a signal
+ *     handler: a release there can wait for ever for a validation that it interrupted. One object
+ *     or handle must not be used by two threads while one of them changes or closes it.
  * 12. The library reads no environment and no configuration, and has no state but its list of live
- *     locale objects. Every call is traced through the host's facility (trc1.h); tracing changes no
- *     result where not noted.
+ *     locale objects. Every call but NLS2_BuildStamp is traced through the host's facility
+ *     (trc1.h); tracing changes no result unless noted.
  */
 #ifndef NLS2_H
 #define NLS2_H
@@ -78,17 +85,19 @@ enum {
   NLS2_LANGUAGE_ID_END = 0xFF    /* language id of the terminator, never a locale's */
 };
 
-/* The locales that the library knows. The order is part of the interface: every search runs from
- * record 0 and takes the first match, and some ids and names stand in two records. */
+/* The locales that the library knows. The order is part of the interface: every search starts at
+ * record 0 and takes the first match, and some ids and names are in two records. */
 extern NLS2_API const LocaleMapEntry localeMap[NLS2_LOCALE_MAP_RECORDS];
 
-/* The first record of localeMap with this language id; null when there is none, also for 0xFF. */
+/* The first record of localeMap with this language id; null if there is none, also for 0xFF. */
 NLS2_API const LocaleMapEntry *NLS2_GetLocaleMapEntry(uint32_t languageId);
 
-/* A locale object: a language and a code page. Callers hold a pointer to it from the function that
- * makes it to NLS2_ReleaseLocale; in between it is valid, which means: on the list of live objects.
- * Every function that takes one refuses a pointer that is not on the list, without looking at it.
- */
+/* A locale object: a language and a code page. An object is valid ("live") from its creation until
+ * NLS2_ReleaseLocale; all live objects are on a list. Every function that takes an object refuses a
+ * pointer that is not on the list, without looking at what it points to.
+ *
+ * Warning: the heap may give a released object's address to a new object. An old pointer is then
+ * live again, and releasing it twice takes the new object from its owner. */
 typedef struct NLS2_Locale {
   uint32_t languageId;       /* of a record of localeMap */
   uint32_t codepage;         /* as given, not checked against anything */
@@ -96,121 +105,144 @@ typedef struct NLS2_Locale {
   struct NLS2_Locale *pNext; /* the library's */
 } NLS2_Locale;
 
-/* The live objects in order of creation, linked by pNext; null when there is none. For debuggers:
+/* The live objects in order of creation, linked by pNext; null if there is none. For debuggers:
  * the list changes under LocaleObjectList_Lock, 28 bytes that belong to the host's lock service. */
 extern NLS2_API NLS2_Locale *pLocaleObjectList;
 extern NLS2_API uint32_t LocaleObjectList_Lock[7];
 
 /* A new object for the process's default locale and code page, as ICU reports them
- * (uloc_getDefault, ucnv_getDefaultName). Null on failure. *pStatus: 0; NLS2_ERR_NO_MEMORY; or
- * NLS2_initLocaleObject's. */
+ * (uloc_getDefault, ucnv_getDefaultName). Null on failure.
+ *
+ * Status:
+ *   0   done
+ *   32  NLS2_ERR_NO_MEMORY
+ *   or that of NLS2_initLocaleObject */
 NLS2_API NLS2_Locale *NLS2_allocateLocale(int32_t *pStatus);
 
 /* Fills a zeroed object from the process's defaults, as NLS2_allocateLocale does; the object need
  * not be on the list. An empty default locale counts as "en_US"; the language id is that of the
  * first record of localeMap whose name occurs anywhere in the default's base name
- * (uloc_getBaseName). Without a default code page it is US EBCDIC (37).
+ * (uloc_getBaseName). If there is no default code page, it is US EBCDIC (37).
  *
- * Status as the result: 0; NLS2_ERR_INVALID_PARAMETER when no record matches or ICU gives no base
- * name (more than 132 characters); or that of NLS2_GetCodepageId for the default code page's name.
- * The object is then partly filled.
+ * Status, as the result; on failure the object is partly filled:
+ *   0   done
+ *   37  NLS2_ERR_INVALID_PARAMETER: no record matches, or ICU gives no base name (more than 132
+ *       characters)
+ *   or that of NLS2_GetCodepageId for the default code page's name
  *
  * Surprises: a default locale that the table does not hold, such as "en" or "nb_NO", makes every
  * creation of an object fail with NLS2_ERR_INVALID_PARAMETER. Short names match inside longer ones:
  * the default locale "ses_ML" (Koyraboro Senni) is found as "es". */
 NLS2_API int32_t NLS2_initLocaleObject(NLS2_Locale *pLocale);
 
-/* Status as the result: 0 when the object is live, NLS2_ERR_INVALID_LOCALE otherwise, also for
- * null. Any pointer will do; it is compared, not followed. Takes no lock. */
+/* Status, as the result: 0 if the object is live, NLS2_ERR_INVALID_LOCALE otherwise, also for null.
+ * Any pointer will do; it is compared, not followed. Takes no lock. */
 NLS2_API int32_t NLS2_ValidateLocale(const NLS2_Locale *pLocale);
 
-/* Gives an object back. Status as the result: 0, or NLS2_ERR_INVALID_PARAMETER (not INVALID_LOCALE
- * as elsewhere) when it is not live. Of two threads that release the same object at once one gets
- * 0, the other either. Waits for validations that other threads are in the middle of. */
+/* Releases an object. Status, as the result: 0, or NLS2_ERR_INVALID_PARAMETER (not INVALID_LOCALE
+ * as elsewhere) if it is not live. If two threads release one object at once, one gets 0 and the
+ * other 0 or the failure. Waits for validations in progress on other threads. */
 NLS2_API int32_t NLS2_ReleaseLocale(NLS2_Locale *pNLS2_Locale);
 
-/* Starts ICU (u_init). Nothing here depends on it. ICU's status as the result. */
+/* Starts ICU (u_init). Nothing here depends on it. Status, as the result: ICU's. */
 NLS2_API int32_t NLS2_Init(void);
 
-/* Options: of NLS2_GetLocale and NLS2_ConvertNativeLocale, of NLS2_SetLocaleFromNative. */
-enum { NLS2_LOCALE_DEFAULT = 0x4, NLS2_THREAD_LOCALE = 0x1 };
+/* Options. */
+enum {
+  NLS2_LOCALE_DEFAULT = 0x4, /* of NLS2_GetLocale and NLS2_ConvertNativeLocale */
+  NLS2_THREAD_LOCALE = 0x1   /* of NLS2_SetLocaleFromNative */
+};
 
-/* A new object for a language and a code page; for the process's defaults when both are 0.
+/* A new object for a language and a code page; for the process's defaults if both are 0. Null on
+ * failure.
  *
  *   languageId  of a record of localeMap, or 0
  *   codepage    stored as it is, unchecked; 0: the process's default
  *   options     0, or NLS2_LOCALE_DEFAULT (bit 0x2 does the same): the object keeps the defaults,
- * though the table search must still succeed. Ignored when both numbers are 0
+ *               but the table search must still succeed. Ignored if both numbers are 0
  *
- * The record that counts is the first with this id or with this code page in both its columns. Null
- * on failure. *pStatus: 0; NLS2_ERR_INVALID_PARAMETER when there is no such record; or
- * NLS2_allocateLocale's.
+ * The first record with this id, or with this code page in both its columns, is used.
+ *
+ * Status:
+ *   0   done
+ *   37  NLS2_ERR_INVALID_PARAMETER: there is no such record
+ *   or that of NLS2_allocateLocale
  *
  * Surprises: hr_HR is the one record with a code page in both columns, so code page 912 makes an
- * hr_HR object for every language whose record stands behind hr_HR's, such as pl_PL. Since every
- * object starts from the defaults, what fails NLS2_initLocaleObject fails this. */
+ * hr_HR object for every language whose record comes after hr_HR's, such as pl_PL. Since every
+ * object starts from the defaults, whatever makes NLS2_initLocaleObject fail makes this fail. */
 NLS2_API NLS2_Locale *NLS2_GetLocale(uint32_t languageId, uint32_t codepage, uint32_t options,
                                      int32_t *pStatus);
 
-/* NLS2_GetLocale(0, 0, 0) without a status: null on failure. There is no locale of a thread's own;
+/* NLS2_GetLocale(0, 0, 0) without a status: null on failure. A thread has no locale of its own;
  * each call makes a new object. */
 NLS2_API NLS2_Locale *NLS2_GetThreadLocale(void);
 
 /* Selectors of NLS2_GetLocaleNumInfo and NLS2_SetLocaleNumInfo. */
 enum { NLS2_ATTRIBUTE_LANGUAGE_ID = 1, NLS2_ATTRIBUTE_CODEPAGE = 9 };
 
-/* A number of an object; 0 on failure. *pStatus: 0; NLS2_ERR_INVALID_LOCALE; or
- * NLS2_ERR_INVALID_PARAMETER for a type that is no selector. */
+/* A number of an object; 0 on failure.
+ *
+ * Status:
+ *   0   done
+ *   37  NLS2_ERR_INVALID_PARAMETER: the type is not a selector
+ *   38  NLS2_ERR_INVALID_LOCALE: the object is not live */
 NLS2_API uint32_t NLS2_GetLocaleNumInfo(const NLS2_Locale *pLocale, uint32_t type,
                                         int32_t *pStatus);
 
-/* Changes a number of an object. A new language id brings its record's locale name with it and
- * leaves the code page; a new code page is not checked. A value of 255 changes nothing and is a
- * success. `options` is traced only.
+/* Changes a number of an object. A new language id sets its record's locale name as well and leaves
+ * the code page; a new code page is not checked. A value of 255 changes nothing and is a success.
+ * `options` is only traced.
  *
- * Status as the result: 0, or NLS2_ERR_INVALID_LOCALE: the object is not live, localeMap does not
- * hold the language id, or the attribute is no selector (which NLS2_GetLocaleNumInfo calls an
+ * Status, as the result: 0, or NLS2_ERR_INVALID_LOCALE: the object is not live, localeMap does not
+ * hold the language id, or the attribute is not a selector (for which NLS2_GetLocaleNumInfo gives
  * INVALID_PARAMETER). */
 NLS2_API int32_t NLS2_SetLocaleNumInfo(NLS2_Locale *pLocaleToChange, uint32_t attribute,
                                        uint32_t value, uint32_t options);
 
-/* An object's code page; 0 on failure. *pStatus: 0 or NLS2_ERR_INVALID_LOCALE. */
+/* An object's code page; 0 on failure. Status: 0 or NLS2_ERR_INVALID_LOCALE. */
 NLS2_API uint32_t NLS2_GetLocaleCodepageId(const NLS2_Locale *pLocale, int32_t *pStatus);
 
-/* Tells whether a POSIX locale name, such as "en_US.UTF-8", is known: whether the name of a record
- * of localeMap occurs anywhere in its first 131 characters. "C" stands for ICU's default locale.
+/* Checks whether a POSIX locale name, such as "en_US.UTF-8", is known: whether the name of a record
+ * of localeMap occurs anywhere in its first 131 characters. "C" means ICU's default locale.
  *
- * Status as the result: 0, or NLS2_ERR_INVALID_LOCALE when no record's name occurs. With
- * NLS2_THREAD_LOCALE also NLS2_ERR_INVALID_LOCALE when no object can be made, and the status of
- * NLS2_GetCodepageId for the process's default code page.
+ * Status, as the result:
+ *   0   the name is known
+ *   38  NLS2_ERR_INVALID_LOCALE: no record's name occurs; with NLS2_THREAD_LOCALE also: no object
+ *       can be made
+ *   or, with NLS2_THREAD_LOCALE, that of NLS2_GetCodepageId for the process's default code page
  *
- * Surprise: NLS2_THREAD_LOCALE applies the record and the default code page to a new object of
- * NLS2_GetThreadLocale that nobody gets to know. It stays on the list for good. */
+ * Surprise: NLS2_THREAD_LOCALE applies the record and the default code page to a new object that
+ * the caller never receives. It is leaked: it stays on the list. */
 NLS2_API int32_t NLS2_SetLocaleFromNative(const char *pPosixID, uint32_t options);
 
 /* NLS2_allocateLocale under another name. `pNativeLocale` is not read; `options` must have
- * NLS2_LOCALE_DEFAULT. Null on failure. *pStatus: 0, or NLS2_ERR_INVALID_PARAMETER without that
+ * NLS2_LOCALE_DEFAULT. Null on failure. Status: 0, or NLS2_ERR_INVALID_PARAMETER without that
  * option.
  *
- * Surprise: where the object cannot be made, the result is null and *pStatus is 0. */
+ * Surprise: if the object cannot be made, the result is null and the status 0. */
 NLS2_API NLS2_Locale *NLS2_ConvertNativeLocale(const void *pNativeLocale, uint32_t options,
                                                int32_t *pStatus);
 
 /* ---- Names of languages ---------------------------------------------------------------------- */
 
 /* The ISO 639 code of a language id ("en"), as uloc_getLanguage writes it: cut and terminated by
- * ICU's rules. bufferLength is in bytes. Status as the result: 0, also where only the terminator
- * had no room; NLS2_ERR_LANGUAGE_NOT_FOUND; or ICU's, 15 for a buffer that is too small. */
+ * ICU's rules. bufferLength is in bytes.
+ *
+ * Status, as the result:
+ *   0   done, also if only the terminator did not fit
+ *   39  NLS2_ERR_LANGUAGE_NOT_FOUND
+ *   or ICU's, 15 for a buffer that is too small */
 NLS2_API int32_t NLS2_GetLanguageName(uint32_t languageId, char *nameBuffer, int32_t bufferLength);
 
 /* The short POSIX name of a language id ("en_US"), from the first record that has it. bufferLength
- * is traced only: 8 bytes hold every name. Status as the result: 0 or NLS2_ERR_LANGUAGE_NOT_FOUND.
- */
+ * is only traced: 8 bytes hold every name. Status, as the result: 0 or NLS2_ERR_LANGUAGE_NOT_FOUND.
+ * */
 NLS2_API int32_t NLS2_GetShortPosixName(uint32_t languageId, char *nameBuffer,
                                         int32_t bufferLength);
 
-/* The language id of the first record with this short POSIX name, case and all; 0 when there is
- * none. *status: 0, or NLS2_ERR_INVALID_PARAMETER when there is none. */
+/* The language id of the first record with exactly this short POSIX name; 0 if there is none.
+ * Status: 0, or NLS2_ERR_INVALID_PARAMETER if there is none. */
 NLS2_API uint32_t NLS2_LanguageIDFromShortPosixName(const char *pShortPosixName, int32_t *status);
 
 /* ---- Code pages ------------------------------------------------------------------------------ */
@@ -243,38 +275,48 @@ extern NLS2_API const CcsidMapEntry ccsidMap[NLS2_CCSID_MAP_RECORDS];
  *    1208 utf-8          57360 utf-32be      57361 utf-32le
  *
  * Result: the converter, or null. *twoNullTerminator: 0 or 1, always stored, from the number alone.
- * *status: always stored; 0; a warning of ICU's as it is (U_AMBIGUOUS_ALIAS_WARNING, -122, where a
- * name means several tables); or ICU's failure, U_FILE_ACCESS_ERROR (4) for a number or name that
- * this ICU has no converter for (57355 to 57357 with ICU's standard data, and 57364).
+ *
+ * Status, always stored:
+ *   0     done
+ *   -122  U_AMBIGUOUS_ALIAS_WARNING: a name means several tables; other ICU warnings also come
+ *         unchanged
+ *   4     U_FILE_ACCESS_ERROR: this ICU has no converter for the number or name (57355 to 57357
+ *         with ICU's standard data, and 57364)
+ *   or ICU's other failures
  *
  * Surprises: ICU reads -37 as 37. 57372 opens ICU's UTF-16 with a signature, and it, 57360, 57361
  * and 57369 leave the flag at 0 although their strings end in more than one zero byte. */
 NLS2_API struct UConverter *NLS2_MapCodepageIdToName(int32_t codepage, int32_t *twoNullTerminator,
                                                      int32_t *status);
 
-/* The code page of a Windows code-page name.
- *
- * Result: the ccsid of the first record of ccsidMap whose name occurs anywhere in `name` (bytes,
- * case and all), else 0. *status: 0, or NLS2_ERR_INVALID_PARAMETER when no record's name occurs in
- * it.
+/* The code page of a Windows code-page name: the ccsid of the first record of ccsidMap whose name
+ * occurs anywhere in `name`, byte for byte; 0 if there is none. Status: 0, or
+ * NLS2_ERR_INVALID_PARAMETER if there is none.
  *
  * Surprises: "windows-9501" is found as windows-950; "big5" and "Windows-936" are not found. */
 NLS2_API uint32_t NLS2_MapWindowsNameToCCSID(const char *name, int32_t *status);
 
-/* ICU's canonical name of a code page's converter: "UTF-8" for 1208. bufferLength is traced only:
- * UCNV_MAX_CONVERTER_NAME_LENGTH (60) bytes hold every name. Status as the result: 0; that of
- * NLS2_MapCodepageIdToName when it fails; ICU's when it gives no name, 2 (U_MISSING_RESOURCE_ERROR)
- * where it has none.
+/* ICU's canonical name of a code page's converter: "UTF-8" for 1208. bufferLength is not used:
+ * UCNV_MAX_CONVERTER_NAME_LENGTH (60) bytes hold every name.
  *
- * Surprise: with detail tracing on, the converter's CCSID is asked for too, and a failure of that
- * is the result. */
+ * Status, as the result:
+ *   0  done
+ *   2  U_MISSING_RESOURCE_ERROR: ICU has no name for the converter
+ *   or ICU's failure to give one, or that of NLS2_MapCodepageIdToName
+ *
+ * Surprise: with detail tracing on, the converter's CCSID is queried too, and if that fails, its
+ * failure is the result. */
 NLS2_API int32_t NLS2_GetCodepageName(int32_t codepageId, char *nameBuffer, uint32_t bufferLength);
 
 /* The CCSID of a converter name, by ICU's rules for names (aliases, any case, null for the
- * process's default); 0 on failure. Where ICU has the converter but no CCSID for it,
- * NLS2_MapWindowsNameToCCSID is asked. *status: 0; ICU's when the converter does not open (4 for a
- * name it does not know); or NLS2_ERR_INVALID_PARAMETER where the converter has no number: that
- * failure leaks a converter. */
+ * process's default); 0 on failure. If ICU has the converter but no CCSID for it, the name is
+ * looked up by NLS2_MapWindowsNameToCCSID.
+ *
+ * Status:
+ *   0   done
+ *   4   U_FILE_ACCESS_ERROR: ICU does not know the name
+ *   37  NLS2_ERR_INVALID_PARAMETER: the converter has no number. This failure leaks a converter
+ *   or ICU's other failures to open the converter */
 NLS2_API uint32_t NLS2_GetCodepageId(const char *codepageName, int32_t *status);
 
 /* ---- Conversion ------------------------------------------------------------------------------ */
@@ -290,61 +332,73 @@ enum {
 /* Translates a field from one code page to another and, on request, shapes the output as a field.
  *
  *   destCodePage, sourceCodePage  not 0
- *   dest, destLen    output buffer and its size in bytes; 0 only with an empty source
+ *   dest, destLen      output buffer and its size in bytes; 0 only with an empty source
  *   source, sourceLen  input in bytes; negative: null-terminated
- *   pSourceConsumed  receives the bytes consumed with options 0 or TERMINATE alone, else 0
- *   options          0, or at least one of the bits above; other bits beside them are ignored
+ *   pSourceConsumed    receives the bytes consumed with options 0 or TERMINATE alone, else 0
+ *   options            0, or at least one of the bits above. Other bits are ignored beside a
+ *                      padding, but not beside TERMINATE alone (see 36)
  *
  * Options 0 and TERMINATE alone translate the source as it is. The result is the number of bytes
- * written, plus the terminator's (1; 2 for a page with a two-null terminator) where one was asked
- * for by TERMINATE or by a sourceLen of exactly -1, and had room. An output that fills dest to the
- * last byte is a success without a terminator. The terminator's second zero byte is stored without
- * a look at destLen: a two-null page needs a buffer of destLen + 1 bytes.
+ * written, plus the terminator's (1; 2 for a page with a two-null terminator) if one was requested
+ * by TERMINATE or by a sourceLen of exactly -1, and fitted. An output that fills dest to the last
+ * byte is a success without a terminator. The terminator's second zero byte is stored without a
+ * check of destLen: a two-null page needs a buffer of destLen + 1 bytes.
  *
  * With any other option the trailing blanks (u_isblank: tabs and all space separators) and nulls
  * are cut off, and so is everything from the first remaining null on; the rest, the text, must fit
  * in destLen less the terminator's 1 or 2 bytes. Then, by the option:
  *   STRIP_TRAILING  The text alone. The result is its length in UTF-16 units, not bytes, plus 1 or
- *                   2 with TERMINATE, which however stores no null of its own (ICU stores one zero
- *                   byte behind the text where there is room).
+ *                   2 with TERMINATE, which however stores no null itself (ICU stores one zero byte
+ *                   after the text if there is room).
  *   TRAILING        The text and as many U+0020 as the source had trailing blanks, as fit.
  *   FILL            The text and U+0020 up to destLen; wins over TRAILING.
  * TRAILING and FILL return destLen, whatever was written, and store the terminator at its end;
- * bytes between a shorter output and that end are as they were. destLen is compared with counts of
- * UTF-16 units there, which is right only while a blank is one byte. Into a page where it is not,
- * FILL clears the field's first byte and reports status 0 (1200, 57358, 57359), or fails with
- * status 1 (57360, 57361, 57368, 57369, 57372). So the two bytes 41 42 ("AB") from 819 to 57359
- * with destLen 10 give 00 00 42 00 20 00 20 00 20 00: the first letter is lost. Strip into such a
- * page, and append the blanks yourself.
+ * bytes between a shorter output and that end are as they were.
  *
- * Result: the count told above; 0 on failure and for an empty source. *pStatus:
+ * Surprise: TRAILING and FILL compare destLen with counts of UTF-16 units, which is right only for
+ * pages whose blank is one byte. Into other pages they lose letters with status 0. In UTF-16
+ * without a signature (1200, 1202, 13488, 57358, 57359 and other such CCSIDs) the first byte of the
+ * field, or of a later unit, becomes zero as soon as blanks have to be dropped to fit; FILL always
+ * drops some. Into 57359 from 819:
+ *   "AB", FILL, destLen 10                     00 00 42 00 20 00 20 00 20 00
+ *   "ABCD" and 4 blanks, TRAILING, destLen 8   00 00 42 00 43 00 44 00
+ *   "AB" and 3 blanks, TRAILING, destLen 6     41 00 00 00 20 00
+ * Into UTF-32 and pages with a signature (57360, 57361, 57368, 57369, 57372, and CCSIDs such as
+ * 1204 and 1232) FILL fails with status 1 for any text. Strip into such pages, and append the
+ * blanks yourself.
+ *
+ * Result: the count described above; 0 on failure and for an empty source.
+ *
+ * Status:
  *   0   done, or sourceLen 0 (nothing is written); ICU's warnings count as 0
  *   15  U_BUFFER_OVERFLOW_ERROR: dest is too small for the text; partial output with options 0 or
- *       TERMINATE alone, and where blanks could not be made to fit
+ *       TERMINATE alone, and if blanks could not be made to fit
  *   32  NLS2_ERR_NO_MEMORY: no work buffer of 2 * max(destLen, UTF-16 units of the source) + 2
  *       bytes
  *   36  NLS2_ERR_INVALID_OPTION: TERMINATE with other bits, but none of the three paddings. This
  *       failure leaks the work buffer and two converters
  *   37  NLS2_ERR_INVALID_PARAMETER: options without an accepted bit, destLen negative, destLen 0
  *       with a source, or a code page 0
- *   other  ICU's failure to open a converter (4: unknown page) or to convert; partial output
- * Bytes that do not convert are no failure: ICU's default callbacks put the target page's
- * substitution character for them. */
+ *   or ICU's failure to open a converter (4: unknown page) or to convert; partial output
+ * Bytes that do not convert are not a failure: ICU's default callbacks replace them with the target
+ * page's substitution character. */
 NLS2_API int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t destLen,
                                       int32_t sourceCodePage, const char *source, int32_t sourceLen,
                                       int32_t *pSourceConsumed, uint32_t options, int32_t *pStatus);
 
-/* What the six functions below share. pLocale is a live object, whose code page is the other end of
+/* Common to the six functions below. pLocale is a live object, whose code page is the other end of
  * the conversion. A length of -1 means null-terminated input. The result is the output's length,
- * without the terminator that ICU adds where there is room; 0 on failure. Bytes or characters that
- * do not convert are replaced by ICU's substitutes and are no failure. *status is one of these:
+ * without the terminator that ICU adds if there is room; 0 on failure. Bytes or characters that do
+ * not convert are replaced by ICU's substitutes and are not a failure.
  *
+ * Status:
  *   0   done
- *   15  U_BUFFER_OVERFLOW_ERROR: the output is too small; partial output. The length needed is not
- *       told
+ *   1   U_ILLEGAL_ARGUMENT_ERROR: a bad length
+ *   4   U_FILE_ACCESS_ERROR: the code page does not open
+ *   15  U_BUFFER_OVERFLOW_ERROR: the output is too small; partial output. The required length is
+ *       not reported
  *   38  NLS2_ERR_INVALID_LOCALE
- *
- * or ICU's failure: 1 for a bad length, 4 for a code page that does not open. */
+ *   or ICU's other failures */
 
 /* Code page to UTF-8. sourceLength and targetLength in bytes. */
 NLS2_API int32_t NLS2_toUTF8(const NLS2_Locale *pLocale, const char *pSource, int32_t sourceLength,
@@ -352,8 +406,8 @@ NLS2_API int32_t NLS2_toUTF8(const NLS2_Locale *pLocale, const char *pSource, in
 
 /* UTF-8 to code page. Lengths in bytes.
  *
- * Surprises: the output comes before the input; *status is set on failure only, so preset it to 0.
- */
+ * Surprises: the output comes before the input; the status is stored on failure only, so preset it
+ * to 0. */
 NLS2_API int32_t NLS2_fromUTF8(const NLS2_Locale *pLocale, char *pTarget, int32_t targetLength,
                                const char *pSource, int32_t sourceLength, int32_t *status);
 
@@ -371,16 +425,15 @@ NLS2_API int32_t NLS2_fromUTF16(const NLS2_Locale *pLocale, const UChar *pSource
                                 int32_t *status);
 
 /* Code page to UTF-8, in place. The number of the code page goes to ICU as a CCSID: the private
- * numbers fail (4), and 874, 932, 936, 949 and 950 are other tables than NLS2_MapCodepageIdToName
- * opens. dlen and slen in bytes; slen may not be -1.
+ * numbers and 936 fail (4), and 874, 932, 949 and 950 are other tables than
+ * NLS2_MapCodepageIdToName opens. dlen and slen are in bytes; slen may not be -1.
  *
- * Surprises: the output is written from src on, over the input, and may go on to dest + dlen. Of
- * dest and dlen only that sum counts: it must be an end, at or behind src, within the buffer that
- * holds src. The layout to use is dest == src and dlen the buffer's size. Text that grows is sound
- * up to 1,024 UTF-16 units; beyond that the output can overtake the input, and the result is
- * garbled at status 0. The return value is the output's end minus the input's end, so -2 where two
- * bytes fewer were written, and no length. Use NLS2_toUTF8. Other *status: 1
- * (U_ILLEGAL_ARGUMENT_ERROR) for a negative slen and where dest + dlen lies before src. */
+ * Surprises: the output is written from src on, over the input. Only dest + dlen is used, as the
+ * output's limit; it must lie in src's buffer, at or after src. The layout to use is dest == src
+ * and dlen the buffer's size. Text that grows is sound up to 1,024 UTF-16 units; beyond that the
+ * output can overtake the input, and the result is garbled at status 0. The return value is not a
+ * length but the output's end minus the input's end: -2 if two bytes fewer were written. Status 1
+ * (U_ILLEGAL_ARGUMENT_ERROR) also if dest + dlen lies before src. Use NLS2_toUTF8. */
 NLS2_API int32_t NLS2_StringToUnicode(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
                                       const char *src, int32_t slen, int32_t *status);
 
@@ -391,28 +444,35 @@ NLS2_API int32_t NLS2_UnicodeToString(const NLS2_Locale *pLocale, char *dest, in
 /* ---- Lengths --------------------------------------------------------------------------------- */
 
 /* How many bytes of the destination's code page to reserve for a byte of the source's, from ICU's
- * largest character sizes D and S (ucnv_getMaxCharSize): 1 for one and the same page, D where S
+ * largest character sizes D and S (ucnv_getMaxCharSize): 1 if both pages are the same, D if S
  * divides D, else the least multiple of S above D. Usually too large, but signatures and shifts
- * back to the initial state come on top: U+00D7 from 819 to 930 is 4 bytes, the ratio 3. *pStatus:
- * 0; NLS2_ERR_INVALID_LOCALE (result 0); or ICU's for a code page that does not open (result 1, not
- * 0). */
+ * back to the initial state come on top: U+00D7 from 819 to 930 is 4 bytes, the ratio 3.
+ *
+ * Status:
+ *   0   done
+ *   38  NLS2_ERR_INVALID_LOCALE; the result is 0
+ *   or ICU's for a code page that does not open; the result is 1, not 0 */
 NLS2_API int32_t NLS2_ConversionRatio(const NLS2_Locale *pDestinationLocale,
                                       const NLS2_Locale *pSourceLocale, int32_t *pStatus);
 
 /* The UTF-16 units of a null-terminated string in the object's code page, up to its first null
- * character. `ignored` is not read. 0 on failure. The code page goes to ICU as a CCSID, so the
- * private numbers fail. *pStatus: NLS2_ERR_INVALID_LOCALE; NLS2_ERR_NO_MEMORY; or ICU's. On success
- * it is not set: preset it to 0. */
+ * character; 0 on failure. `ignored` is not read. The code page goes to ICU as a CCSID, so the
+ * private numbers fail.
+ *
+ * Status, stored on failure only, so preset it to 0:
+ *   32  NLS2_ERR_NO_MEMORY
+ *   38  NLS2_ERR_INVALID_LOCALE
+ *   or ICU's */
 NLS2_API int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t ignored,
                              int32_t *pStatus);
 
-/* The bytes of a UTF-8 character, 1 to 4, told by its first byte alone, whatever the object's code
- * page. A byte that is no lead byte counts 1, C0 and C1 count 2; what follows is neither read nor
- * checked. *pStatus: 0 or NLS2_ERR_INVALID_LOCALE (result 0). */
+/* The bytes of a UTF-8 character, 1 to 4, determined by its first byte alone, whatever the object's
+ * code page. Any byte that is not a lead byte counts as 1, C0 and C1 as 2; what follows is neither
+ * read nor checked. Status: 0, or NLS2_ERR_INVALID_LOCALE (result 0). */
 NLS2_API int32_t NLS2_ByteLength(const NLS2_Locale *pLocale, const char *pCharacter,
                                  int32_t *pStatus);
 
-/* Reserved: always 0, nothing is read. */
+/* Reserved: the result is always 0, and nothing is read. */
 NLS2_API double NLS2_StringToDouble(const void *ignored1, const void *ignored2);
 
 /* ---- Comparison, search and case ------------------------------------------------------------- */
@@ -427,15 +487,21 @@ enum {
  * (case and accents count, punctuation too). Lengths are in bytes, signed 16-bit; -1 means
  * null-terminated.
  *
- * Result: -1 when string 1 sorts first, 1 when string 2 does, 0 when they are equal, and 0 on every
- * failure. *pStatus: 0; NLS2_ERR_INVALID_LOCALE; NLS2_ERR_NO_MEMORY; or ICU's, 1 for a length below
- * -1.
+ * Result: -1 if string 1 sorts first, 1 if string 2 does, 0 if they are equal, and 0 on every
+ * failure.
  *
- * With CHARBASED a negative length means null-terminated, and a character that begins before a
- * given length counts whole. Warnings: the walk believes lead bytes, whatever the code page; one
- * just before the end of a string takes it past the terminator or the given length, so the bytes
- * there must be readable. A walked length wraps at 16 bits: 32,768 to 65,534 bytes fail with status
- * 1, 65,535 compare whole, 65,536 as an empty string, and so on round. */
+ * Status:
+ *   0   done
+ *   1   U_ILLEGAL_ARGUMENT_ERROR: a length below -1
+ *   32  NLS2_ERR_NO_MEMORY
+ *   38  NLS2_ERR_INVALID_LOCALE
+ *   or ICU's other failures
+ *
+ * With CHARBASED a negative length means null-terminated, and a character that starts before the
+ * given length is counted in full. Warning: lead bytes are trusted, whatever the code page. One
+ * just before the end of a string leads past the terminator or the given length, so the bytes there
+ * must be readable. A counted length wraps at 16 bits: 32,768 to 65,534 bytes fail with status 1,
+ * 65,535 compare in full, 65,536 as an empty string, and so on. */
 NLS2_API int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t String1Length,
                               const char *pString2, int16_t String2Length, uint32_t options,
                               int32_t *pStatus);
@@ -447,7 +513,7 @@ enum { IGNORECASE = 0x40 /* lower-case both strings by the language's rules firs
  * (u_strstr). Lengths in bytes. Both end at their first null character; an empty string 2 occurs
  * everywhere.
  *
- * Result: 1 when it does, 0 when not, -1 on any failure: no live object, a code page that does not
+ * Result: 1 if it does, 0 if not, -1 on any failure: no live object, a code page that does not
  * open, bad lengths, no memory.
  *
  * Surprises: with IGNORECASE a string that grows in lower case ("\u0130" outside Turkish) is a
@@ -458,49 +524,55 @@ NLS2_API int32_t NLS2_Findstr(const NLS2_Locale *pLocale, const char *pString1, 
 /* Options of NLS2_MapString; exactly one. */
 enum { NLS2_MAP_FOLDCASE = 0x10, NLS2_MAP_UPPERCASE = 0x400, NLS2_MAP_LOWERCASE = 0x800 };
 
-/* Reserved for case mapping, and of no use for it: every text of one character or more ends with 15
- * (U_BUFFER_OVERFLOW_ERROR) and an untouched dest, whatever the options. Only an empty src, which
- * must be null-terminated (slen is traced only), is mapped, into two null characters of the code
- * page, behind a signature where the page writes one. ICU adds a zero byte where dest has room.
+/* Meant for case mapping, but unusable: every text of one character or more fails with 15
+ * (U_BUFFER_OVERFLOW_ERROR) and leaves dest as it was, whatever the options. Only an empty src is
+ * mapped; it must be null-terminated, and slen is only traced. It becomes two null characters of
+ * the code page, after a signature if the page writes one. ICU adds a zero byte if dest has room.
  *
- * Result: the bytes written without that one (2 for 819, 4 for 1200, 6 for 1204), or a status: 15;
- * NLS2_ERR_INVALID_LOCALE; NLS2_ERR_NO_MEMORY; or ICU's, 4 for a code page that as a CCSID does not
- * open, 15 where dlen is too small (partial output). Lengths and statuses share the numbers. On a
- * big-endian 16-bit page any ASCII text is empty, for its first byte is zero. */
+ * Result: the bytes written without that one (2 for 819, 4 for 1200, 6 for 1204), or a status.
+ * Lengths and statuses share the numbers:
+ *   4   U_FILE_ACCESS_ERROR: the code page does not open as a CCSID
+ *   15  U_BUFFER_OVERFLOW_ERROR: as above, or dlen is too small (partial output)
+ *   32  NLS2_ERR_NO_MEMORY
+ *   38  NLS2_ERR_INVALID_LOCALE
+ *   or ICU's other failures
+ * On a big-endian 16-bit page any ASCII text is empty, since its first byte is zero. */
 NLS2_API int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
                                 const char *src, int32_t slen, uint32_t options);
 
 /* ---- Streams --------------------------------------------------------------------------------- */
 
-/* ICU's file streams (<unicode/ustdio.h>). The caller's side is UTF-16, in units; the file's side
- * is the encoding named at the opening. pLocale must be live and has no other effect: no stream
+/* ICU's file streams (<unicode/ustdio.h>). Callers write and read UTF-16, in units; the file is in
+ * the encoding that NLS2_OpenStream names. pLocale must be live and has no other effect: no stream
  * uses its code page or its name. A stream belongs to one thread at a time.
  *
- * Surprises. None of these functions tells of a failing read or write: a write to a full disk
- * returns its full count, and a directory opens for reading and reads as empty; ferror() on
- * u_fgetfile() tells. Bytes that do not convert become U+FFFD or U+001A, and characters that the
- * file's encoding lacks become its substitution character. A null stream makes ICU crash, except in
+ * Surprises. None of these functions reports read or write errors; use ferror(u_fgetfile(stream)).
+ * A write to a full disk returns its full count, and a directory opens for reading and reads as
+ * empty. Bytes that do not convert become U+FFFD or U+001A, and characters that the file's encoding
+ * lacks become its substitution character. A null stream makes ICU crash, except in
  * NLS2_CloseStream. */
 
 /* Opens a file.
  *
- *   filename     a path, handed to the system as it is
+ *   filename     a path, passed to the system as it is
  *   permissions  as for fopen: "r", "w", "a", with "+" to write and read
- *   encoding     a converter name of ICU's; null for the process's default code page
+ *   encoding     one of ICU's converter names; null for the process's default code page
  *
- * Result: the stream, to be closed by NLS2_CloseStream; null for a locale that is not live (the
- * file is not touched), a file or mode that does not open and an encoding that ICU does not know.
+ * Result: the stream, which NLS2_CloseStream closes; null for a locale that is not live (the file
+ * is not touched), a file or mode that does not open, and an encoding that ICU does not know.
  *
  * Surprises: the file is opened before the encoding is looked up, so a "w" with a misspelt encoding
- * returns null and leaves an empty file, whatever was in it. "UTF-16" writes a byte-order mark and
- * reads with or without one (then big-endian); "UTF-16LE", "UTF-16BE" and "UTF-8" write none, and
- * read one as the unit U+FEFF. A stream with an empty encoding has no converter and loses all but
- * ASCII. */
+ * returns null and leaves an empty file, whatever was in it. "UTF-16" writes a byte-order mark, a
+ * second one in the middle of the file with mode "a", and reads with or without one (then
+ * big-endian); "UTF-16LE", "UTF-16BE" and "UTF-8" write none, and read one as the unit U+FEFF. With
+ * an empty encoding there is no converter: a character outside ICU's invariant set, such as
+ * @ # $ [ ~ ! | and all beyond ASCII, is written as a zero byte, and a byte is read as the
+ * character with its number (E4 as U+00E4). */
 NLS2_API struct UFILE *NLS2_OpenStream(const NLS2_Locale *pLocale, const char *filename,
                                        const char *permissions, const char *encoding);
 
-/* Writes what is buffered and closes the stream; does nothing for a null one. Status as the result:
- * 0, or NLS2_ERR_INVALID_LOCALE, which leaves the stream open. */
+/* Writes what is buffered and closes the stream; does nothing for null. Status, as the result: 0,
+ * or NLS2_ERR_INVALID_LOCALE, which leaves the stream open. */
 NLS2_API int32_t NLS2_CloseStream(const NLS2_Locale *pLocale, struct UFILE *file);
 
 /* Writes `len` units (negative: a null-terminated text). Result: the units written; 0 for a locale
@@ -512,8 +584,8 @@ NLS2_API int32_t NLS2_WriteString(const NLS2_Locale *pLocale, const UChar *pSour
  * `len` only at the end of the file; 0 there and for a locale that is not live. A surrogate pair
  * may be cut between two reads.
  *
- * Warning: the stream stands second here and in NLS2_Fgets, last in the two that write. A negative
- * len is undefined behaviour. */
+ * Warning: the stream is the second argument here and in NLS2_Fgets, the last in the two functions
+ * that write. A negative len is undefined behaviour. */
 NLS2_API int32_t NLS2_ReadString(const NLS2_Locale *pLocale, struct UFILE *fileHandle, UChar *pDest,
                                  int32_t len);
 
@@ -522,33 +594,33 @@ NLS2_API int32_t NLS2_ReadString(const NLS2_Locale *pLocale, struct UFILE *fileH
 NLS2_API int32_t NLS2_Fputs(const NLS2_Locale *pLocale, const UChar *pString,
                             struct UFILE *fileHandle);
 
-/* Reads one line with its end, at most len - 1 units, and stores a terminator behind it.
+/* Reads one line with its end, at most len - 1 units, and stores a terminator after it.
  *
  * A line ends in U+000A, U+000B, U+000C, U+000D (with a U+000A that follows), U+0085, U+2028 or
  * U+2029. pDest needs room for `len` units, and is traced as it is before the call.
  *
  * Result: pDest; null at the end of the file, with a len below 1, and for a locale that is not
- * live. A len of 1 gives an empty text at every call. A null inside a line cannot be told from the
- * terminator: NLS2_ReadString counts. */
+ * live. A len of 1 gives an empty text until the end of the file. A null inside a line looks like
+ * the terminator: use NLS2_ReadString, which counts. */
 NLS2_API UChar *NLS2_Fgets(const NLS2_Locale *pLocale, struct UFILE *fileHandle, UChar *pDest,
                            int32_t len);
 
-/* Hands the file what is buffered, and ends a shift sequence that the encoding has open. */
+/* Writes what is buffered to the file, and ends a shift sequence that the encoding has open. */
 NLS2_API void NLS2_Fflush(struct UFILE *fileHandle);
 
-/* Flushes, and goes back to the file's beginning. */
+/* Flushes, and returns to the beginning of the file. */
 NLS2_API void NLS2_Frewind(struct UFILE *fileHandle);
 
 /* The Unicode encoding whose signature (byte-order mark) a text begins with.
  *
- *   source, sourceLength  the text's first bytes; -1: null-terminated
- *   pSignatureLength      receives the signature's length in bytes; 0 where there is none
+ *   source, sourceLength  the text's first bytes, of which five are enough; -1: null-terminated
+ *   pSignatureLength      receives the signature's length in bytes; 0 if there is none
  *
  * Result: ICU's name of the encoding ("UTF-8", "UTF-16LE", "UTF-32BE", "SCSU" ...), a static text;
- * null where there is none. *pStatus: 0; or ICU's, 1 (U_ILLEGAL_ARGUMENT_ERROR) for a null source
- * or a length below -1. Five bytes of the text are enough.
+ * null if there is none. Status: 0; or ICU's, 1 (U_ILLEGAL_ARGUMENT_ERROR) for a null source or a
+ * length below -1.
  *
- * Surprise: FF FE 00 00 is UTF-32LE, even where it begins a text in UTF-16LE. */
+ * Surprise: FF FE 00 00 is UTF-32LE, even if it begins a text in UTF-16LE. */
 NLS2_API const char *NLS2_detectUnicodeSignature(const char *source, int32_t sourceLength,
                                                  int32_t *pSignatureLength, int32_t *pStatus);
 
@@ -556,37 +628,46 @@ NLS2_API const char *NLS2_detectUnicodeSignature(const char *source, int32_t sou
 
 /* Opens ICU's resource bundle (<unicode/ures.h>) for an object's locale name.
  *
- *   packageName  the data's package or path, as ures_open takes it: a directory of .res files, or
+ *   packageName  the data's package or path, as for ures_open: a directory of .res files, or
  *                one and a basename; null for ICU's own data
  *
- * Result: the bundle, to be closed by NLS2_ResourceClose; null on failure. *pStatus: 0; a warning
- * of ICU's where another bundle stands in, -128 (U_USING_FALLBACK_WARNING) for one of a parent of
- * the locale, -127 (U_USING_DEFAULT_WARNING) for that of the process's default locale or the root
- * bundle; NLS2_ERR_INVALID_LOCALE; or ICU's failure, 2 (U_MISSING_RESOURCE_ERROR) where there is no
- * bundle at all.
+ * Result: the bundle, which NLS2_ResourceClose closes; null on failure.
+ *
+ * Status:
+ *   0     done
+ *   -128  U_USING_FALLBACK_WARNING: the bundle is that of a parent of the locale
+ *   -127  U_USING_DEFAULT_WARNING: it is that of the process's default locale, or the root bundle
+ *   2     U_MISSING_RESOURCE_ERROR: there is no bundle at all
+ *   38    NLS2_ERR_INVALID_LOCALE
+ *   or ICU's other failures
  *
  * Surprise: for a language without a bundle the process's default locale comes before the root. */
 NLS2_API struct UResourceBundle *NLS2_ResourceOpen(const char *packageName,
                                                    const NLS2_Locale *pLocale, int32_t *pStatus);
 
-/* Closes a bundle; the strings that came from it end with it. */
+/* Closes a bundle. The strings that came from it are no longer valid. */
 NLS2_API void NLS2_ResourceClose(struct UResourceBundle *bundle);
 
 /* The string that a bundle, or a parent of it, holds under a key.
  *
  * Result: the string in UTF-16, whatever the code page of the locale object; it is null-terminated,
  * belongs to the bundle and is valid until the bundle is closed. Null on failure. *pLength: its
- * length in units. *pStatus: 0; -128 or -127 (as above) where a parent or the root bundle gave it;
- * or ICU's failure: 2 (U_MISSING_RESOURCE_ERROR) for a key that none of them has, 17
- * (U_RESOURCE_TYPE_MISMATCH) where it names no string, 1 (U_ILLEGAL_ARGUMENT_ERROR) for a null
- * bundle. */
+ * length in units.
+ *
+ * Status:
+ *   0           done
+ *   -128, -127  a parent or the root bundle had it, as above
+ *   1           U_ILLEGAL_ARGUMENT_ERROR: the bundle is null
+ *   2           U_MISSING_RESOURCE_ERROR: none of them has the key
+ *   17          U_RESOURCE_TYPE_MISMATCH: the key's value is not a string
+ *   or ICU's other failures */
 NLS2_API const UChar *NLS2_GetStringByKey(const struct UResourceBundle *bundle, const char *key,
                                           int32_t *pLength, int32_t *pStatus);
 
 /* ---- Build stamp ----------------------------------------------------------------------------- */
 
-/* How the library was built: compiler and version, options, build host and date, one static line.
- * A reproducible build (SOURCE_DATE_EPOCH set) names no host. */
+/* How the library was built: its version, compiler, options, build host and date, in one static
+ * line. A reproducible build (SOURCE_DATE_EPOCH set) names no host. */
 NLS2_API const char *NLS2_BuildStamp(void);
 
 #ifdef __cplusplus

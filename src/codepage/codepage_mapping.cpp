@@ -1,4 +1,5 @@
-// NLS2_MapCodepageIdToName: the one place where a code page number becomes an ICU converter.
+// NLS2_MapCodepageIdToName: the one place where a code page number becomes an ICU converter. The
+// work is in the header, which is compiled into its hot callers.
 
 #include "codepage/codepage_mapping.h"
 

@@ -14,11 +14,12 @@ using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
-// Where a converter has no CCSID and its name no record, callers have always been left with the
-// converter open; it stays so, since a probe of theirs that counts converters knows it.
+// If a converter has no CCSID and its name no record, the converter has always been leaked; callers
+// that count converters rely on it.
 void leaveOpen(icu::LocalUConverterPointer &converter) { converter.orphan(); }
 
-// Asked only under detail tracing, where a failure ends the query: tracing can change its result.
+// Called only under detail tracing. A failure then ends the query, so tracing can change its
+// result.
 UErrorCode traceCcsid(Trace trace, const UConverter *converter) {
   UErrorCode error = U_ZERO_ERROR;
   const int32_t ccsid = ucnv_getCCSID(converter, &error);
@@ -54,8 +55,8 @@ int32_t NLS2_GetCodepageName(int32_t codepageId, char *nameBuffer, uint32_t /*bu
     NLS2_TRACE(frame, "Converter codepage name not found.");
     return frame.result(int32_t{failed(error) ? error : U_MISSING_RESOURCE_ERROR});
   }
-  // Most names live in ICU's shared data, but that of 57365 lives in the converter and goes with
-  // it.
+  // Most names live in ICU's shared data, but that of 57365 lives in the converter and is
+  // freed with it.
   char text[UCNV_MAX_CONVERTER_NAME_LENGTH] = {};
   std::strncpy(text, name, sizeof text - 1);
   NLS2_TRACE(frame, "Codepage name %s found.", text);

@@ -8,7 +8,7 @@
 
 namespace nls2::codepage {
 
-// Through the names that NLS2_MapCodepageIdToName knows; nobody here asks for the two-null flag.
+// Through the names that NLS2_MapCodepageIdToName knows; the two-null flag is not needed here.
 inline UConverter *openMapped(const NLS2_Locale *pLocale, int32_t *status) {
   int32_t twoNull = 0;
   return mapCodepageIdToName(static_cast<int32_t>(pLocale->codepage), &twoNull, status);

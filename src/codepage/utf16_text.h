@@ -18,7 +18,7 @@ struct Utf16Text {
   uint64_t size() const { return (static_cast<uint64_t>(length) + 1) * sizeof(UChar); }
 };
 
-// The first pass: sets the length. Want of room is what a first pass is for and no failure.
+// The first pass: sets the length. An overflow is expected here and is not a failure.
 inline UErrorCode measure(Utf16Text &text, UConverter *converter, const char *source,
                           int32_t sourceLength) {
   UErrorCode error = U_ZERO_ERROR;
@@ -26,7 +26,7 @@ inline UErrorCode measure(Utf16Text &text, UConverter *converter, const char *so
   return error == U_BUFFER_OVERFLOW_ERROR ? U_ZERO_ERROR : error;
 }
 
-// Between the passes; false without memory. The block is not cleared.
+// Call between the passes. False when out of memory. The block is not cleared.
 inline bool allocate(Utf16Text &text, trace::Trace trace, uint32_t line = __builtin_LINE()) {
   text.units = trace::allocate<UChar>(trace, text.size(), line);
   return text.units != nullptr;

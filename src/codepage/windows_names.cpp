@@ -9,8 +9,8 @@
 static_assert(sizeof(CcsidMapEntry) == 136);
 static_assert(offsetof(CcsidMapEntry, ccsid) == 132);
 
-// A search takes the first record whose name occurs in the text looked up, so a name must not stand
-// behind one that it contains.
+// A search takes the first record whose name occurs in the text looked up, so a name must come
+// before any shorter name that it contains.
 constexpr CcsidMapEntry ccsidMap[NLS2_CCSID_MAP_RECORDS] = {
     {"windows-54936", 57371},
     {"windows-950", 950},

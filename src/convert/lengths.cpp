@@ -20,15 +20,14 @@ using nls2::codepage::openMapped;
 using nls2::trace::Frame;
 using nls2::trace::low32;
 
-// The destination's size itself where the source's divides it, else the next multiple of the
-// source's.
+// The destination's size if the source's divides it, else the next multiple of the source's.
 int32_t ratioOf(int32_t destSize, int32_t sourceSize) {
   const int32_t quotient = destSize / sourceSize;
   return destSize == quotient * sourceSize ? destSize : sourceSize * (quotient + 1);
 }
 
 // By the lead bytes of UTF-8 up to the last one of Unicode's range; C0 and C1 count as lead bytes,
-// and every byte that is none is a character of its own.
+// and any byte that is not a lead byte counts as one character.
 int32_t byteLengthOf(uint8_t first) {
   if (first < 0xC0 || first > 0xF4) {
     return 1;

@@ -62,7 +62,7 @@ void traceSource(Trace trace, const char *source, int32_t sourceLen) {
 }
 
 // The terminator's first null byte is ICU's; the second one of a two-null page is stored here,
-// without a look at the destination's size.
+// without a check of the destination's size.
 int32_t countTerminator(Trace trace, char *dest, int32_t amountWritten, bool twoNull) {
   if (twoNull) {
     dest[amountWritten + 1] = 0;

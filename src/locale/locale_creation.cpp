@@ -16,11 +16,11 @@ using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
-// Either of them keeps what the default locale gave the new object.
+// With either of them the new object keeps the defaults.
 constexpr uint32_t keepDefaultOptions = 0x2 | NLS2_LOCALE_DEFAULT;
 
-// A record is found by its id, or by a code page that stands in both its columns; whichever of the
-// two comes first in the table.
+// A record is found by its id, or by a code page that is in both its columns, whichever comes
+// first in the table.
 const LocaleMapEntry *findRequested(uint32_t languageId, uint32_t codepage) {
   return nls2::locale::findEntry([=](const LocaleMapEntry &entry) {
     return entry.languageId == languageId ||

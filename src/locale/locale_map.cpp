@@ -17,9 +17,9 @@ static_assert(offsetof(LocaleMapEntry, shortName) == 144);
 // A row: language id (country number, language number), ASCII and EBCDIC code page, locale name,
 // short name. The order is contractual, since every search walks from row 0 and takes the first
 // match, and so are the rows that look like slips; callers hold these ids and index this table:
-//   - Some names stand twice: es_ES (countries 222 and 724), nn_NO (languages 7 and 63). A search
+//   - Some names occur twice: es_ES (countries 222 and 724), nn_NO (languages 7 and 63). A search
 //     by name finds the first row, a search by id each.
-//   - Some ids stand twice: "de", "fr", "it", "pt", "ja" and "es" repeat their main country's,
+//   - Some ids occur twice: "de", "fr", "it", "pt", "ja" and "es" repeat their main country's,
 //     posix repeats en_US's, sv_FI has fi_FI's, zh_Hant has zh_HK's and zh_Hans has zh_CN's. A
 //     search by id finds the first row.
 //   - Countries that are not ISO 3166's: en_HK has Taiwan's, en_GB 86 (en_UK has 826), and fr_CH

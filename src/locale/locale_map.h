@@ -5,7 +5,7 @@
 
 namespace nls2::locale {
 
-// The first record for which `matches` is true, null where the terminator is reached first.
+// The first record for which `matches` is true; null if there is none before the terminator.
 template <class Matches>
 const LocaleMapEntry *findEntry(Matches matches) {
   for (const LocaleMapEntry *entry = localeMap; entry->languageId != NLS2_LANGUAGE_ID_END;

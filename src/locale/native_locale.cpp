@@ -81,7 +81,7 @@ NLS2_Locale *NLS2_ConvertNativeLocale(const void * /*pNativeLocale*/, uint32_t o
     return nullptr;
   }
   NLS2_TRACE(frame, "Setting the locale based on default.");
-  int32_t status = U_ZERO_ERROR; // not handed on: a failure shows as null with status 0
+  int32_t status = U_ZERO_ERROR; // not passed on: a failure shows as null with status 0
   NLS2_Locale *pLocale = NLS2_allocateLocale(&status);
   if (failed(status)) {
     NLS2_TRACE(frame, "Cannot allocate a locale structure. %d", status);

@@ -14,8 +14,8 @@ namespace {
 constexpr const char *usAscii = "US-ASCII";
 constexpr const char *usEbcdic = "ibm-37_P100-1995"; // ICU's canonical name of CCSID 37
 
-// Meant to tell an ASCII machine from an EBCDIC one, but "1" is 0x31 on the one and 0xF1 on the
-// other, never 0x19. Callers have come to rely on US EBCDIC.
+// Meant to distinguish an ASCII machine from an EBCDIC one, but "1" is 0x31 on the one and 0xF1
+// on the other, never 0x19. Callers have come to rely on US EBCDIC.
 const char *fallbackCodepageName(trace::Trace trace) {
   constexpr const char *probe = "1";
   NLS2_TRACE(trace, "ICU returned null codepage, Force it to be ASCII or EBCDIC.");

@@ -6,11 +6,11 @@
 
 namespace nls2::locale {
 
-// ICU's default locale name; null or empty where it has none.
+// ICU's default locale name; null or empty if it has none.
 const char *defaultLocaleName();
 
 // Looks up ICU's default converter name, or the fallback's, and stores its code page in the object,
-// whatever the look-up says. The result is NLS2_GetCodepageId's status.
+// even if the look-up fails. Returns NLS2_GetCodepageId's status.
 int32_t setDefaultCodepage(trace::Trace trace, NLS2_Locale *pLocale);
 
 } // namespace nls2::locale

@@ -28,7 +28,7 @@ void set(NLS2_Locale *&link, NLS2_Locale *object) {
 
 // Holds the list's lock, and thread cancellation back with it: a host's trace call may be a
 // cancellation point, and a cancelled thread runs no destructor of this library, which is built
-// without exceptions. The lock would stay held for good.
+// without exceptions. The lock would never be released.
 class ListLock {
 public:
   explicit ListLock(trace::Trace trace, const char *releaseLine)
@@ -51,7 +51,7 @@ private:
   int cancelState_ = 0;
 };
 
-// Where an object stands: `current` is the object, or null at the list's end.
+// Where an object is on the list: `current` is the object, or null at the list's end.
 struct Position {
   NLS2_Locale *previous;
   NLS2_Locale *current;
@@ -70,7 +70,7 @@ Position locate(trace::Trace trace, NLS2_Locale *head, const NLS2_Locale *object
   return at;
 }
 
-// The removed object keeps its own link, for walks that stand on it.
+// The removed object keeps its own link, for walks that have reached it.
 void unlink(trace::Trace trace, Position at) {
   NLS2_Locale *following = follow(at.current->pNext);
   if (at.current == follow(pLocaleObjectList)) {

@@ -10,7 +10,7 @@ namespace nls2::locale {
 // Links an object at the list's end.
 void append(trace::Trace trace, NLS2_Locale *object);
 
-// Unlinks and frees an object. Frees nothing where another thread was faster.
+// Unlinks and frees an object. Does nothing if another thread already removed it.
 void remove(trace::Trace trace, NLS2_Locale *object);
 
 // A link of the list. Links are read by walks that take no lock; that they are sequentially

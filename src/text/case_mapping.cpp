@@ -82,7 +82,7 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   if (failed(error)) {
     return frame.result(int32_t{error});
   }
-  // The output is the mapped text, its terminator and the unit behind that.
+  // The output is the mapped text, its terminator and the unit after that.
   mapped.length = text.length + 1;
   if (!nls2::codepage::allocate(mapped, frame)) {
     return frame.result(int32_t{NLS2_ERR_NO_MEMORY});

@@ -25,11 +25,11 @@ using nls2::trace::BoundedText;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
-// Which of the two strings a line speaks of.
+// Which of the two strings a line is about.
 enum class Which { first, second };
 
-// One more character of a walk: its size, asked for once for the step and once for the sum. Its
-// status is not looked at, since the object is known to be live.
+// Moves on by one character. NLS2_ByteLength is called twice because both calls are in the known
+// traces. Its status is ignored, since the object is known to be live.
 void walkOn(const NLS2_Locale *pLoc, const char *string, int64_t &offset, int64_t &sum) {
   int32_t ignored = U_ZERO_ERROR;
   const int32_t step = NLS2_ByteLength(pLoc, string + offset, &ignored);
@@ -37,8 +37,8 @@ void walkOn(const NLS2_Locale *pLoc, const char *string, int64_t &offset, int64_
   offset += step;
 }
 
-// The byte length by whole characters: to the null where `given` is negative, else to the first
-// character that ends at or behind `given`. It wraps at 16 bits.
+// The byte length in whole characters: up to the null if `given` is negative, else up to the end of
+// the first character that ends at or after `given`. It wraps at 16 bits.
 template <Which which>
 int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, int16_t given) {
   int64_t offset = 0;

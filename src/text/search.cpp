@@ -24,10 +24,10 @@ using nls2::trace::Trace;
 
 constexpr int32_t searchFailed = -1;
 
-// Which of the two strings a line speaks of.
+// Which of the two strings a line is about.
 enum class Which { first, second };
 
-// What a call holds. Release before a line or after it: callers' traces know which.
+// Everything a call owns. Known traces fix whether it is released before or after a line.
 struct Search {
   Trace trace;
   const NLS2_Locale *pLocale;
@@ -45,8 +45,8 @@ struct Search {
     converter.adoptInstead(nullptr);
   }
 
-  // Where string 2 cannot be measured or has no room, the first string's block has always been left
-  // behind, and callers' leak accounting knows it.
+  // If string 2 cannot be measured or allocated, the first string's block has always been leaked,
+  // and callers' leak accounting expects it.
   void releaseAllButText1() {
     converter.adoptInstead(nullptr);
     static_cast<void>(text1.units.release());

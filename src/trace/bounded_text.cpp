@@ -1,4 +1,4 @@
-// A text for a detail line, copied only where no null ends it.
+// A text for a detail line, copied only if no null ends it.
 
 #include "trace/bounded_text.h"
 
@@ -18,7 +18,7 @@ BoundedText::BoundedText(const char *bytes, int64_t byteLength) : text_(text(byt
   if (std::memchr(bytes, 0, length) != nullptr) {
     return;
   }
-  // Not from realloc_mem: a line that is printed must not trace lines of its own.
+  // Not from realloc_mem: printing a line must not produce further lines.
   char *copy = small_;
   if (length >= sizeof small_) {
     copy_.reset(static_cast<char *>(std::malloc(length + 1)));

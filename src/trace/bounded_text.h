@@ -10,7 +10,7 @@
 namespace nls2::trace {
 
 // What `%s` may read of a text that comes with a length: the bytes up to that length or to the
-// first zero byte, whichever comes first. A negative length stands for a null-terminated text; a
+// first zero byte, whichever comes first. A negative length means a null-terminated text; a
 // null pointer prints as "(null)". UTF-16 text prints as the bytes it consists of.
 //
 // Make it inside the NLS2_TRACE that prints it, where it lives as long as the call of the host and

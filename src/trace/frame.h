@@ -33,8 +33,8 @@ inline uint32_t exitValue(const void *pointer) { return low32(pointer); }
 inline uint32_t exitValue(uint32_t value) { return value; }
 inline uint32_t exitValue(int32_t value) { return static_cast<uint32_t>(value); }
 
-// Where the detail lines of one call go, if anywhere. Two words, to be handed on by value: a frame
-// whose address nobody takes stays in registers.
+// Where the detail lines of one call go, if anywhere. Two words. Pass it by value: as long as
+// the frame's address is not taken, it stays in registers.
 class Trace {
 public:
   Trace(TRC1_EntryBlock &anchor, uint32_t flags) : anchor_(&anchor), flags_(flags) {}
@@ -42,7 +42,7 @@ public:
   bool detail() const { return (flags_ & TRC1_FLAG_DETAIL) != 0; }
   TRC1_EntryBlock *anchor() const { return anchor_; }
 
-  // A detail line that takes no arguments and stands in a table.
+  // Prints a constant line. Unlike NLS2_TRACE it adds no newline: the text brings its own.
   void line(const char *text, uint32_t line = __builtin_LINE()) const {
     if (detail()) [[unlikely]] {
 #pragma GCC diagnostic push

@@ -16,7 +16,7 @@ struct FreeBlock {
 template <class Unit>
 using Block = std::unique_ptr<Unit[], FreeBlock>;
 
-// realloc(3), run in a trace frame of its own. A failure is reported under the calling function's
+// realloc(3) in its own trace frame. A failure is reported under the calling function's
 // anchor and line; the old block is then as it was. The name is the one that its trace events
 // carry.
 inline void *realloc_mem(TRC1_EntryBlock *caller, uint32_t line, void *old, uint32_t size) {

@@ -1,179 +1,130 @@
-// One run of nls2 after another, as cases/*.txt have them.
-//
-// A case begins with "== why". Behind it stand its lines: run, in, out, has (a fragment, in place
-// of out), err (a fragment; none: standard error is empty), exit, LC_ALL, file NAME BYTES (there
-// before), left NAME BYTES (there after, where not as before). Lines of in, out and has add up.
-// Escapes: \n \t \0 \xHH, \uHHHH and \UHHHHHHHH (units in the machine's byte order), \*COUNTc and
-// \*COUNT(TEXT) (that many times).
+// Runs of nls2, as the *.cases files of this folder have them (see support/case_file.h). Keys:
+//   run ARGUMENTS    of nls2, split at blanks; "" is an empty one
+//   shell LINE       in place of run: for sh, with nls2 in its path
+//   example WHERE    run is an example of the manual page
+//   in BYTES         standard input; several add up, as for out
+//   out BYTES        standard output, whole
+//   has BYTES        standard output, a part of it, in place of out
+//   err BYTES        standard error, a part of it; without any it is empty
+//   exit CODE        0 by default; negative: the signal that ends it
+//   LC_ALL NAME      the locale; en_US.UTF-8 by default
+//   file NAME BYTES  a file that is there before, and as it was afterwards
+//   left NAME BYTES  a file that is there afterwards; no others are
+//   gone NAME        a file that was there before and is not afterwards
 
+#include "support/case_file.h"
 #include "tool_runner.h"
 
-#include <algorithm>
 #include <cstdlib>
-#include <fstream>
+#include <filesystem>
 #include <gtest/gtest.h>
 #include <map>
-#include <sstream>
 
 namespace tools {
 
 namespace {
 
-template <typename Unit>
-void appendUnit(std::string &bytes, const std::string &hex) {
-  const Unit unit = static_cast<Unit>(std::stoul(hex, nullptr, 16));
-  bytes.append(reinterpret_cast<const char *>(&unit), sizeof unit);
-}
+using support::CaseLine;
 
-std::string bytesOf(const std::string &escaped);
+const std::vector<std::string> keys{"run", "shell", "example", "in",   "out",  "has",
+                                    "err", "exit",  "LC_ALL",  "file", "left", "gone"};
 
-// Appends what stands there, the count before it times.
-void repeat(std::istream &text, std::string &bytes) {
-  std::size_t count = 0;
-  text >> count;
-  std::string repeated(1, static_cast<char>(text.get()));
-  if (repeated == "(") {
-    std::getline(text, repeated, ')');
-    repeated = bytesOf(repeated);
-  }
-  for (; count > 0; --count) {
-    bytes += repeated;
-  }
-}
-
-// Appends what the escape at the stream stands for.
-void unescape(std::istream &text, std::string &bytes) {
-  const auto hex = [&](std::size_t digits) {
-    std::string found(digits, '\0');
-    text.read(found.data(), static_cast<std::streamsize>(digits));
-    return found;
-  };
-  switch (const char kind = static_cast<char>(text.get()); kind) {
-  case 'n':
-    return bytes.push_back('\n');
-  case 't':
-    return bytes.push_back('\t');
-  case '0':
-    return bytes.push_back('\0');
-  case 'x':
-    return appendUnit<uint8_t>(bytes, hex(2));
-  case 'u':
-    return appendUnit<uint16_t>(bytes, hex(4));
-  case 'U':
-    return appendUnit<uint32_t>(bytes, hex(8));
-  case '*':
-    return repeat(text, bytes);
-  default:
-    return bytes.push_back(kind);
-  }
-}
-
-std::string bytesOf(const std::string &escaped) {
-  std::istringstream text(escaped);
-  std::string bytes;
-  for (char c = 0; text.get(c);) {
-    c == '\\' ? unescape(text, bytes) : bytes.push_back(c);
-  }
-  return bytes;
-}
-
-struct Case {
-  std::string why;
-  std::string locale = "en_US.UTF-8";
-  std::string line;
+struct Run {
+  std::vector<std::string> arguments;
+  std::string shell;
   std::string input;
+  std::string locale = "en_US.UTF-8";
   int exitCode = 0;
   std::string out;
   std::vector<std::string> has;
-  std::string err;
-  std::map<std::string, std::string> files;
-  std::map<std::string, std::string> left;
+  std::vector<std::string> err;
+  std::map<std::string, std::string> before;
+  std::map<std::string, std::string> after;
+
+  void read(const CaseLine &line);
 };
 
-void read(Case &c, const std::string &key, const std::string &value) {
-  const std::size_t blank = std::min(value.find(' '), value.size() - 1);
-  const std::string name = bytesOf(value.substr(0, blank));
-  const std::string rest = value.substr(blank + 1);
-  if (key == "LC_ALL") {
-    c.locale = value;
-  } else if (key == "run") {
-    c.line = value;
-  } else if (key == "in") {
-    c.input += bytesOf(value);
-  } else if (key == "exit") {
-    c.exitCode = std::stoi(value);
-  } else if (key == "out") {
-    c.out += bytesOf(value);
-  } else if (key == "has") {
-    c.has.push_back(bytesOf(value));
-  } else if (key == "err") {
-    c.err = bytesOf(value);
-  } else if (key == "file" || key == "left") {
-    (key == "file" ? c.files : c.left)[name] = c.left[name] = bytesOf(rest);
-  } else {
-    ADD_FAILURE() << c.why << ": " << key;
+std::vector<std::string> argumentsOf(const CaseLine &line) {
+  std::vector<std::string> arguments;
+  for (const std::string &word : words(line.value)) {
+    arguments.push_back(word == "\"\"" ? "" : CaseLine{line.key, word, line.place}.bytes());
+  }
+  return arguments;
+}
+
+void Run::read(const CaseLine &line) {
+  if (line.key == "run") {
+    arguments = argumentsOf(line);
+  } else if (line.key == "shell") {
+    shell = line.value;
+  } else if (line.key == "in") {
+    input += line.bytes();
+  } else if (line.key == "out") {
+    out += line.bytes();
+  } else if (line.key == "has" || line.key == "err") {
+    (line.key == "has" ? has : err).push_back(line.bytes());
+  } else if (line.key == "exit") {
+    exitCode = static_cast<int>(line.number());
+  } else if (line.key == "LC_ALL") {
+    locale = line.value;
+  } else if (line.key == "gone") {
+    after.erase(line.value);
+  } else if (line.key == "file" || line.key == "left") {
+    const auto [escaped, bytes] = line.firstWord();
+    const std::string name = CaseLine{line.key, escaped, line.place}.bytes();
+    after[name] = bytes.bytes();
+    if (line.key == "file") {
+      before[name] = after[name];
+    }
   }
 }
 
-std::vector<Case> casesOf(const std::string &path) {
-  std::vector<Case> cases;
-  std::ifstream file(path);
-  for (std::string line; std::getline(file, line);) {
-    const std::size_t blank = line.find(' ');
-    if (line.empty() || line[0] == '#') {
-      continue;
-    }
-    if (line.starts_with("== ")) {
-      cases.emplace_back().why = line.substr(3);
-    } else {
-      read(cases.at(cases.size() - 1), line.substr(0, blank), line.substr(blank + 1));
-    }
+void expectParts(const std::vector<std::string> &parts, const std::string &text) {
+  for (const std::string &part : parts) {
+    EXPECT_NE(text.find(part), std::string::npos) << part << "\nis not in\n" << text;
   }
-  return cases;
 }
 
-void run(const Case &c) {
+void runCase(const support::Case &each) {
+  SCOPED_TRACE(each.place + ": " + each.why);
+  Run run;
+  for (const CaseLine &line : each.lines) {
+    run.read(line);
+  }
+  ASSERT_TRUE(run.out.empty() || run.has.empty()) << "out and has exclude each other";
   const TempDir dir;
-  for (const auto &[name, bytes] : c.files) {
+  for (const auto &[name, bytes] : run.before) {
     writeFile(dir.path(name), bytes);
   }
-  std::vector<std::string> arguments;
-  for (const std::string &word : words(c.line)) {
-    arguments.push_back(word == "\"\"" ? "" : bytesOf(word));
+  setenv("LC_ALL", run.locale.c_str(), 1);
+  const Result result = run.shell.empty() ? runTool(run.arguments, run.input, dir.path("."))
+                                          : runShell(run.shell, run.input, dir.path("."));
+  EXPECT_EQ(result.exitCode, run.exitCode) << result.err;
+  if (run.has.empty()) {
+    EXPECT_EQ(result.out, run.out);
   }
-  setenv("LC_ALL", c.locale.c_str(), 1);
-  const Result result = runTool(arguments, c.input, dir.path("."));
-  EXPECT_EQ(result.exitCode, c.exitCode) << result.err;
-  if (c.has.empty()) {
-    EXPECT_EQ(result.out, c.out);
-  }
-  for (const std::string &fragment : c.has) {
-    EXPECT_NE(result.out.find(fragment), std::string::npos) << fragment << "\n" << result.out;
-  }
-  EXPECT_EQ(result.err.empty(), c.err.empty()) << result.err;
-  EXPECT_NE(result.err.find(c.err), std::string::npos) << c.err << "\n" << result.err;
+  expectParts(run.has, result.out);
+  EXPECT_EQ(result.err.empty(), run.err.empty()) << result.err;
+  expectParts(run.err, result.err);
   std::map<std::string, std::string> left;
   for (const std::string &name : dir.names()) {
     left[name] = readFile(dir.path(name));
   }
-  EXPECT_EQ(left, c.left);
+  EXPECT_EQ(left, run.after);
 }
 
-class Cases : public testing::TestWithParam<const char *> {};
+class Cases : public testing::TestWithParam<std::string> {};
 
 TEST_P(Cases, AnswerAsTheFileHasThem) {
-  const std::vector<Case> cases = casesOf(std::string(TOOL_CASES "/") + GetParam() + ".txt");
-  EXPECT_FALSE(cases.empty());
-  for (const Case &c : cases) {
-    SCOPED_TRACE(c.why + ": " + c.line);
-    run(c);
+  for (const support::Case &each : support::readCases(GetParam(), keys)) {
+    runCase(each);
   }
 }
 
-INSTANTIATE_TEST_SUITE_P(Of, Cases,
-                         testing::Values("cat", "codepages", "compare", "detect", "find", "locales",
-                                         "sort", "translate", "usage"),
-                         [](const auto &file) { return std::string(file.param); });
+INSTANTIATE_TEST_SUITE_P(Of, Cases, testing::ValuesIn(support::caseFiles(TOOL_CASES)),
+                         [](const auto &file) {
+                           return std::filesystem::path(file.param).stem().string();
+                         });
 
 } // namespace
 

@@ -20,10 +20,10 @@ namespace tools {
 namespace {
 
 // Standard input is a pipe where `input` is a descriptor of one, else a file.
-pid_t spawn(const std::vector<std::string> &arguments, int inputPipe, const std::string &input,
+pid_t spawn(const std::vector<std::string> &command, int inputPipe, const std::string &input,
             const std::string &output, const std::string &error, const std::string &directory) {
-  std::vector<char *> argv{const_cast<char *>(NLS2_TOOL)};
-  for (const std::string &argument : arguments) {
+  std::vector<char *> argv;
+  for (const std::string &argument : command) {
     argv.push_back(const_cast<char *>(argument.c_str()));
   }
   argv.push_back(nullptr);
@@ -38,12 +38,18 @@ pid_t spawn(const std::vector<std::string> &arguments, int inputPipe, const std:
   posix_spawn_file_actions_addopen(&actions, 2, error.c_str(), O_WRONLY | O_CREAT, 0666);
   posix_spawn_file_actions_addchdir_np(&actions, directory.c_str());
   pid_t pid = -1;
-  const int failed = posix_spawn(&pid, NLS2_TOOL, &actions, nullptr, argv.data(), environ);
+  const int failed = posix_spawn(&pid, argv[0], &actions, nullptr, argv.data(), environ);
   posix_spawn_file_actions_destroy(&actions);
   if (failed != 0) {
-    throw std::runtime_error("cannot start " NLS2_TOOL);
+    throw std::runtime_error("cannot start " + command[0]);
   }
   return pid;
+}
+
+std::vector<std::string> toolCommand(const std::vector<std::string> &arguments) {
+  std::vector<std::string> command{NLS2_TOOL};
+  command.insert(command.end(), arguments.begin(), arguments.end());
+  return command;
 }
 
 int exitCodeOf(pid_t pid) {
@@ -88,13 +94,23 @@ std::vector<std::string> words(const std::string &line) {
   return {std::istream_iterator<std::string>(stream), {}};
 }
 
-Result runTool(const std::vector<std::string> &arguments, std::string_view input,
-               const std::string &directory) {
+static Result runCommand(const std::vector<std::string> &command, std::string_view input,
+                         const std::string &directory) {
   const TempDir dir;
   writeFile(dir.path("in"), input);
   const int code =
-      exitCodeOf(spawn(arguments, -1, dir.path("in"), dir.path("out"), dir.path("err"), directory));
+      exitCodeOf(spawn(command, -1, dir.path("in"), dir.path("out"), dir.path("err"), directory));
   return {code, readFile(dir.path("out")), readFile(dir.path("err"))};
+}
+
+Result runTool(const std::vector<std::string> &arguments, std::string_view input,
+               const std::string &directory) {
+  return runCommand(toolCommand(arguments), input, directory);
+}
+
+Result runShell(const std::string &line, std::string_view input, const std::string &directory) {
+  const std::string path = "PATH=" + std::filesystem::path(NLS2_TOOL).parent_path().string();
+  return runCommand({"/bin/sh", "-c", path + ":$PATH; " + line}, input, directory);
 }
 
 Result runTool(const std::string &line, std::string_view input, const std::string &directory) {
@@ -108,7 +124,7 @@ RunningTool::RunningTool(const std::vector<std::string> &arguments, const std::s
   if (pipe2(ends, O_CLOEXEC) != 0) {
     throw std::runtime_error("cannot make a pipe");
   }
-  pid_ = spawn(arguments, ends[0], "", outputPath, errorPath, ".");
+  pid_ = spawn(toolCommand(arguments), ends[0], "", outputPath, errorPath, ".");
   close(ends[0]);
   input_ = ends[1];
 }

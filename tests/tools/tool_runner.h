@@ -41,6 +41,9 @@ Result runTool(const std::vector<std::string> &arguments, std::string_view input
 Result runTool(const std::string &line, std::string_view input = "",
                const std::string &directory = ".");
 
+// The same for a line of sh, whose nls2 is the built one.
+Result runShell(const std::string &line, std::string_view input, const std::string &directory);
+
 // A nls2 that is running, its standard input a pipe from here.
 class RunningTool {
 public:

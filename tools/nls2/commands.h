@@ -1,18 +1,18 @@
-// The commands of nls2; each function adds one to the command line, with its options and its
-// action.
+// The commands of nls2: one function for each, and the list of them.
 #pragma once
 
-#include <CLI/CLI.hpp>
+#include "options.h"
 
 namespace nls2::tool {
 
-void addTranslateCommand(CLI::App &app);
-void addLocalesCommand(CLI::App &app);
-void addCodepagesCommand(CLI::App &app);
-void addDetectCommand(CLI::App &app);
-void addCatCommand(CLI::App &app);
-void addCompareCommand(CLI::App &app);
-void addSortCommand(CLI::App &app);
-void addFindCommand(CLI::App &app);
+Command catCommand();
+Command codepagesCommand();
+Command compareCommand();
+Command detectCommand();
+Command dumpCommand();
+Command findCommand();
+Command localesCommand();
+Command sortCommand();
+Command translateCommand();
 
 } // namespace nls2::tool

@@ -1,34 +1,52 @@
-// How a command gives up: with a message for standard error and an exit code.
+// How a command gives up: one exception, with an exit code and a message for standard error.
 #pragma once
 
+#include <cstdint>
+#include <fmt/core.h>
+#include <optional>
 #include <stdexcept>
+#include <string>
+#include <string_view>
+#include <utility>
 
 namespace nls2::tool {
 
-enum ExitCode : int {
-  exitDone = 0,
-  exitFailed = 1, // a record that cannot be translated, or input or output that fails
-  exitUsage = 2,  // the command line asks for something that cannot be
-  exitNo = 1,     // a command that answers a question: the answer is no
-  exitTrouble = 2 // such a command: whatever went wrong
+// Of a command that answers a question, 1 is "no", and a failure ends it with 2 as well.
+enum ExitCode : int { exitDone = 0, exitFailed = 1, exitUsage = 2 };
+
+// Ends a command. Code exitFailed becomes 2 where the command answers a question.
+class Error : public std::runtime_error {
+public:
+  Error(ExitCode code, const std::string &text) : std::runtime_error(text), code_(code) {}
+
+  ExitCode code() const noexcept { return code_; }
+
+private:
+  ExitCode code_;
 };
 
-struct Failure : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
+// What went wrong while the work was done: throw failure("...", ...).
+template <typename... Arguments>
+Error failure(fmt::format_string<Arguments...> format, Arguments &&...arguments) {
+  return {exitFailed, fmt::format(format, std::forward<Arguments>(arguments)...)};
+}
 
-struct UsageError : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
+// What the command line asks for cannot be: throw usageError("...", ...). main adds where to look.
+template <typename... Arguments>
+Error usageError(fmt::format_string<Arguments...> format, Arguments &&...arguments) {
+  return {exitUsage, fmt::format(format, std::forward<Arguments>(arguments)...)};
+}
 
-// What is a Failure elsewhere, in a command that answers a question.
-struct Trouble : std::runtime_error {
-  using std::runtime_error::runtime_error;
-};
+// Why a piece of the input cannot be used; nothing where it can.
+using Refusal = std::optional<std::string>;
 
-// A command that has told all it had to tell, and ended with this code.
-struct AlreadySaid {
-  ExitCode code;
-};
+// A status of the library or of ICU in words.
+std::string statusText(int32_t status);
+
+// A file name for a message: its control characters are escaped.
+std::string printable(std::string_view name);
+
+// A message of the command on standard error. Allocates nothing.
+void complain(const char *text) noexcept;
 
 } // namespace nls2::tool

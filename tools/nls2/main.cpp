@@ -1,21 +1,45 @@
 // nls2: the library's work on files, from the command line.
 
 #include "commands.h"
-#include "errors.h"
+#include "io/print.h"
+#include "near_names.h"
 #include "nls2.h"
 
+#include <algorithm>
+#include <array>
 #include <csignal>
+#include <cstdio>
 #include <fcntl.h>
-#include <fmt/core.h>
 #include <new>
+#include <string_view>
 #include <unistd.h>
+
+namespace nls2::tool {
 
 namespace {
 
-using namespace nls2::tool;
+constexpr std::array commands{
+    CommandEntry{"translate", "Translate fixed-length records to another code page", exitFailed,
+                 translateCommand},
+    CommandEntry{"locales", "List the locales that the library knows", exitFailed, localesCommand},
+    CommandEntry{"codepages", "List code pages by number and by Windows name", exitFailed,
+                 codepagesCommand},
+    CommandEntry{"detect", "Report the Unicode signatures of files", exitUsage, detectCommand},
+    CommandEntry{"dump", "Show a file in hex and as text of a code page", exitFailed, dumpCommand},
+    CommandEntry{"cat", "Write text files in any encoding to standard output as UTF-8", exitFailed,
+                 catCommand},
+    CommandEntry{"compare", "Compare two strings by the rules of a language", exitUsage,
+                 compareCommand},
+    CommandEntry{"sort", "Sort lines or fixed-length records by the rules of a language",
+                 exitFailed, sortCommand},
+    CommandEntry{"find", "Print the lines in which a text occurs", exitUsage, findCommand}};
 
-// A standard stream that the caller closed must not become a file opened here: its number is taken
-// by an open that can do nothing but fail on use.
+constexpr const char *generalNotes =
+    "Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of detect,\n"
+    "compare and find, which answer a question: 0 yes, 1 no, 2 trouble.\n";
+
+// A standard stream that the caller closed must not become a file opened here: its descriptor is
+// taken by an open file that can only fail.
 void occupyStandardStreams() {
   for (const int fd : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
     if (fcntl(fd, F_GETFD) < 0) {
@@ -24,62 +48,108 @@ void occupyStandardStreams() {
   }
 }
 
-// A reader that went away and a full file are write errors, reported like any other.
-void turnSignalsIntoErrors() {
-  std::signal(SIGPIPE, SIG_IGN);
-  std::signal(SIGXFSZ, SIG_IGN);
+const CommandEntry *commandNamed(std::string_view name) {
+  const auto found = std::find_if(commands.begin(), commands.end(),
+                                  [=](const CommandEntry &entry) { return name == entry.name; });
+  return found == commands.end() ? nullptr : &*found;
 }
 
-int complain(ExitCode code, const char *message) {
-  fmt::print(stderr, "nls2: {}\n", message);
-  return code;
+const CommandEntry &requireCommand(const std::string &name) {
+  if (const CommandEntry *entry = commandNamed(name)) {
+    return *entry;
+  }
+  std::vector<std::string> names{"help"};
+  for (const CommandEntry &entry : commands) {
+    names.emplace_back(entry.name);
+  }
+  throw usageError("unknown command {}{}", printable(name), didYouMean(nearNames(name, names)));
 }
 
-int run(CLI::App &app, int argc, char **argv) {
-  try {
-    app.parse(argc, argv);
+std::string generalHelp() {
+  std::string text = "Usage: nls2 COMMAND [OPTION]... [OPERAND]...\n"
+                     "National-language support from the command line.\n\n";
+  for (const CommandEntry &entry : commands) {
+    text += fmt::format("  {:<24} {}\n", entry.name, entry.summary);
+  }
+  text += fmt::format("  {:<24} {}\n", "help [COMMAND]", "Print this help, or that of a command");
+  text +=
+      fmt::format("  {:<24} {}\n", "-h, --help", "Print this help, or a command's after its name");
+  text += fmt::format("  {:<24} {}\n", "--version", "Print how the library was built");
+  return text + "\n" + generalNotes + "See nls2(1).\n";
+}
+
+int printVersion() {
+  print(std::string(NLS2_BuildStamp()) + "\n");
+  return exitDone;
+}
+
+// Options before the command, `nls2 help`, or nothing at all.
+int runWithoutCommand(int argc, char **argv) {
+  std::string topic;
+  const bool isHelp = argc > 1 && std::string_view(argv[1]) == "help";
+  Command general;
+  if (isHelp) {
+    general.operands.push_back({"COMMAND", "", into(topic)});
+  } else if (argc > 1 && argv[1][0] != '-') {
+    requireCommand(argv[1]);
+  }
+  const Request request = parse(general, isHelp ? argc - 1 : argc, isHelp ? argv + 1 : argv);
+  if (request == Request::version) {
+    return printVersion();
+  }
+  if (!isHelp && request == Request::work) {
+    throw usageError("COMMAND is missing");
+  }
+  if (topic.empty()) {
+    print(generalHelp());
+  } else {
+    const CommandEntry &entry = requireCommand(topic);
+    print(helpOf(entry, entry.make()));
+  }
+  return exitDone;
+}
+
+int runCommand(const CommandEntry &entry, int argc, char **argv) {
+  const Command command = entry.make();
+  switch (parse(command, argc, argv)) {
+  case Request::help:
+    print(helpOf(entry, command));
     return exitDone;
-  } catch (const CLI::ParseError &error) {
-    return app.exit(error) == 0 ? exitDone : exitUsage;
-  } catch (const AlreadySaid &outcome) {
-    return outcome.code;
-  } catch (const UsageError &error) {
-    return complain(exitUsage, error.what());
-  } catch (const Trouble &error) {
-    return complain(exitTrouble, error.what());
-  } catch (const Failure &error) {
-    return complain(exitFailed, error.what());
-  } catch (const std::bad_alloc &) {
-    return complain(exitFailed, "out of memory");
+  case Request::version:
+    return printVersion();
+  default:
+    return command.run();
   }
 }
 
-int runCommand(int argc, char **argv) {
-  CLI::App app{"National-language support from the command line.", "nls2"};
-  app.set_version_flag("--version", std::string(NLS2_BuildStamp()));
-  app.require_subcommand(1);
-  app.failure_message(CLI::FailureMessage::simple);
-  app.footer("Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of "
-             "detect, compare and find, which answer a question: 0 yes, 1 no, 2 trouble.");
-  addTranslateCommand(app);
-  addLocalesCommand(app);
-  addCodepagesCommand(app);
-  addDetectCommand(app);
-  addCatCommand(app);
-  addCompareCommand(app);
-  addSortCommand(app);
-  addFindCommand(app);
-  return run(app, argc, argv);
+// The one place where failures become messages and exit codes.
+int run(const CommandEntry *entry, int argc, char **argv) noexcept {
+  const int failureCode = entry != nullptr ? entry->failureCode : exitFailed;
+  try {
+    return entry != nullptr ? runCommand(*entry, argc - 1, argv + 1)
+                            : runWithoutCommand(argc, argv);
+  } catch (const Error &error) {
+    if (error.code() != exitUsage) {
+      complain(error.what());
+      return failureCode;
+    }
+    std::fprintf(stderr, "nls2: %s; see nls2%s%s --help\n", error.what(),
+                 entry != nullptr ? " " : "", entry != nullptr ? entry->name : "");
+    return exitUsage;
+  } catch (const std::bad_alloc &) {
+    complain("out of memory");
+  } catch (const std::exception &error) {
+    complain(error.what());
+  }
+  return failureCode;
 }
 
 } // namespace
 
+} // namespace nls2::tool
+
 int main(int argc, char **argv) {
-  occupyStandardStreams();
-  turnSignalsIntoErrors();
-  try {
-    return runCommand(argc, argv);
-  } catch (...) { // standard error itself fails
-    return exitFailed;
-  }
+  nls2::tool::occupyStandardStreams();
+  std::signal(SIGXFSZ, SIG_IGN); // a full file is a write error, reported like any other
+  return nls2::tool::run(argc > 1 ? nls2::tool::commandNamed(argv[1]) : nullptr, argc, argv);
 }

@@ -71,6 +71,15 @@ inline field_result problem_at(field_problem problem, std::span<const char> fiel
   return result;
 }
 
+// The bytes at which a conversion stopped because they are not valid.
+inline std::size_t invalid_length(UConverter *from) noexcept {
+  std::array<char, 8> bytes = {};
+  auto count = static_cast<std::int8_t>(bytes.size());
+  UErrorCode error = U_ZERO_ERROR;
+  ucnv_getInvalidChars(from, bytes.data(), &count, &error);
+  return failed(error) ? 0 : static_cast<std::size_t>(count);
+}
+
 // Decodes a field in small pieces and calls `use(unit, offset, next)` with every unit, the place of
 // its character's first byte and of the next character's, until it returns false. `consumed` are
 // the bytes read by then.
@@ -92,8 +101,10 @@ UErrorCode for_each_unit(UConverter *from, std::span<const char> field, std::siz
                    true, &error);
     const auto count = static_cast<std::size_t>(target - units.data());
     consumed = static_cast<std::size_t>(source - begin);
+    const bool stopped = failed(error) && error != U_BUFFER_OVERFLOW_ERROR;
+    const std::size_t valid = consumed - (stopped ? invalid_length(from) : 0);
     for (std::size_t i = 0; i < count; ++i) {
-      std::size_t next = consumed;
+      std::size_t next = valid;
       if (offsets[i] >= 0) { // -1: a unit left over from the piece before
         place = start + static_cast<std::size_t>(offsets[i]);
         const auto *after = std::find_if(offsets.data() + i, offsets.data() + count,
@@ -190,11 +201,7 @@ private:
   }
 
   void note_invalid_bytes(std::size_t consumed) noexcept {
-    std::array<char, 8> bytes = {};
-    auto count = static_cast<std::int8_t>(bytes.size());
-    UErrorCode error = U_ZERO_ERROR;
-    ucnv_getInvalidChars(from_, bytes.data(), &count, &error);
-    const std::size_t length = failed(error) ? 0 : static_cast<std::size_t>(count);
+    const std::size_t length = invalid_length(from_);
     found_ = problem_at(field_problem::invalid_bytes, field_, consumed - length, consumed);
   }
 

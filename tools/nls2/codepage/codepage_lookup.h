@@ -1,28 +1,39 @@
 // What the library and ICU make of one code page.
 #pragma once
 
-#include <array>
 #include <cstdint>
-#include <nlohmann/json.hpp>
+#include <optional>
 #include <string>
+#include <vector>
 
 namespace nls2::tool {
 
-// The numbers that nls2.h lists as opened by name; what they open, the library is asked.
-inline constexpr std::array<int32_t, 25> pagesWithNames{
-    874,   932,   936,   949,   950,   1200,  1208,  57352, 57355, 57356, 57357, 57358, 57359,
-    57360, 57361, 57362, 57363, 57365, 57366, 57367, 57368, 57369, 57370, 57371, 57372};
+struct PageFacts {
+  int32_t number = 0;
+  int32_t status = 0; // of opening it
+  bool hasTwoNulls = false;
+  // Nothing without a converter, or where it has none.
+  bool opens = false;
+  std::optional<std::string> converter;
+  std::optional<int32_t> ccsid;
+  std::optional<int32_t> maxCharSize;
+  std::vector<std::string> windowsNames;
+};
 
-// Whether the number opens, and as what. Fields that depend on a converter are null without one.
-nlohmann::ordered_json describeCodepage(int32_t number);
+struct NameFacts {
+  std::string name;
+  std::optional<std::string> converter; // nothing where ICU does not know the name
+};
 
-// The numbers that a name stands for, or the number given, and the names that people write for it;
-// `tablesDiffer` tells whether they open different tables of ICU's. Throws Failure where neither
-// the library nor ICU knows what was asked for.
-nlohmann::ordered_json lookUpCodepage(const std::string &asked);
-std::string foundCodepageAsText(const nlohmann::ordered_json &found);
+struct FoundPages {
+  std::vector<PageFacts> numbers; // that the name stands for, or the number given
+  std::vector<NameFacts> names;   // the name given, or those that people write for the number
+  bool tablesDiffer = false;      // they open different tables of ICU's
+};
 
-// A description in lines, each ended by a newline.
-std::string descriptionAsText(const nlohmann::ordered_json &description);
+PageFacts describePage(int32_t number);
+
+// Throws Error where neither the library nor ICU knows what was asked for.
+FoundPages lookUpPage(const std::string &asked);
 
 } // namespace nls2::tool

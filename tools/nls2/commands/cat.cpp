@@ -1,59 +1,92 @@
-// nls2 cat: a text file in any encoding as UTF-8 on standard output.
+// nls2 cat: text files in any encoding as UTF-8 on standard output.
 
+#include "codepage/code_page.h"
 #include "commands.h"
-#include "errors.h"
 #include "io/output_file.h"
 #include "io/text_stream.h"
 
-#include <fmt/core.h>
+#include <algorithm>
 #include <memory>
-#include <string>
+#include <optional>
 
 namespace nls2::tool {
 
 namespace {
 
-constexpr const char *help =
-    R"(NAME is a converter name of ICU's in any spelling: UTF-16, ISO-8859-1, windows-1252, ibm-1141.
-FILE may be - for standard input.
-
-Line ends and nulls stay what they are. UTF-16 and UTF-32 take off a byte-order mark and do without
-one (then big-endian); with any other name a mark is text, U+FEFF. `nls2 detect` tells which one a
-file has.
-
-Bytes that are no text of the encoding are written as U+FFFD or U+001A; their number is told, and
-the exit code is 1.)";
+constexpr const char *notes =
+    R"(NAME is a code page by number, or a converter name of ICU's: UTF-16, ISO-8859-1, ibm-1141. Line ends
+and nulls stay what they are. UTF-16 and UTF-32 take off a byte-order mark, and do without one (then
+big-endian); with any other name a mark is text, U+FEFF.
+Exit codes: 1 if bytes that are not valid in the encoding were replaced, 2 if a file failed.
+)";
 
 struct Arguments {
   std::string encoding;
-  std::string path;
+  std::vector<std::string> paths;
 };
 
-void copy(const Arguments &arguments) {
-  TextStream in(arguments.path, arguments.encoding);
-  OutputFile out("-");
-  for (std::string text = in.read(); !text.empty(); text = in.read()) {
+// Runs a step of reading. A failure is reported, and leaves the other files to be read.
+template <class Step>
+bool succeeds(Step step) {
+  try {
+    step();
+    return true;
+  } catch (const Error &error) {
+    complain(error.what());
+    return false;
+  }
+}
+
+void reportReplaced(const std::string &name, uint64_t count, const std::string &encoding) {
+  const char *verb = count == 1 ? " is" : "s are";
+  complain(fmt::format("{}: {} byte sequence{} not valid {}; each was replaced", printable(name),
+                       count, verb, printable(encoding))
+               .c_str());
+}
+
+// The exit code for this file.
+int copy(const Arguments &arguments, const std::string &path, UConverter *converter,
+         OutputFile &out) {
+  std::optional<TextStream> in;
+  std::string text;
+  bool isRead = succeeds([&] { in.emplace(path, converter); });
+  do {
+    isRead = isRead && succeeds([&] { text = in->read(); });
     out.write(text);
+  } while (isRead && !text.empty());
+  if (in && in->replaced() != 0) {
+    reportReplaced(in->name(), in->replaced(), arguments.encoding);
+    return isRead ? exitFailed : exitUsage;
   }
-  if (in.badSequences() != 0) {
-    throw Failure(
-        fmt::format("{}: {} byte sequences are no text of {}; a substitute stands for each",
-                    arguments.path, in.badSequences(), arguments.encoding));
+  return isRead ? exitDone : exitUsage;
+}
+
+int copyAll(const Arguments &arguments) {
+  const converter opened = openEncoding("--encoding", arguments.encoding);
+  OutputFile out("-");
+  int code = exitDone;
+  for (const std::string &path : arguments.paths) {
+    code = std::max(code, copy(arguments, path, opened.get(), out));
   }
+  out.commit();
+  return code;
 }
 
 } // namespace
 
-void addCatCommand(CLI::App &app) {
-  CLI::App &command =
-      *app.add_subcommand("cat", "Write a text file in any encoding to standard output as UTF-8");
+Command catCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  command.add_option("--encoding", arguments->encoding, "the file's encoding")
-      ->required()
-      ->type_name("NAME");
-  command.add_option("FILE", arguments->path, "file to read")->required();
-  command.footer(help);
-  command.callback([arguments] { copy(*arguments); });
+  Command command;
+  command.operands = {{"FILE", "files to read, one after another; - is standard input",
+                       into(arguments->paths), 1, Operand::anyNumber}};
+  command.options = {{.name = "encoding",
+                      .metavar = "NAME",
+                      .help = "the files' encoding",
+                      .take = into(arguments->encoding),
+                      .isRequired = true}};
+  command.notes = notes;
+  command.run = [arguments] { return copyAll(*arguments); };
+  return command;
 }
 
 } // namespace nls2::tool

@@ -1,6 +1,5 @@
 // nls2 compare: two strings by the rules of a language.
 
-#include "answer.h"
 #include "commands.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
@@ -14,12 +13,11 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr const char *help =
-    R"(Prints -1 where A sorts before B, 1 where B sorts before A, 0 where they are equal. The order
-counts case, accents and punctuation. A and B are bytes of the code page, at most 32767 each.
-
-Exit codes, as cmp has them: 0 equal, 1 not equal, 2 anything that went wrong. An argument that
-begins with a dash goes behind --.)";
+constexpr const char *notes =
+    R"(Prints -1 if A sorts before B, 1 if B sorts before A, 0 if they are equal. The order counts case,
+accents and punctuation. A and B are bytes of the code page, at most 32767 each.
+Exit codes: 0 equal, 1 not equal, 2 anything that went wrong.
+)";
 
 struct Arguments {
   LocaleOptions locale;
@@ -30,7 +28,7 @@ struct Arguments {
 
 void require(StringOrder &order, const char *name, const std::string &text) {
   if (const auto refusal = order.refusal(text)) {
-    throw Failure(fmt::format("{}: {}", name, *refusal));
+    throw failure("{}: {}", name, *refusal);
   }
 }
 
@@ -45,16 +43,18 @@ bool areEqual(const Arguments &arguments) {
 
 } // namespace
 
-void addCompareCommand(CLI::App &app) {
-  CLI::App &command =
-      *app.add_subcommand("compare", "Compare two strings by the rules of a language");
+Command compareCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  addLocaleOptions(command, arguments->locale);
-  command.add_flag("--ignore-trailing", arguments->ignoreTrailing, "trailing blanks do not count");
-  command.add_option("A", arguments->a, "the first string")->required();
-  command.add_option("B", arguments->b, "the second string")->required();
-  command.footer(help);
-  command.callback([arguments] { answer([&] { return areEqual(*arguments); }); });
+  Command command;
+  command.operands = {{"A", "the first string", into(arguments->a), 1},
+                      {"B", "the second string", into(arguments->b), 1}};
+  command.options = localeOptions(arguments->locale);
+  command.options.push_back({.name = "ignore-trailing",
+                             .help = "trailing blanks do not count",
+                             .take = into(arguments->ignoreTrailing)});
+  command.notes = notes;
+  command.run = [arguments] { return areEqual(*arguments) ? exitDone : exitFailed; };
+  return command;
 }
 
 } // namespace nls2::tool

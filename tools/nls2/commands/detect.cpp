@@ -1,40 +1,36 @@
-// nls2 detect: which Unicode signature files begin with.
+// nls2 detect: which Unicode signatures files begin with.
 
 #include "commands.h"
-#include "errors.h"
 #include "io/input_file.h"
-#include "io/output_file.h"
+#include "io/print.h"
+#include "json.h"
 #include "nls2.h"
-#include "status.h"
 
 #include <array>
-#include <fmt/core.h>
 #include <memory>
-#include <nlohmann/json.hpp>
-#include <string>
-#include <vector>
 
 namespace nls2::tool {
 
 namespace {
 
-using Json = nlohmann::ordered_json;
-
 constexpr std::size_t longestSignature = 5;
 
-constexpr const char *help =
-    R"(For each FILE the encoding whose signature (byte-order mark) it begins with, and the bytes that the
-signature takes. FILE may be - for standard input. A file that cannot be read does not keep the
-others from being looked at.
-
-Without a signature a file may still be Unicode. FF FE 00 00 is UTF-32LE, even where a text in
+constexpr const char *notes =
+    R"(Without a signature a file may still be Unicode. FF FE 00 00 is UTF-32LE, even where a text in
 UTF-16LE begins with a null.
-
-Exit codes: 0 every file has a signature, 1 some file has none, 2 some file cannot be read.)";
+Exit codes: 0 every file has a signature, 1 some file has none, 2 something went wrong.
+)";
 
 struct Arguments {
   std::vector<std::string> paths;
   bool asJson = false;
+};
+
+struct Signature {
+  std::string file;
+  std::optional<std::string> encoding;
+  int32_t length = 0;
+  std::optional<std::string> error; // why the file could not be looked at
 };
 
 std::string beginningOf(const std::string &path) {
@@ -48,66 +44,77 @@ std::string beginningOf(const std::string &path) {
   return {buffer.data(), length};
 }
 
-Json detect(const std::string &path) {
-  const std::string bytes = beginningOf(path);
-  int32_t length = 0;
-  int32_t status = 0;
-  const char *name = NLS2_detectUnicodeSignature(bytes.data(), static_cast<int32_t>(bytes.size()),
-                                                 &length, &status);
-  if (status > 0) {
-    throw Failure(fmt::format("{}: {}", path, statusName(status)));
+Signature detect(const std::string &path) {
+  Signature found{.file = path, .encoding = {}, .error = {}};
+  try {
+    const std::string bytes = beginningOf(path);
+    int32_t status = 0;
+    const char *name = NLS2_detectUnicodeSignature(bytes.data(), static_cast<int32_t>(bytes.size()),
+                                                   &found.length, &status);
+    if (status > 0) {
+      throw failure("{}: {}", printable(path), statusText(status));
+    }
+    found.encoding = name != nullptr ? std::optional<std::string>(name) : std::nullopt;
+  } catch (const Error &error) {
+    found.error = error.what();
   }
-  return {{"file", path},
-          {"encoding", name != nullptr ? Json(name) : Json()},
-          {"signatureLength", length}};
+  return found;
 }
 
-std::string asText(const Json &rows) {
+std::string asText(const std::vector<Signature> &signatures) {
   std::string text;
-  for (const Json &row : rows) {
-    const Json &encoding = row["encoding"];
-    text += row["file"].get<std::string>() + ": ";
-    text += encoding.is_null() ? "no signature\n"
-                               : fmt::format("{}, {} bytes\n", encoding.get<std::string>(),
-                                             row["signatureLength"].get<int32_t>());
+  for (const Signature &found : signatures) {
+    if (!found.error) {
+      text += printable(found.file) + ": ";
+      text += found.encoding ? fmt::format("{}, {} bytes\n", *found.encoding, found.length)
+                             : "no signature\n";
+    }
   }
   return text;
 }
 
-// Names of files need not be UTF-8, which JSON must be.
-std::string asJsonText(const Json &rows) {
-  return rows.dump(2, ' ', false, Json::error_handler_t::replace) + "\n";
+Json asJson(const std::vector<Signature> &signatures) {
+  Json rows = Json::array();
+  for (const Signature &found : signatures) {
+    Json row = Json::object();
+    row.set("file", found.file);
+    row.set("encoding", found.encoding);
+    row.set("signatureLength", found.length);
+    if (found.error) {
+      row.set("error", found.error);
+    }
+    rows.append(std::move(row));
+  }
+  return rows;
 }
 
-void detectAll(const Arguments &arguments) {
-  Json rows = Json::array();
-  ExitCode code = exitDone;
+int detectAll(const Arguments &arguments) {
+  std::vector<Signature> signatures;
+  int code = exitDone;
   for (const std::string &path : arguments.paths) {
-    try {
-      rows.push_back(detect(path));
-      if (code == exitDone && rows.back()["encoding"].is_null()) {
-        code = exitNo;
-      }
-    } catch (const Failure &error) {
-      fmt::print(stderr, "nls2: {}\n", error.what());
-      code = exitTrouble;
+    const Signature &found = signatures.emplace_back(detect(path));
+    if (found.error) {
+      complain(found.error->c_str());
+      code = exitUsage;
+    } else if (!found.encoding && code == exitDone) {
+      code = exitFailed;
     }
   }
-  OutputFile("-").write(arguments.asJson ? asJsonText(rows) : asText(rows));
-  if (code != exitDone) {
-    throw AlreadySaid{code};
-  }
+  print(arguments.asJson ? asJson(signatures).text() : asText(signatures));
+  return code;
 }
 
 } // namespace
 
-void addDetectCommand(CLI::App &app) {
-  CLI::App &command = *app.add_subcommand("detect", "Tell the Unicode signatures of files");
+Command detectCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  command.add_flag("--json", arguments->asJson, "write JSON");
-  command.add_option("FILE", arguments->paths, "files to look at")->required();
-  command.footer(help);
-  command.callback([arguments] { detectAll(*arguments); });
+  Command command;
+  command.operands = {{"FILE", "files to look at; - is standard input", into(arguments->paths), 1,
+                       Operand::anyNumber}};
+  command.options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}};
+  command.notes = notes;
+  command.run = [arguments] { return detectAll(*arguments); };
+  return command;
 }
 
 } // namespace nls2::tool

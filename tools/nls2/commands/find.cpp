@@ -1,6 +1,5 @@
 // nls2 find: the lines in which a text occurs.
 
-#include "answer.h"
 #include "commands.h"
 #include "io/line_reader.h"
 #include "io/output_file.h"
@@ -17,17 +16,11 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr const char *help =
-    R"(PATTERN is plain text in UTF-8, whatever the code page of the files; an empty one occurs in
-every line. Lines end in U+000A as the code page writes it; they are printed in the code page, and
-so are what --line-number and several FILEs put before them: a number, a name, a colon behind each.
-
-A line whose bytes are not text of the code page, with text behind a null, or under --ignore-case
-with a character that grows in lower case (U+0130 outside Turkish) is an error: the lines before it
-have been printed, and the run ends.
-
-Exit codes, as grep has them: 0 found, 1 not found, 2 anything that went wrong. A pattern that
-begins with a dash goes behind --.)";
+constexpr const char *notes =
+    R"(PATTERN is plain text in UTF-8, whatever the code page of the files; an empty one occurs in every
+line. Lines end in U+000A as the code page writes it, and are printed in the code page.
+Exit codes: 0 found, 1 not found, 2 anything that went wrong.
+)";
 
 constexpr std::size_t mostBytes = std::size_t{1} << 30;
 
@@ -36,7 +29,7 @@ struct Arguments {
   bool ignoreCase = false;
   bool lineNumbers = false;
   std::string pattern;
-  std::vector<std::string> inputs{"-"};
+  std::vector<std::string> inputs;
 };
 
 // A character that the page does not have would be looked for as its substitute.
@@ -44,8 +37,7 @@ std::string translatePattern(const std::string &pattern, int32_t page) {
   int32_t status = 0;
   std::string translated = translateText(page, utf8Page, pattern, status);
   if (translateText(utf8Page, page, translated, status) != pattern) {
-    throw UsageError(
-        fmt::format("PATTERN: not UTF-8, or a character that code page {} does not have", page));
+    throw usageError("PATTERN: not UTF-8, or a character that code page {} does not have", page);
   }
   return translated;
 }
@@ -58,7 +50,7 @@ public:
         pattern_(translatePattern(arguments.pattern, arguments.locale.codepage)),
         check_(arguments.locale.codepage, mostBytes, Nulls::endText) {
     if (search(pattern_) < 0) {
-      throw UsageError("PATTERN: a character grows in lower case");
+      throw usageError("PATTERN: a character grows in lower case");
     }
   }
 
@@ -113,17 +105,28 @@ private:
 
 } // namespace
 
-void addFindCommand(CLI::App &app) {
-  CLI::App &command = *app.add_subcommand("find", "Print the lines in which a text occurs");
+Command findCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  addLocaleOptions(command, arguments->locale);
-  command.add_flag("--ignore-case", arguments->ignoreCase,
-                   "compare both in lower case, by the language's rules");
-  command.add_flag("-n,--line-number", arguments->lineNumbers, "print the lines' numbers");
-  command.add_option("PATTERN", arguments->pattern, "the text to find")->required();
-  command.add_option("FILE", arguments->inputs, "files to read; standard input if - or not given");
-  command.footer(help);
-  command.callback([arguments] { answer([&] { return FindRun(*arguments).run(); }); });
+  Command command;
+  command.operands = {{"PATTERN", "the text to find", into(arguments->pattern), 1},
+                      {"FILE", "files to read; standard input if - or not given",
+                       into(arguments->inputs), 0, Operand::anyNumber}};
+  command.options = localeOptions(arguments->locale);
+  command.options.push_back({.name = "ignore-case",
+                             .help = "compare both in lower case, by the language's rules",
+                             .take = into(arguments->ignoreCase)});
+  command.options.push_back({.name = "line-number",
+                             .letter = 'n',
+                             .help = "print the lines' numbers",
+                             .take = into(arguments->lineNumbers)});
+  command.notes = notes;
+  command.run = [arguments] {
+    if (arguments->inputs.empty()) {
+      arguments->inputs.emplace_back("-");
+    }
+    return FindRun(*arguments).run() ? exitDone : exitFailed;
+  };
+  return command;
 }
 
 } // namespace nls2::tool

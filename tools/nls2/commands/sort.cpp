@@ -4,7 +4,6 @@
 #include "errors.h"
 #include "io/line_reader.h"
 #include "io/output_file.h"
-#include "number_option.h"
 #include "text/string_order.h"
 
 #include <algorithm>
@@ -18,18 +17,12 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr const char *help =
-    R"(Lines end in U+000A as the code page writes it: 0x0A, in EBCDIC 0x25 or 0x15, a code unit of
-UTF-16 or UTF-32. A last line without it gets one. With --record-length there are no line ends:
-every N bytes are one record.
-
-The order counts case, accents and punctuation; lines that it holds equal stay in the order of the
-input. Lines have at most 32767 bytes. A line that is longer, or whose bytes are not text of the
-code page, is an error, and so is, under --ignore-trailing, one with text behind a null. Nothing is
-written then. OUT may be one of the FILEs, and takes its name at the end.
-
-All lines are held in memory. The language's rules are looked up anew for every comparison, of which
-n lines take about n * log2(n): sorting 100,000 lines takes a second or two.)";
+constexpr const char *notes =
+    R"(The order counts case, accents and punctuation; lines that it holds equal stay in the order of the
+input. Lines end in U+000A as the code page writes it; a last line without it gets one. A line of
+more than 32767 bytes, or whose bytes are not valid in the code page, is an error, and nothing is
+written then. All lines are held in memory. OUT may be one of the FILEs.
+)";
 
 // Below it a thread costs more than it saves.
 constexpr std::ptrdiff_t fewLines = 1000;
@@ -38,7 +31,7 @@ struct Arguments {
   LocaleOptions locale;
   bool ignoreTrailing = false;
   int32_t recordLength = 0;
-  std::vector<std::string> inputs{"-"};
+  std::vector<std::string> inputs;
   std::string output = "-";
 };
 
@@ -83,7 +76,8 @@ void sortFiles(const Arguments &arguments) {
     format.terminator = lineTerminator(arguments.locale.codepage);
   }
   Lines lines;
-  for (const std::string &path : arguments.inputs) {
+  const Lines standardInput{"-"};
+  for (const std::string &path : arguments.inputs.empty() ? standardInput : arguments.inputs) {
     readLines(path, format, order, lines);
   }
   OutputFile output(arguments.output);
@@ -98,21 +92,33 @@ void sortFiles(const Arguments &arguments) {
 
 } // namespace
 
-void addSortCommand(CLI::App &app) {
-  CLI::App &command =
-      *app.add_subcommand("sort", "Sort lines or fixed-length records by the rules of a language");
+Command sortCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  addLocaleOptions(command, arguments->locale);
-  command.add_flag("--ignore-trailing", arguments->ignoreTrailing, "trailing blanks do not count");
-  addNumber(command, "--record-length", arguments->recordLength, 1, StringOrder::mostBytes,
-            "N, the bytes of every record");
-  command.add_option("FILE", arguments->inputs, "files to read; standard input if - or not given");
-  command
-      .add_option("-o,--output", arguments->output,
-                  "file to write; standard output if - or not given")
-      ->type_name("OUT");
-  command.footer(help);
-  command.callback([arguments] { sortFiles(*arguments); });
+  Command command;
+  command.operands = {{"FILE", "files to read; standard input if - or not given",
+                       into(arguments->inputs), 0, Operand::anyNumber}};
+  command.options = localeOptions(arguments->locale);
+  const auto add = [&](const Option &option) { command.options.push_back(option); };
+  add({.name = "ignore-trailing",
+       .help = "trailing blanks do not count",
+       .take = into(arguments->ignoreTrailing)});
+  add({.name = "record-length",
+       .metavar = "N",
+       .help = "sort records of N bytes instead of lines",
+       .take = [arguments](const std::string &text) {
+         arguments->recordLength = parseNumber("--record-length", text, 1, StringOrder::mostBytes);
+       }});
+  add({.name = "output",
+       .letter = 'o',
+       .metavar = "OUT",
+       .help = "file to write; standard output if - or not given",
+       .take = into(arguments->output)});
+  command.notes = notes;
+  command.run = [arguments] {
+    sortFiles(*arguments);
+    return exitDone;
+  };
+  return command;
 }
 
 } // namespace nls2::tool

@@ -1,41 +1,141 @@
-// Records of one length, read in chunks of many.
+// Records of one length, or lines, read in batches of many.
 
 #include "convert/record_reader.h"
 
+#include "errors.h"
+
 #include <algorithm>
+#include <limits>
 
 namespace nls2::tool {
 
 namespace {
 
-constexpr std::size_t usualChunk = std::size_t{128} * 1024;
+constexpr std::size_t usualBatch = std::size_t{256} * 1024;
+constexpr std::size_t longestLine = std::size_t{1} << 30;
+
+uint64_t product(uint64_t a, uint64_t b) {
+  uint64_t result = 0;
+  return __builtin_mul_overflow(a, b, &result) ? std::numeric_limits<uint64_t>::max() : result;
+}
 
 } // namespace
 
-RecordReader::RecordReader(InputFile &input, std::size_t recordLength, int wakeFd)
-    : input_(input), recordLength_(recordLength),
-      chunkLength_(std::max<std::size_t>(usualChunk / recordLength, 1) * recordLength),
-      wakeFd_(wakeFd) {}
+RecordReader::RecordReader(InputFile &input, const TranslateOptions &options, int wakeFd)
+    : input_(input), wakeFd_(wakeFd), recordLength_(options.recordLength), toSkip_(options.skip),
+      left_(options.count) {
+  if (recordLength_ == 0) {
+    ends_.emplace(CodePage(options.from, "--from"));
+  }
+}
 
-bool RecordReader::read(RecordChunk &chunk) {
-  if (!chunk.bytes) {
-    chunk.bytes = std::make_unique_for_overwrite<char[]>(chunkLength_);
+bool RecordReader::read(RecordBatch &batch) {
+  if (!started_) {
+    started_ = true;
+    start();
   }
-  std::copy(carried_.begin(), carried_.end(), chunk.bytes.get());
-  std::size_t have = carried_.size();
-  bool ended = false;
-  while (have < recordLength_ && !ended) {
-    const std::size_t got = input_.read(chunk.bytes.get() + have, chunkLength_ - have, wakeFd_);
-    have += got;
-    ended = got == 0;
+  batch.bytes.clear(2 * usualBatch);
+  batch.bytes.append(carried_);
+  carried_.clear();
+  batch.begin = 0;
+  batch.recordLength = recordLength_;
+  const bool there = left_ > 0 && (recordLength_ != 0 ? readRecords(batch) : readLines(batch));
+  batch.recordsBefore = records_;
+  batch.offset = offset_;
+  const uint64_t count =
+      recordLength_ != 0 ? (batch.size() + recordLength_ - 1) / recordLength_ : batch.lines.size();
+  records_ += count;
+  offset_ += batch.size();
+  left_ -= there ? count : left_;
+  return there;
+}
+
+// Records can be skipped by their length, lines only by looking at them.
+void RecordReader::start() {
+  if (recordLength_ != 0 && toSkip_ > 0) {
+    const uint64_t bytes = product(toSkip_, recordLength_);
+    input_.skip(bytes, wakeFd_);
+    records_ = toSkip_;
+    offset_ = bytes;
   }
-  chunk.recordsBefore = records_;
-  chunk.length = have / recordLength_ * recordLength_;
-  const std::size_t rest = have - chunk.length;
-  chunk.tail = ended ? rest : 0;
-  carried_.assign(chunk.bytes.get() + chunk.length, ended ? 0 : rest);
-  records_ += chunk.length / recordLength_;
-  return have > 0;
+}
+
+// 0 at the end of the input.
+std::size_t RecordReader::readMore(RecordBatch &batch, std::size_t most) {
+  const std::size_t got = input_.read(batch.bytes.room(most).data(), most, wakeFd_);
+  batch.bytes.commit(got);
+  ended_ = got == 0;
+  return got;
+}
+
+// No byte behind the last record wanted is taken from the input.
+bool RecordReader::readRecords(RecordBatch &batch) {
+  const std::size_t wanted = static_cast<std::size_t>(
+      std::min<uint64_t>(product(left_, recordLength_),
+                         std::max<std::size_t>(usualBatch / recordLength_, 1) * recordLength_));
+  while (batch.bytes.size() < recordLength_ && !ended_) {
+    readMore(batch, std::min(wanted - batch.bytes.size(), usualBatch));
+  }
+  if (!ended_) {
+    const std::size_t whole = batch.bytes.size() / recordLength_ * recordLength_;
+    carried_ = batch.bytes.bytes().substr(whole);
+    batch.bytes.truncate(whole);
+  }
+  return batch.bytes.size() > 0;
+}
+
+bool RecordReader::readLines(RecordBatch &batch) {
+  batch.lines.clear();
+  scanned_ = 0;
+  ends_->restart();
+  while (batch.lines.empty() && !ended_) {
+    if (batch.bytes.size() - scanned_ > longestLine) {
+      refuseLongLine();
+    }
+    readMore(batch, usualBatch);
+    findLines(batch);
+    skipLines(batch);
+  }
+  if (batch.lines.size() > left_) {
+    batch.lines.resize(static_cast<std::size_t>(left_));
+  }
+  std::size_t end = batch.begin;
+  for (const LineBounds &line : batch.lines) {
+    end += line.end;
+  }
+  carried_ = batch.bytes.bytes().substr(end);
+  batch.bytes.truncate(end);
+  return !batch.lines.empty();
+}
+
+// The last line may have no end.
+void RecordReader::findLines(RecordBatch &batch) {
+  const std::string_view text = batch.bytes.bytes();
+  while (const auto line = ends_->lineAt(text, scanned_)) {
+    batch.lines.push_back(*line);
+    scanned_ += line->end;
+  }
+  if (ended_ && scanned_ < text.size()) {
+    batch.lines.push_back({text.size() - scanned_, text.size() - scanned_});
+    scanned_ = text.size();
+  }
+}
+
+void RecordReader::skipLines(RecordBatch &batch) {
+  const auto skipped = static_cast<std::ptrdiff_t>(std::min<uint64_t>(toSkip_, batch.lines.size()));
+  const auto end = batch.lines.begin() + skipped;
+  for (auto line = batch.lines.begin(); line != end; ++line) {
+    batch.begin += line->end;
+    offset_ += line->end;
+  }
+  batch.lines.erase(batch.lines.begin(), end);
+  toSkip_ -= static_cast<uint64_t>(skipped);
+  records_ += static_cast<uint64_t>(skipped);
+}
+
+void RecordReader::refuseLongLine() const {
+  throw failure("{}: line {} at byte {}: it is longer than 1 GiB", input_.name(), records_ + 1,
+                offset_);
 }
 
 } // namespace nls2::tool

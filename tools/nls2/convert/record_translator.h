@@ -1,65 +1,34 @@
 // One record from one code page to another, shaped as the options say.
 #pragma once
 
-#include "codepage/code_page.h"
-#include "convert/output_buffer.h"
+#include "convert/output_field.h"
 
-#include <cstdint>
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 namespace nls2::tool {
 
-enum class Padding { none, strip, fill, keepBlanks };
-
-struct TranslateOptions {
-  int32_t from = 0;
-  int32_t to = 0;
-  int32_t recordLength = 0;
-  int32_t outLength = 0; // 0: as much as it takes
-  Padding padding = Padding::none;
-  bool newline = false;
-};
-
-// Holds no state of a record: one translator serves all threads.
+// Keeps its converters open: every worker has a copy.
 class RecordTranslator {
 public:
+  // Throws usageError for a code page that does not open, or lacks a blank or line end it needs.
   explicit RecordTranslator(const TranslateOptions &options);
 
-  // Why a record failed, with what would help; nothing where it went well.
-  using Refusal = std::optional<std::string>;
+  // Appends the record's translation and its line end, and counts the characters replaced in it.
+  // On failure the output is as it was.
+  std::optional<Problem> translate(std::string_view record, ByteBuffer &out, std::size_t &replaced);
 
-  // Appends the record's translation to the output. On failure the output is as it was.
-  Refusal translate(std::string_view record, OutputBuffer &out) const;
+  // The first character that is replaced in a record; nothing where none is.
+  std::optional<Problem> firstReplaced(std::string_view record) const;
 
 private:
-  struct WideField;
-
-  std::string_view withoutBlanks(std::string_view record) const;
-  bool hasEmbeddedNull(std::string_view record) const;
-  int32_t translateToFit(std::string_view record, OutputBuffer &out, uint32_t option,
-                         bool unbounded) const;
-  Refusal translateAsItIs(std::string_view record, OutputBuffer &out, uint32_t option) const;
-
-  Refusal fill(std::string_view record, OutputBuffer &out) const;
-  bool fillAtOnce(std::string_view record, OutputBuffer &out) const;
-  bool stripAndAppend(std::string_view record, OutputBuffer &out) const;
-  Refusal keepBlanks(std::string_view record, OutputBuffer &out) const;
-
-  // The slow way, by UTF-16 and with the blanks counted here. It is right for every page: for those
-  // whose blanks are wider than a byte, that shift, that put a signature before the text.
-  Refusal padThroughUtf16(std::string_view record, OutputBuffer &out) const;
-  std::size_t roomForBlanks(const WideField &field) const;
-  WideField widen(std::string_view record) const;
-  Refusal narrow(const WideField &field, std::size_t blanks, OutputBuffer &out) const;
-
-  Refusal refuse(int32_t status, std::string_view record) const;
-
-  const TranslateOptions options_;
-  const std::size_t outLength_;
-  const EncodedCharacter blank_; // of the destination
-  const std::optional<char> sourceBlank_;
+  const TranslateOptions *options_;
+  std::vector<OutputField> fields_;
+  std::string separator_;
+  std::string lineEnd_;
 };
 
 } // namespace nls2::tool

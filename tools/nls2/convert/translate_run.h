@@ -1,14 +1,11 @@
 // The work of `nls2 translate`: a file of records, from input to output.
 #pragma once
 
-#include "convert/record_translator.h"
-
-#include <string>
+#include "convert/translate_options.h"
 
 namespace nls2::tool {
 
-// "-" is standard input or output. Throws UsageError and Failure.
-void translateFile(const TranslateOptions &options, const std::string &inputPath,
-                   const std::string &outputPath);
+// The exit code. Throws Error.
+int translateFile(const TranslateOptions &options);
 
 } // namespace nls2::tool

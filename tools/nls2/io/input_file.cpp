@@ -4,17 +4,20 @@
 
 #include "errors.h"
 
+#include <algorithm>
 #include <array>
 #include <cerrno>
 #include <cstring>
 #include <fcntl.h>
-#include <fmt/core.h>
+#include <limits>
+#include <memory>
 #include <poll.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 namespace nls2::tool {
 
-InputFile::InputFile(const std::string &path) : name_(path) {
+InputFile::InputFile(const std::string &path) : name_(printable(path)) {
   if (path == "-") {
     name_ = "standard input";
     fd_ = STDIN_FILENO;
@@ -32,9 +35,7 @@ InputFile::~InputFile() {
   }
 }
 
-void InputFile::fail() const {
-  throw Failure(fmt::format("cannot read {}: {}", name_, std::strerror(errno)));
-}
+void InputFile::fail() const { throw failure("cannot read {}: {}", name_, std::strerror(errno)); }
 
 std::size_t InputFile::read(char *buffer, std::size_t length, int wakeFd) {
   for (;;) {
@@ -53,6 +54,36 @@ std::size_t InputFile::read(char *buffer, std::size_t length, int wakeFd) {
       fail();
     }
   }
+}
+
+// Devices such as terminals "seek" without doing so.
+void InputFile::skip(uint64_t bytes, int wakeFd) {
+  constexpr uint64_t farthest = std::numeric_limits<off_t>::max();
+  if (const auto left = bytesLeft()) {
+    if (lseek(fd_, static_cast<off_t>(std::min({bytes, *left, farthest})), SEEK_CUR) < 0) {
+      fail();
+    }
+    return;
+  }
+  constexpr std::size_t chunk = std::size_t{64} * 1024;
+  const auto dropped = std::make_unique_for_overwrite<char[]>(chunk);
+  while (bytes > 0) {
+    const std::size_t got = read(dropped.get(), std::min<uint64_t>(bytes, chunk), wakeFd);
+    if (got == 0) {
+      return;
+    }
+    bytes -= got;
+  }
+}
+
+std::optional<uint64_t> InputFile::bytesLeft() const {
+  struct stat facts = {};
+  if (fstat(fd_, &facts) != 0 || !S_ISREG(facts.st_mode)) {
+    return {};
+  }
+  const off_t here = lseek(fd_, 0, SEEK_CUR);
+  return here < 0 ? std::nullopt
+                  : std::optional(static_cast<uint64_t>(std::max<off_t>(facts.st_size - here, 0)));
 }
 
 } // namespace nls2::tool

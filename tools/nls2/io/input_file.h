@@ -2,24 +2,31 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
+#include <optional>
 #include <string>
 
 namespace nls2::tool {
 
 class InputFile {
 public:
-  // "-" is standard input. Throws Failure.
+  // "-" is standard input. Throws Error.
   explicit InputFile(const std::string &path);
   ~InputFile();
   InputFile(const InputFile &) = delete;
   InputFile &operator=(const InputFile &) = delete;
 
   // Up to `length` bytes, as many as are there at once; 0 at the end, and when `wakeFd` becomes
-  // readable before any are. Throws Failure.
-  std::size_t read(char *buffer, std::size_t length, int wakeFd);
+  // readable before any are. Throws Error.
+  std::size_t read(char *buffer, std::size_t length, int wakeFd = -1);
+  // Leaves out the next bytes, by seeking where the file can; fewer where it ends before. Throws
+  // Error.
+  void skip(uint64_t bytes, int wakeFd = -1);
+  // The bytes from here to the end, where that is known.
+  std::optional<uint64_t> bytesLeft() const;
 
   int fd() const { return fd_; }
-  const std::string &name() const { return name_; }
+  const std::string &name() const { return name_; } // for messages
 
 private:
   [[noreturn]] void fail() const;

@@ -9,7 +9,6 @@
 #include <algorithm>
 #include <array>
 #include <fmt/core.h>
-#include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
 
 namespace nls2::tool {
@@ -19,27 +18,26 @@ namespace {
 constexpr std::size_t chunkLength = std::size_t{128} * 1024;
 
 // The byte order, or the state at a line's start, depends on text before the line.
-bool needsTextBefore(int32_t page) {
+bool needsTextBefore(const CodePage &page) {
   constexpr std::array types{UCNV_UTF16,    UCNV_UTF32, UCNV_HZ,
                              UCNV_ISO_2022, UCNV_SCSU,  UCNV_COMPOUND_TEXT};
-  int32_t twoNull = 0;
-  int32_t status = U_ZERO_ERROR;
-  const icu::LocalUConverterPointer converter(NLS2_MapCodepageIdToName(page, &twoNull, &status));
-  return std::find(types.begin(), types.end(), ucnv_getType(converter.getAlias())) != types.end();
+  return std::find(types.begin(), types.end(), ucnv_getType(page.converter())) != types.end();
 }
 
 } // namespace
 
 std::string lineTerminator(int32_t page) {
-  if (!hasCharacter(page, '\n')) {
-    throw UsageError(fmt::format("code page {} has no line feed to end lines", page));
+  const CodePage opened(page, "--codepage");
+  const auto lineFeed = opened.encoded(u'\n');
+  if (!lineFeed) {
+    throw usageError("code page {} has no line feed to end lines", page);
   }
-  if (needsTextBefore(page)) {
-    throw UsageError(fmt::format("lines of code page {} depend on the text before them; translate "
-                                 "it first, UTF-16 or UTF-32 with a signature to a page without",
-                                 page));
+  if (needsTextBefore(opened)) {
+    throw usageError("lines of code page {} depend on the text before them; translate "
+                     "it first, UTF-16 or UTF-32 with a signature to a page without",
+                     page);
   }
-  return encodedCharacter(page, '\n').bytes;
+  return lineFeed->bytes;
 }
 
 // The next line's end in the buffer, or npos.
@@ -100,8 +98,8 @@ bool LineReader::last(std::string_view &line) {
 }
 
 void LineReader::fail(const std::string &reason) const {
-  throw Failure(fmt::format("{}: {} {}: {}", input_.name(),
-                            format_.terminator.empty() ? "record" : "line", number_, reason));
+  throw failure("{}: {} {}: {}", input_.name(), format_.terminator.empty() ? "record" : "line",
+                number_, reason);
 }
 
 } // namespace nls2::tool

@@ -16,20 +16,20 @@ struct LineFormat {
   std::size_t recordLength = 0; // of records
 };
 
-// The terminator of lines in a code page. Throws UsageError where the page cannot be cut into
+// The terminator of lines in a code page. Throws Error where the page cannot be cut into
 // lines that mean the same by themselves.
 std::string lineTerminator(int32_t page);
 
 class LineReader {
 public:
-  // Throws Failure.
+  // Throws Error.
   LineReader(const std::string &path, const LineFormat &format) : input_(path), format_(format) {}
 
   // The next line without its terminator, valid until the next call; false at the end. A last line
-  // need not have its terminator, a last record must be whole. Throws Failure.
+  // need not have its terminator, a last record must be whole. Throws Error.
   bool next(std::string_view &line);
 
-  // Throws Failure with the file's name and the last line's number.
+  // Throws Error with the file's name and the last line's number.
   [[noreturn]] void fail(const std::string &reason) const;
 
   const std::string &name() const { return input_.name(); }

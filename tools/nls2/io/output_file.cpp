@@ -3,76 +3,130 @@
 #include "io/output_file.h"
 
 #include "errors.h"
+#include "io/file_attributes.h"
 
 #include <cerrno>
+#include <charconv>
+#include <climits>
+#include <csignal>
 #include <cstdlib>
 #include <cstring>
 #include <fcntl.h>
-#include <fmt/core.h>
+#include <optional>
 #include <poll.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 namespace nls2::tool {
 
 namespace {
 
+constexpr std::size_t mostKept = std::size_t{64} * 1024;
+
+std::string resolved(const std::string &path) {
+  const std::unique_ptr<char, decltype(&std::free)> real(realpath(path.c_str(), nullptr),
+                                                         &std::free);
+  return real ? real.get() : "";
+}
+
 // The file that a path leads to, through symbolic links: a link stays a link when its file is
 // replaced.
 std::string realPathOf(const std::string &path) {
-  const std::unique_ptr<char, decltype(&std::free)> resolved(realpath(path.c_str(), nullptr),
-                                                             &std::free);
-  if (!resolved) {
-    throw Failure(fmt::format("{}: {}", path, std::strerror(errno)));
+  const std::string real = resolved(path);
+  if (real.empty()) {
+    throw failure("cannot write {}: {}", printable(path), std::strerror(errno));
   }
-  return resolved.get();
+  return real;
 }
 
-// Owner first, since a change of owner takes mode bits away. Only the superuser may do it for
-// others' files; the mode then still holds.
-void copyPermissions(const struct stat &from, int fd) {
-  if (fchown(fd, from.st_uid, from.st_gid) != 0 && errno != EPERM) {
-    throw Failure(fmt::format("cannot keep the file's owner: {}", std::strerror(errno)));
+// The number in /proc/self/fd/NUMBER, to which /dev/stdout, /dev/fd/NUMBER and links of users lead.
+// What lies behind that number is not looked at.
+std::optional<int> descriptorOf(std::string path) {
+  const std::string ours = "/proc/" + std::to_string(getpid()) + "/";
+  for (int links = 0; links < 40; ++links) {
+    const std::size_t slash = path.rfind('/');
+    const std::string directory = slash == std::string::npos ? "." : path.substr(0, slash + 1);
+    const std::string name = slash == std::string::npos ? path : path.substr(slash + 1);
+    const std::string real = resolved(directory);
+    if (real.starts_with(ours) && real.ends_with("/fd")) {
+      int number = -1;
+      const char *end = name.data() + name.size();
+      const auto [stop, error] = std::from_chars(name.data(), end, number);
+      return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
+    }
+    std::string target(PATH_MAX, '\0');
+    const ssize_t length = readlink(path.c_str(), target.data(), target.size());
+    if (length <= 0) {
+      return {};
+    }
+    target.resize(static_cast<std::size_t>(length));
+    path = target.starts_with("/") ? target : directory + "/" + target;
   }
-  if (fchmod(fd, from.st_mode & 0777) != 0) {
-    throw Failure(fmt::format("cannot keep the file's permissions: {}", std::strerror(errno)));
-  }
+  return {};
+}
+
+// In a directory such as /tmp only the owner of a file, or of the directory, may replace it.
+bool isOthersInStickyDirectory(const std::string &path, const struct stat &existing) {
+  struct stat directory = {};
+  const std::string parent = path.substr(0, path.rfind('/') + 1);
+  return stat(parent.c_str(), &directory) == 0 && (directory.st_mode & S_ISVTX) != 0 &&
+         geteuid() != 0 && geteuid() != existing.st_uid && geteuid() != directory.st_uid;
 }
 
 } // namespace
 
-OutputFile::OutputFile(const std::string &path) : name_(path) {
+OutputFile::OutputFile(const std::string &path) : name_(printable(path)) {
   if (path == "-") {
     name_ = "standard output";
     fd_ = STDOUT_FILENO;
     return;
   }
-  replaceFile(path);
-}
-
-void OutputFile::replaceFile(const std::string &path) {
-  struct stat existing = {};
-  if (stat(path.c_str(), &existing) != 0) {
-    if (lstat(path.c_str(), &existing) == 0) {
-      throw Failure(fmt::format("cannot write {}: it is a symbolic link that leads nowhere", path));
-    }
-    temporary_ = std::make_unique<TemporaryFile>(path);
-    fd_ = temporary_->fd();
-    return;
-  }
-  if (!S_ISREG(existing.st_mode)) {
-    fd_ = open(path.c_str(), O_WRONLY | O_CLOEXEC);
+  if (const auto number = descriptorOf(path)) {
+    fd_ = fcntl(*number, F_DUPFD_CLOEXEC, 0); // the same open file, its offset included
     if (fd_ < 0) {
       fail();
     }
     return;
   }
-  if (access(path.c_str(), W_OK) != 0) {
+  open(path);
+}
+
+void OutputFile::open(const std::string &path) {
+  struct stat existing = {};
+  if (stat(path.c_str(), &existing) == 0) {
+    S_ISREG(existing.st_mode) ? replaceFile(path, existing) : openDevice(path);
+    return;
+  }
+  if (errno != ENOENT && errno != ENOTDIR) {
     fail();
   }
-  temporary_ = std::make_unique<TemporaryFile>(realPathOf(path));
+  if (lstat(path.c_str(), &existing) == 0) {
+    throw failure("cannot write {}: it is a symbolic link that leads nowhere", name_);
+  }
+  replacedPath_ = path;
+  temporary_ = std::make_unique<TemporaryFile>(path, 0666);
   fd_ = temporary_->fd();
-  copyPermissions(existing, fd_);
+}
+
+void OutputFile::openDevice(const std::string &path) {
+  fd_ = ::open(path.c_str(), O_WRONLY | O_CLOEXEC);
+  if (fd_ < 0) {
+    fail();
+  }
+}
+
+// Whatever would keep the file from being replaced in the end is found now.
+void OutputFile::replaceFile(const std::string &path, const struct stat &existing) {
+  if (faccessat(AT_FDCWD, path.c_str(), W_OK, AT_EACCESS) != 0) {
+    fail();
+  }
+  replacedPath_ = realPathOf(path);
+  if (isOthersInStickyDirectory(replacedPath_, existing)) {
+    throw failure("cannot write {}: it is another user's, in a directory with the sticky bit",
+                  name_);
+  }
+  temporary_ = std::make_unique<TemporaryFile>(replacedPath_, 0600);
+  fd_ = temporary_->fd();
+  copyAttributes(replacedPath_, existing, fd_);
 }
 
 OutputFile::~OutputFile() {
@@ -81,9 +135,7 @@ OutputFile::~OutputFile() {
   }
 }
 
-void OutputFile::fail() const {
-  throw Failure(fmt::format("cannot write {}: {}", name_, std::strerror(errno)));
-}
+void OutputFile::fail() const { throw failure("cannot write {}: {}", name_, std::strerror(errno)); }
 
 void OutputFile::write(std::string_view bytes) {
   while (!bytes.empty()) {
@@ -93,15 +145,37 @@ void OutputFile::write(std::string_view bytes) {
     } else if (errno == EAGAIN) {
       pollfd writable{fd_, POLLOUT, 0};
       poll(&writable, 1, -1);
+    } else if (errno == EPIPE) {
+      endBySignal(SIGPIPE);
     } else if (errno != EINTR) {
       fail();
     }
   }
 }
 
-void OutputFile::commit() {
+void OutputFile::put(std::string_view bytes) {
+  kept_ += bytes;
+  if (kept_.size() >= mostKept) {
+    flush();
+  }
+}
+
+void OutputFile::flush() {
+  write(kept_);
+  kept_.clear();
+}
+
+// Closing a second descriptor makes a file system report lost bytes, and standard output stays.
+void OutputFile::commit(bool sync) {
+  flush();
   if (temporary_) {
-    temporary_->publish();
+    temporary_->publish(sync);
+    return;
+  }
+  const bool unsynced = sync && fsync(fd_) != 0 && errno != EINVAL && errno != EROFS;
+  const int second = unsynced ? -1 : fcntl(fd_, F_DUPFD_CLOEXEC, 0);
+  if (unsynced || (second >= 0 && close(second) != 0)) {
+    fail();
   }
 }
 

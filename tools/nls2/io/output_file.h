@@ -6,29 +6,43 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <sys/stat.h>
 
 namespace nls2::tool {
 
 class OutputFile {
 public:
-  // "-" is standard output. Throws Failure.
+  // "-" is standard output. A path that leads to an open descriptor, such as /dev/stdout or
+  // /dev/fd/3, is written to; a file is replaced by commit(). Throws Error.
   explicit OutputFile(const std::string &path);
   ~OutputFile();
   OutputFile(const OutputFile &) = delete;
   OutputFile &operator=(const OutputFile &) = delete;
 
-  void write(std::string_view bytes); // throws Failure
-  // Without it a file that has been written disappears and the one before it stays. Throws Failure.
-  void commit();
+  // Writes at once. A reader that has gone away ends the process, as SIGPIPE does. Throws Error.
+  void write(std::string_view bytes);
+  // Keeps small pieces of text until there are many; what is kept when it is destroyed is lost.
+  void put(std::string_view bytes);
+  void flush();
+  // Without it a file that has been written disappears and the one before it stays. `sync` also
+  // waits for the disk. Throws Error.
+  void commit(bool sync = false);
 
   // The open file that the bytes go to at once; -1 for a file that is not seen before commit().
   int directFd() const { return temporary_ ? -1 : fd_; }
+  // The file that commit() replaces; empty for others.
+  const std::string &replacedPath() const { return replacedPath_; }
+  const std::string &name() const { return name_; } // for messages
 
 private:
-  void replaceFile(const std::string &path);
+  void open(const std::string &path);
+  void openDevice(const std::string &path);
+  void replaceFile(const std::string &path, const struct stat &existing);
   [[noreturn]] void fail() const;
 
   std::string name_;
+  std::string replacedPath_;
+  std::string kept_;
   std::unique_ptr<TemporaryFile> temporary_;
   int fd_ = -1;
 };

@@ -10,22 +10,36 @@
 #include <cstdio>
 #include <cstring>
 #include <fcntl.h>
-#include <fmt/core.h>
 #include <unistd.h>
+#include <utility>
 
 namespace nls2::tool {
 
 namespace {
 
-constexpr std::array endingSignals{SIGHUP, SIGINT, SIGQUIT, SIGTERM};
+// Those that end a process unless it handles them, and that others send or a clock does.
+constexpr std::array endingSignals{SIGHUP,    SIGINT,  SIGQUIT, SIGTERM,  SIGALRM,
+                                   SIGUSR1,   SIGUSR2, SIGXCPU, SIGPIPE,  SIGPOLL,
+                                   SIGVTALRM, SIGPROF, SIGPWR,  SIGSTKFLT};
 
-// The name that a signal handler has to remove. Changed only while the signals are held back.
-const char *volatile nameToRemove = nullptr;
+// The files that a signal handler has to remove. The list changes only while the signals are held
+// back, and while no other thread of the process could get them in this one's place.
+TemporaryFile *volatile firstNamed = nullptr;
+
+} // namespace
+
+void removeTemporaryFiles() {
+  for (TemporaryFile *file = firstNamed; file != nullptr; file = file->next_) {
+    if (file->toRemove_ != nullptr) {
+      unlink(file->toRemove_);
+    }
+  }
+}
+
+namespace {
 
 extern "C" void removeAndDie(int signal) {
-  if (nameToRemove != nullptr) {
-    unlink(nameToRemove);
-  }
+  removeTemporaryFiles();
   std::signal(signal, SIG_DFL);
   raise(signal); // delivered on return from the handler
 }
@@ -79,38 +93,71 @@ std::string takeFreeName(const std::string &target, Make make) {
       break;
     }
   }
-  throw Failure(fmt::format("cannot create a file beside {}: {}", target, std::strerror(errno)));
+  throw failure("cannot write {}: no new file in its directory: {}", printable(target),
+                std::strerror(errno));
 }
 
 } // namespace
 
-TemporaryFile::TemporaryFile(std::string target) : target_(std::move(target)) {
+void endBySignal(int signal) {
+  removeTemporaryFiles();
+  std::signal(signal, SIG_DFL);
+  sigset_t set;
+  sigemptyset(&set);
+  sigaddset(&set, signal);
+  pthread_sigmask(SIG_UNBLOCK, &set, nullptr);
+  raise(signal);
+  _exit(128 + signal);
+}
+
+TemporaryFile::TemporaryFile(std::string target, mode_t mode) : target_(std::move(target)) {
   catchEndingSignals();
-  fd_ = open(directoryOf(target_).c_str(), O_TMPFILE | O_RDWR | O_CLOEXEC, 0666);
+  fd_ = open(directoryOf(target_).c_str(), O_TMPFILE | O_RDWR | O_CLOEXEC, mode);
   if (fd_ >= 0 && access(ownPath(fd_).c_str(), F_OK) == 0) {
     return;
   }
   if (fd_ >= 0) {
     close(fd_);
   }
-  openNamed(); // file systems without unnamed files, and systems without /proc
+  openNamed(mode); // file systems without unnamed files, and systems without /proc
 }
 
 TemporaryFile::~TemporaryFile() {
   const SignalsHeldBack held;
-  nameToRemove = nullptr;
   if (!name_.empty()) {
+    leaveList();
     unlink(name_.c_str());
   }
-  close(fd_);
+  if (fd_ >= 0) {
+    close(fd_);
+  }
 }
 
-void TemporaryFile::openNamed() {
+void TemporaryFile::fail() const {
+  throw failure("cannot write {}: {}", printable(target_), std::strerror(errno));
+}
+
+void TemporaryFile::enlist() {
+  toRemove_ = name_.c_str();
+  next_ = firstNamed;
+  firstNamed = this;
+}
+
+void TemporaryFile::leaveList() {
+  toRemove_ = nullptr;
+  TemporaryFile *volatile *place = &firstNamed;
+  while (*place != this) {
+    place = &(*place)->next_;
+  }
+  *place = next_;
+}
+
+void TemporaryFile::openNamed(mode_t mode) {
   const SignalsHeldBack held;
   name_ = takeFreeName(target_, [&](const char *name) {
-    return fd_ = open(name, O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
+    return fd_ = open(name, O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, mode);
   });
-  nameToRemove = name_.c_str();
+  enlist();
 }
 
 // An unnamed file can take a free name only; the step from there to the target is a rename.
@@ -118,19 +165,33 @@ void TemporaryFile::giveTemporaryName() {
   name_ = takeFreeName(target_, [&](const char *name) {
     return linkat(AT_FDCWD, ownPath(fd_).c_str(), AT_FDCWD, name, AT_SYMLINK_FOLLOW);
   });
-  nameToRemove = name_.c_str();
+  enlist();
 }
 
-void TemporaryFile::publish() {
+// A file system may report only at close() that bytes were lost: before the name is taken.
+void TemporaryFile::publish(bool sync) {
   const SignalsHeldBack held;
   if (name_.empty()) {
     giveTemporaryName();
   }
-  if (std::rename(name_.c_str(), target_.c_str()) != 0) {
-    throw Failure(fmt::format("{}: {}", target_, std::strerror(errno)));
+  if ((sync && fsync(fd_) != 0) || close(std::exchange(fd_, -1)) != 0 ||
+      std::rename(name_.c_str(), target_.c_str()) != 0) {
+    fail();
   }
-  nameToRemove = nullptr;
+  leaveList();
   name_.clear();
+  if (sync) {
+    const int directory = open(directoryOf(target_).c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    const bool failed = directory < 0 || fsync(directory) != 0;
+    const int cause = errno;
+    if (directory >= 0) {
+      close(directory);
+    }
+    if (failed) {
+      errno = cause;
+      fail();
+    }
+  }
 }
 
 } // namespace nls2::tool

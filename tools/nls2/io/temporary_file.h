@@ -2,6 +2,7 @@
 #pragma once
 
 #include <string>
+#include <sys/types.h>
 
 namespace nls2::tool {
 
@@ -9,23 +10,34 @@ namespace nls2::tool {
 // gone; a signal that ends the process takes it along.
 class TemporaryFile {
 public:
-  // Throws Failure.
-  explicit TemporaryFile(std::string target);
+  // Throws Error.
+  TemporaryFile(std::string target, mode_t mode);
   ~TemporaryFile();
   TemporaryFile(const TemporaryFile &) = delete;
   TemporaryFile &operator=(const TemporaryFile &) = delete;
 
   int fd() const { return fd_; }
-  // Gives it the name, in place of the file that has it now. Throws Failure.
-  void publish();
+  // Closes it and gives it the name, in place of the file that has it now; `sync` also waits for
+  // the disk. Throws Error.
+  void publish(bool sync);
 
 private:
-  void openNamed();
+  friend void removeTemporaryFiles();
+
+  void openNamed(mode_t mode);
   void giveTemporaryName();
+  void enlist();
+  void leaveList();
+  [[noreturn]] void fail() const;
 
   const std::string target_;
-  std::string name_; // the temporary name, while there is one
+  std::string name_;                        // the temporary name, while there is one
+  const char *volatile toRemove_ = nullptr; // the same, for a signal handler
+  TemporaryFile *volatile next_ = nullptr;  // in the list of those that have a name
   int fd_ = -1;
 };
+
+// Ends the process as this signal does when nobody handles it; temporary files are removed.
+[[noreturn]] void endBySignal(int signal);
 
 } // namespace nls2::tool

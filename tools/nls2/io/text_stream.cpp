@@ -1,50 +1,28 @@
-// A text file in any encoding, read through the library's streams.
+// A text file in any encoding, read as UTF-8.
 
 #include "io/text_stream.h"
 
 #include "errors.h"
-#include "status.h"
 
-#include <cerrno>
-#include <cstdio>
-#include <cstring>
-#include <fmt/core.h>
-#include <unicode/localpointer.h>
-#include <unicode/ucnv.h>
-#include <unicode/uloc.h>
-#include <unicode/ustdio.h>
+#include <array>
+#include <new>
 #include <unicode/ustring.h>
 #include <unicode/utf16.h>
-#include <unistd.h>
 
 namespace nls2::tool {
 
 namespace {
 
-constexpr std::size_t chunkUnits = 16384;
+constexpr std::size_t chunkBytes = std::size_t{64} * 1024;
+constexpr std::size_t chunkUnits = std::size_t{16} * 1024;
 
-// A stream that opens would not tell: an empty name gets it no converter at all, and an unknown one
-// looks like a file that does not open.
-void requireEncoding(const std::string &encoding) {
-  UErrorCode status = U_ZERO_ERROR;
-  const icu::LocalUConverterPointer converter(ucnv_open(encoding.c_str(), &status));
-  if (encoding.empty() || U_FAILURE(status)) {
-    throw UsageError(fmt::format("--encoding '{}': {}", encoding,
-                                 encoding.empty() ? "a name is needed" : statusName(status)));
+void require(UErrorCode error) {
+  if (error == U_MEMORY_ALLOCATION_ERROR) {
+    throw std::bad_alloc();
   }
-}
-
-// Streams want a live object and do nothing with it. Objects can be made only under a default
-// locale that the library knows, so the user's is left aside.
-NLS2_Locale *makeLocale() {
-  UErrorCode error = U_ZERO_ERROR;
-  uloc_setDefault("en_US", &error);
-  int32_t status = 0;
-  NLS2_Locale *locale = NLS2_allocateLocale(&status);
-  if (locale == nullptr) {
-    throw Failure(fmt::format("cannot make a locale object: {}", statusName(status)));
+  if (U_FAILURE(error)) {
+    throw failure("cannot convert to UTF-8: {}", statusText(error));
   }
-  return locale;
 }
 
 void countAndSubstitute(const void *counter, UConverterToUnicodeArgs *arguments,
@@ -56,79 +34,57 @@ void countAndSubstitute(const void *counter, UConverterToUnicodeArgs *arguments,
   UCNV_TO_U_CALLBACK_SUBSTITUTE(nullptr, arguments, codeUnits, length, reason, error);
 }
 
-std::string toUtf8(const UChar *units, std::size_t length) {
-  std::string text(length * U8_MAX_LENGTH, '\0');
-  int32_t bytes = 0;
-  UErrorCode error = U_ZERO_ERROR;
-  u_strToUTF8WithSub(text.data(), static_cast<int32_t>(text.size()), &bytes, units,
-                     static_cast<int32_t>(length), 0xFFFD, nullptr, &error);
-  if (U_FAILURE(error)) {
-    throw Failure(fmt::format("cannot convert to UTF-8: {}", statusName(error)));
-  }
-  text.resize(static_cast<std::size_t>(bytes));
-  return text;
-}
-
 } // namespace
 
-TextStream::TextStream(const std::string &path, const std::string &encoding)
-    : path_(path == "-" ? "/dev/stdin" : path), units_(chunkUnits) {
-  requireEncoding(encoding);
-  locale_.reset(makeLocale());
-  open(encoding);
-  if (path == "-") {
-    // What was read of standard input before stays read.
-    const off_t position = lseek(STDIN_FILENO, 0, SEEK_CUR);
-    if (position > 0 && fseeko(u_fgetfile(stream_.get()), position, SEEK_SET) != 0) {
-      fail();
-    }
-  }
-}
-
-void TextStream::open(const std::string &encoding) {
-  errno = 0;
-  stream_ = {NLS2_OpenStream(locale_.get(), path_.c_str(), "r", encoding.c_str()),
-             Close{locale_.get()}};
-  if (!stream_) {
-    fail();
-  }
+TextStream::TextStream(const std::string &path, UConverter *converter)
+    : input_(path), converter_(converter) {
   UErrorCode error = U_ZERO_ERROR;
-  ucnv_setToUCallBack(u_fgetConverter(stream_.get()), countAndSubstitute, badSequences_.get(),
-                      nullptr, nullptr, &error);
-  if (U_FAILURE(error)) {
-    throw Failure(fmt::format("cannot read {}: {}", path_, statusName(error)));
-  }
-}
-
-void TextStream::fail() const {
-  throw Failure(fmt::format("cannot read {}: {}", path_,
-                            errno != 0 ? std::strerror(errno) : "it does not open"));
+  ucnv_reset(converter);
+  ucnv_setToUCallBack(converter, countAndSubstitute, &replaced_, nullptr, nullptr, &error);
+  require(error);
 }
 
 std::string TextStream::read() {
+  std::array<char, chunkBytes> bytes;
   std::string text;
-  std::size_t got = 0;
-  do {
-    got = fill();
-    // The first half of a pair waits for the second, unless nothing follows.
-    const std::size_t length = kept_ + got;
-    kept_ = got > 0 && U16_IS_LEAD(units_[length - 1]) ? 1 : 0;
-    text = toUtf8(units_.data(), length - kept_);
-    if (kept_ > 0) {
-      units_[0] = units_[length - 1];
-    }
-  } while (got > 0 && text.empty());
+  while (text.empty() && !ended_) {
+    const std::size_t length = input_.read(bytes.data(), bytes.size(), -1);
+    ended_ = length == 0;
+    decode(bytes.data(), length);
+    text = takeText();
+  }
   return text;
 }
 
-std::size_t TextStream::fill() {
-  errno = 0;
-  const int32_t got = NLS2_ReadString(locale_.get(), stream_.get(), units_.data() + kept_,
-                                      static_cast<int32_t>(units_.size() - kept_));
-  if (std::ferror(u_fgetfile(stream_.get())) != 0) {
-    fail();
+void TextStream::decode(const char *bytes, std::size_t length) {
+  const char *end = bytes + length;
+  UErrorCode error = U_BUFFER_OVERFLOW_ERROR;
+  while (error == U_BUFFER_OVERFLOW_ERROR) {
+    error = U_ZERO_ERROR;
+    std::array<UChar, chunkUnits> units;
+    UChar *target = units.data();
+    ucnv_toUnicode(converter_, &target, units.data() + units.size(), &bytes, end, nullptr,
+                   static_cast<UBool>(ended_), &error);
+    units_.append(units.data(), target);
   }
-  return static_cast<std::size_t>(got);
+  require(error);
+}
+
+// The first half of a pair waits for the second, unless nothing follows.
+std::string TextStream::takeText() {
+  const std::size_t kept = !ended_ && !units_.empty() && U16_IS_LEAD(units_.back()) ? 1 : 0;
+  const std::size_t length = units_.size() - kept;
+  std::string text(length * U8_MAX_LENGTH, '\0');
+  int32_t bytes = 0;
+  int32_t loneSurrogates = 0;
+  UErrorCode error = U_ZERO_ERROR;
+  u_strToUTF8WithSub(text.data(), static_cast<int32_t>(text.size()), &bytes, units_.data(),
+                     static_cast<int32_t>(length), 0xFFFD, &loneSurrogates, &error);
+  require(error);
+  units_.erase(0, length);
+  replaced_ += static_cast<uint64_t>(loneSurrogates);
+  text.resize(static_cast<std::size_t>(bytes));
+  return text;
 }
 
 } // namespace nls2::tool

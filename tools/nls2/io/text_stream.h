@@ -1,46 +1,39 @@
-// A text file in any encoding, read through the library's streams.
+// A text file in any encoding, read as UTF-8.
 #pragma once
 
-#include "nls2.h"
+#include "io/input_file.h"
 
 #include <cstdint>
-#include <memory>
 #include <string>
-#include <vector>
+#include <unicode/ucnv.h>
 
 namespace nls2::tool {
 
 class TextStream {
 public:
-  // "-" is standard input. Throws UsageError for an encoding that ICU does not have, Failure for a
-  // file that does not open.
-  TextStream(const std::string &path, const std::string &encoding);
+  // The converter must outlive the stream. "-" is standard input. Throws Error.
+  TextStream(const std::string &path, UConverter *converter);
+  TextStream(const TextStream &) = delete; // the converter counts into it
+  TextStream &operator=(const TextStream &) = delete;
 
-  // The next part of the text as UTF-8; empty at the end. Throws Failure.
+  // The next part of the text; empty at the end. Throws Error.
   std::string read();
 
-  // Byte sequences so far that are no text of the encoding; each was read as a substitute.
-  uint64_t badSequences() const { return *badSequences_; }
+  // So far: byte sequences that are not valid in the encoding, and lone surrogates, which UTF-8
+  // cannot hold. Each was replaced.
+  uint64_t replaced() const { return replaced_; }
+
+  const std::string &name() const { return input_.name(); }
 
 private:
-  struct Release {
-    void operator()(NLS2_Locale *locale) const { NLS2_ReleaseLocale(locale); }
-  };
-  struct Close {
-    const NLS2_Locale *locale;
-    void operator()(UFILE *stream) const { NLS2_CloseStream(locale, stream); }
-  };
+  void decode(const char *bytes, std::size_t length);
+  std::string takeText();
 
-  void open(const std::string &encoding);
-  std::size_t fill(); // the units that came behind those kept
-  [[noreturn]] void fail() const;
-
-  std::string path_;
-  std::unique_ptr<uint64_t> badSequences_ = std::make_unique<uint64_t>(0);
-  std::unique_ptr<NLS2_Locale, Release> locale_;
-  std::unique_ptr<UFILE, Close> stream_{nullptr, Close{nullptr}};
-  std::vector<UChar> units_;
-  std::size_t kept_ = 0; // units at the beginning that wait for what follows them
+  InputFile input_;
+  UConverter *converter_;
+  std::u16string units_; // decoded, but not yet handed out
+  uint64_t replaced_ = 0;
+  bool ended_ = false;
 };
 
 } // namespace nls2::tool

@@ -1,96 +1,116 @@
-// Records of the library's table of locales.
+// Records of the library's table of locales: which ones are meant.
 
 #include "locale/locale_lookup.h"
 
-#include "codepage/codepage_lookup.h"
-#include "errors.h"
-#include "number_option.h"
+#include "near_names.h"
+#include "options.h"
 
-#include <fmt/core.h>
+#include <algorithm>
 #include <set>
+#include <string_view>
+#include <strings.h>
+#include <unicode/uloc.h>
 
 namespace nls2::tool {
 
 namespace {
 
-using Json = nlohmann::ordered_json;
-
-struct Match {
-  const char *by;
-  Json records;
-};
-
-Match recordsWith(uint32_t number) {
-  Json records = describeRecords([=](const auto &entry) { return entry.languageId == number; });
-  if (!records.empty()) {
-    return {"language id", std::move(records)};
+template <class IsWanted>
+LocaleRecords recordsThat(IsWanted isWanted) {
+  LocaleRecords records;
+  for (const LocaleMapEntry *entry = localeMap; entry->languageId != NLS2_LANGUAGE_ID_END;
+       ++entry) {
+    if (isWanted(*entry)) {
+      records.push_back(entry);
+    }
   }
-  return {"code page", describeRecords([=](const auto &entry) {
-            return entry.asciiCcsid == number || entry.ebcdicCcsid == number;
-          })};
+  return records;
 }
 
-Match recordsWith(const std::string &name) {
-  return {"name", describeRecords([&](const auto &entry) {
+FoundLocales recordsWith(uint32_t number) {
+  LocaleRecords records =
+      recordsThat([=](const auto &entry) { return entry.languageId == number; });
+  if (!records.empty()) {
+    return {"language id", std::move(records), {}};
+  }
+  return {"code page",
+          recordsThat([=](const auto &entry) {
+            return entry.asciiCcsid == number || entry.ebcdicCcsid == number;
+          }),
+          {}};
+}
+
+FoundLocales recordsWith(const std::string &name) {
+  return {"name",
+          recordsThat([&](const auto &entry) {
             return entry.localeName == name || entry.shortName == name;
-          })};
+          }),
+          {}};
+}
+
+std::vector<std::string> namesOf(const LocaleRecords &records) {
+  std::vector<std::string> names;
+  for (const LocaleMapEntry *entry : records) {
+    names.emplace_back(entry->localeName);
+  }
+  return names;
+}
+
+// As the table spells names, but for case: without code set and modifier, and with underscores.
+std::string plainName(const std::string &asked) {
+  std::string name = asked.substr(0, asked.find_first_of(".@"));
+  std::replace(name.begin(), name.end(), '-', '_');
+  return name;
+}
+
+// The locale that people mean by a language alone: en_US by en.
+std::string usualLocaleOf(const std::string &language) {
+  char full[ULOC_FULLNAME_CAPACITY];
+  char country[ULOC_COUNTRY_CAPACITY];
+  UErrorCode status = U_ZERO_ERROR;
+  uloc_addLikelySubtags(language.c_str(), full, sizeof full, &status);
+  const int32_t length = uloc_getCountry(full, country, sizeof country, &status);
+  return U_SUCCESS(status) && length > 0 ? language + "_" + country : language;
 }
 
 } // namespace
 
-Json describeRecord(const LocaleMapEntry &entry) {
-  return {{"row", &entry - localeMap},
-          {"locale", entry.localeName},
-          {"shortName", entry.shortName},
-          {"languageId", entry.languageId},
-          {"languageIdHex", fmt::format("0x{:08X}", entry.languageId)},
-          {"country", entry.languageId >> 16},
-          {"language", entry.languageId & 0xFFFF},
-          {"asciiCcsid", entry.asciiCcsid},
-          {"ebcdicCcsid", entry.ebcdicCcsid}};
+LocaleRecords allLocales() {
+  return recordsThat([](const auto &) { return true; });
 }
 
-std::string recordsAsText(const Json &rows) {
-  std::string text =
-      fmt::format("{:>3}  {:<8} {:<8} {:<10} {:>10} {:>7} {:>8} {:>6} {:>6}\n", "row", "locale",
-                  "short", "id", "id", "country", "language", "ASCII", "EBCDIC");
-  for (const Json &row : rows) {
-    text += fmt::format("{:>3}  {:<8} {:<8} {:<10} {:>10} {:>7} {:>8} {:>6} {:>6}\n",
-                        row["row"].get<int>(), row["locale"].get<std::string>(),
-                        row["shortName"].get<std::string>(),
-                        row["languageIdHex"].get<std::string>(), row["languageId"].get<uint32_t>(),
-                        row["country"].get<uint32_t>(), row["language"].get<uint32_t>(),
-                        row["asciiCcsid"].get<uint32_t>(), row["ebcdicCcsid"].get<uint32_t>());
-  }
-  return text;
-}
-
-Json lookUpLocale(const std::string &asked) {
+FoundLocales lookUpLocale(const std::string &asked) {
   const auto number = wholeNumber(asked);
-  const Match match = number ? recordsWith(*number) : recordsWith(asked);
-  if (match.records.empty()) {
-    throw Failure(fmt::format("no locale has the {} {}; `nls2 locales` lists them all",
-                              number ? "language id or code page" : "locale name or short name",
-                              asked));
+  FoundLocales found = number ? recordsWith(*number) : recordsWith(asked);
+  if (found.records.empty()) {
+    throw failure("no locale has the {} {}{}; `nls2 locales` lists them all",
+                  number ? "language id or code page" : "locale name or short name",
+                  printable(asked), number ? "" : didYouMean(nearLocales(asked)));
   }
   std::set<int32_t> pages;
-  for (const Json &record : match.records) {
-    pages.insert(record["asciiCcsid"].get<int32_t>());
-    pages.insert(record["ebcdicCcsid"].get<int32_t>());
+  for (const LocaleMapEntry *entry : found.records) {
+    pages.insert(static_cast<int32_t>(entry->asciiCcsid));
+    pages.insert(static_cast<int32_t>(entry->ebcdicCcsid));
   }
-  Json codepages = Json::array();
   for (const int32_t page : pages) {
-    codepages.push_back(describeCodepage(page));
+    found.pages.push_back(describePage(page));
   }
-  return {{"matchedBy", match.by}, {"records", match.records}, {"codepages", codepages}};
+  return found;
 }
 
-std::string foundLocaleAsText(const Json &found) {
-  std::string text = recordsAsText(found["records"]);
-  for (const Json &description : found["codepages"]) {
-    text += "\n" + descriptionAsText(description);
+std::vector<std::string> nearLocales(const std::string &asked) {
+  const std::string name = plainName(asked);
+  const std::string language = name.substr(0, name.find('_'));
+  const auto spelled = [](const std::string &wanted) {
+    return namesOf(recordsThat(
+        [&](const auto &entry) { return strcasecmp(entry.localeName, wanted.c_str()) == 0; }));
+  };
+  for (const std::string &wanted : {name, usualLocaleOf(language)}) {
+    if (std::vector<std::string> names = spelled(wanted); !names.empty()) {
+      return names;
+    }
   }
-  return text;
+  return nearNames(name, namesOf(allLocales()));
 }
 
 } // namespace nls2::tool

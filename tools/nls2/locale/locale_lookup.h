@@ -1,33 +1,36 @@
-// Records of the library's table of locales.
+// Records of the library's table of locales: which ones are meant, as text and as JSON.
 #pragma once
 
+#include "codepage/codepage_lookup.h"
+#include "json.h"
 #include "nls2.h"
 
-#include <nlohmann/json.hpp>
 #include <string>
+#include <vector>
 
 namespace nls2::tool {
 
-nlohmann::ordered_json describeRecord(const LocaleMapEntry &entry);
+using LocaleRecords = std::vector<const LocaleMapEntry *>;
 
-template <class Wanted>
-nlohmann::ordered_json describeRecords(Wanted wanted) {
-  nlohmann::ordered_json rows = nlohmann::ordered_json::array();
-  for (const LocaleMapEntry *entry = localeMap; entry->languageId != NLS2_LANGUAGE_ID_END;
-       ++entry) {
-    if (wanted(*entry)) {
-      rows.push_back(describeRecord(*entry));
-    }
-  }
-  return rows;
-}
+LocaleRecords allLocales();
 
-// A heading and one line a record.
-std::string recordsAsText(const nlohmann::ordered_json &rows);
+struct FoundLocales {
+  const char *matchedBy = "";
+  LocaleRecords records;
+  std::vector<PageFacts> pages; // the records' code pages, each once
+};
 
-// The records with a language id, a locale name or short POSIX name, or a code page, and their code
-// pages. Throws Failure where there is none.
-nlohmann::ordered_json lookUpLocale(const std::string &asked);
-std::string foundLocaleAsText(const nlohmann::ordered_json &found);
+// The records with a language id, a locale name or short POSIX name, or a code page. Throws Error
+// where there is none.
+FoundLocales lookUpLocale(const std::string &asked);
+
+// Names of the table that somebody may have meant who wrote de-DE, DE_de, de_DE.UTF-8 or de_XX.
+std::vector<std::string> nearLocales(const std::string &asked);
+
+std::string localesAsText(const LocaleRecords &records); // a heading and one line a record
+std::string foundLocalesAsText(const FoundLocales &found);
+
+Json localesAsJson(const LocaleRecords &records);
+Json foundLocalesAsJson(const FoundLocales &found);
 
 } // namespace nls2::tool

@@ -4,12 +4,9 @@
 
 #include "errors.h"
 #include "nls2.h"
-#include "number_option.h"
-#include "status.h"
 
 #include <charconv>
 #include <fmt/core.h>
-#include <limits>
 #include <string_view>
 #include <unicode/uloc.h>
 #include <unicode/utypes.h>
@@ -50,40 +47,42 @@ const LocaleMapEntry *findLocale(const std::string &text) {
 void makeDefault(const std::string &text) {
   const LocaleMapEntry *entry = findLocale(text);
   if (entry == nullptr) {
-    throw UsageError(fmt::format(
-        "--locale: \"{}\" is no locale; `nls2 locales` lists names and language ids", text));
+    throw usageError("--locale: \"{}\" is no locale; `nls2 locales` lists names and language ids",
+                     text);
   }
   UErrorCode error = U_ZERO_ERROR;
   uloc_setDefault(entry->localeName, &error);
   if (U_FAILURE(error)) {
-    throw UsageError(fmt::format("--locale: {}: {}", text, statusName(error)));
+    throw usageError("--locale: {}: {}", text, statusText(error));
   }
 }
 
 } // namespace
 
-void addLocaleOptions(CLI::App &command, LocaleOptions &options) {
-  command
-      .add_option("--locale", options.locale,
-                  "whose rules: a name or a language id (decimal or 0x...) of `nls2 locales`; the "
-                  "default is the environment's locale (LC_ALL, LC_MESSAGES or LANG), of which C "
-                  "sorts ASCII by its codes")
-      ->type_name("NAME-OR-ID");
-  addNumber(command, "--codepage", options.codepage, std::numeric_limits<int32_t>::min(),
-            std::numeric_limits<int32_t>::max(), "code page of all texts; 1208 (UTF-8) by default");
+std::vector<Option> localeOptions(LocaleOptions &options) {
+  return {{.name = "locale",
+           .metavar = "LOCALE",
+           .help = "whose rules: a name or language id of `nls2 locales`",
+           .take = [&options](const std::string &text) { options.locale = text; }},
+          {.name = "codepage",
+           .metavar = "PAGE",
+           .help = "code page of all texts; 1208 (UTF-8) by default",
+           .take = [&options](const std::string &text) {
+             options.codepage = parsePage("--codepage", text);
+           }}};
 }
 
 LocaleObject::LocaleObject(const LocaleOptions &options) {
-  requireCodePage(options.codepage, "--codepage");
+  const CodePage opens(options.codepage, "--codepage");
   if (options.locale) {
     makeDefault(*options.locale);
   }
   int32_t status = U_ZERO_ERROR;
   pLocale_ = NLS2_GetLocale(0, 0, 0, &status);
   if (pLocale_ == nullptr) {
-    throw UsageError(fmt::format("no locale object for the environment's locale {}: {}; give "
-                                 "--locale",
-                                 uloc_getDefault(), statusName(status)));
+    throw usageError("no locale object for the environment's locale {}: {}; give "
+                     "--locale",
+                     uloc_getDefault(), statusText(status));
   }
   NLS2_SetLocaleNumInfo(pLocale_, NLS2_ATTRIBUTE_CODEPAGE, static_cast<uint32_t>(options.codepage),
                         0);

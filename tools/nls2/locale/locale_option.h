@@ -2,8 +2,8 @@
 #pragma once
 
 #include "codepage/code_page.h"
+#include "options.h"
 
-#include <CLI/CLI.hpp>
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -17,11 +17,11 @@ struct LocaleOptions {
   int32_t codepage = utf8Page;
 };
 
-void addLocaleOptions(CLI::App &command, LocaleOptions &options);
+std::vector<Option> localeOptions(LocaleOptions &options);
 
 class LocaleObject {
 public:
-  // Throws UsageError.
+  // Throws Error.
   explicit LocaleObject(const LocaleOptions &options);
   ~LocaleObject();
   LocaleObject(const LocaleObject &) = delete;

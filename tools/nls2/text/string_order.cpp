@@ -4,7 +4,6 @@
 
 #include "errors.h"
 #include "nls2.h"
-#include "status.h"
 
 #include <fmt/core.h>
 #include <unicode/utypes.h>
@@ -21,7 +20,7 @@ int32_t StringOrder::compare(std::string_view a, std::string_view b) const {
   const int32_t order = NLS2_Strcoll(locale_.get(), a.data(), static_cast<int16_t>(a.size()),
                                      b.data(), static_cast<int16_t>(b.size()), options_, &status);
   if (status > U_ZERO_ERROR) {
-    throw Failure(fmt::format("cannot compare: {}", statusName(status)));
+    throw failure("cannot compare: {}", statusText(status));
   }
   return order;
 }

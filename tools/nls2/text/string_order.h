@@ -15,7 +15,7 @@ class StringOrder {
 public:
   static constexpr int32_t mostBytes = INT16_MAX; // of a string; the library's lengths have 16 bits
 
-  // Throws UsageError.
+  // Throws Error.
   StringOrder(const LocaleOptions &locale, bool ignoreTrailing);
 
   // Why a string cannot be compared; nothing where it can.

@@ -2,20 +2,16 @@
 
 #include "text/text_check.h"
 
-#include "nls2.h"
-#include "status.h"
+#include "errors.h"
 
 #include <fmt/core.h>
 
 namespace nls2::tool {
 
 TextCheck::TextCheck(int32_t page, std::size_t mostBytes, Nulls nulls)
-    : page_(page), mostBytes_(mostBytes), nulls_(nulls) {
-  int32_t twoNull = 0;
-  int32_t status = U_ZERO_ERROR;
-  converter_.adoptInstead(NLS2_MapCodepageIdToName(page, &twoNull, &status));
+    : page_(page, "--codepage"), mostBytes_(mostBytes), nulls_(nulls) {
   UErrorCode error = U_ZERO_ERROR;
-  ucnv_setToUCallBack(converter_.getAlias(), UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr,
+  ucnv_setToUCallBack(page_.converter(), UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr,
                       &error);
 }
 
@@ -23,7 +19,7 @@ UErrorCode TextCheck::convert(std::string_view text) {
   for (;;) {
     UErrorCode error = U_ZERO_ERROR;
     length_ = static_cast<std::size_t>(
-        ucnv_toUChars(converter_.getAlias(), buffer_.data(), static_cast<int32_t>(buffer_.size()),
+        ucnv_toUChars(page_.converter(), buffer_.data(), static_cast<int32_t>(buffer_.size()),
                       text.data(), static_cast<int32_t>(text.size()), &error));
     if (error != U_BUFFER_OVERFLOW_ERROR) {
       return error;
@@ -44,7 +40,8 @@ std::optional<std::string> TextCheck::refusal(std::string_view text) {
   }
   const UErrorCode error = convert(text);
   if (U_FAILURE(error)) {
-    return fmt::format("the bytes are not text of code page {}: {}", page_, statusName(error));
+    return fmt::format("the bytes are not text of code page {}: {}", page_.number(),
+                       statusText(error));
   }
   if (nulls_ == Nulls::endText && hasTextBehindNull()) {
     return "text stands behind a null (U+0000), where it would not be seen";

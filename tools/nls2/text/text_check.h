@@ -2,12 +2,13 @@
 // word, and some of its functions look no further than the first null.
 #pragma once
 
+#include "codepage/code_page.h"
+
 #include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
-#include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
 
 namespace nls2::tool {
@@ -27,10 +28,9 @@ private:
   UErrorCode convert(std::string_view text);
   bool hasTextBehindNull() const;
 
-  const int32_t page_;
+  const CodePage page_;
   const std::size_t mostBytes_;
   const Nulls nulls_;
-  icu::LocalUConverterPointer converter_;
   std::u16string buffer_;
   std::size_t length_ = 0; // of the last text, in the buffer
 };

@@ -1,0 +1,97 @@
+// Streams on real files: lines of every end, and the failures that the C interface does not report.
+
+#include "cpp/failure.h"
+
+#include <fstream>
+#include <unistd.h>
+
+namespace {
+
+using namespace std::string_literals;
+using nls2::stream;
+
+class Streams : public WithDefaultLocale {
+protected:
+  ~Streams() override { unlink(path.c_str()); }
+  stream open(std::string_view mode, std::string_view encoding = "UTF-8") {
+    return nls2::open_stream(where, path, mode, encoding);
+  }
+  void expectBytes(const std::string &expected) {
+    std::string bytes;
+    std::getline(std::ifstream(path, std::ios::binary), bytes, '\0');
+    EXPECT_EQ(bytes, expected);
+  }
+
+  nls2::locale where = nls2::default_locale();
+  const std::string path = testing::TempDir() + "nls2_cpp_" + std::to_string(getpid());
+};
+
+TEST_F(Streams, LinesEndWhereTheyEnd) {
+  for (const std::size_t length : {1U, 254U, 255U, 256U, 510U}) { // pieces have 255 units
+    const std::u16string text(length, u'x');
+    const std::u16string lines[] = {text, u"", u"\U0001F600", u"a\0\uFFFF"s + text, u"", text};
+    for (const std::u16string_view end :
+         {u"\n", u"\v", u"\f", u"\r", u"\r\n", u"\x85", u"\u2028", u"\u2029"}) {
+      stream file = open("w+");
+      for (const std::u16string &line : lines) {
+        file.write(line + (&line == std::end(lines) - 1 ? u"" : std::u16string(end)));
+      }
+      file.rewind();
+      std::u16string line;
+      for (const std::u16string &expected : lines) {
+        EXPECT_TRUE(file.read_line(line) && line == expected) << length << " " << int{end[0]};
+      }
+      EXPECT_FALSE(file.read_line(line));
+      file.rewind();
+      file.read_line(line);
+      std::array<char16_t, 3> next{}; // what a carriage return made it look at comes first
+      EXPECT_TRUE(file.read(std::span(next).first(1)) == 1 && next[0] == end[0]);
+      EXPECT_TRUE(file.read(next) == 3 && next[end.size() - 1] == 0xD83D);
+    }
+  }
+}
+
+TEST_F(Streams, OwnTheirFile) {
+  stream file = open("w", "ibm-1141");
+  file.write_line(u"Gr\u00FC\u00DFe");
+  file.flush();
+  expectBytes("\xC7\x99\xD0\xA1\x85\x25");
+  stream other(std::move(file));
+  other = std::move(*&other);
+  other.reset(other.get());
+  ASSERT_TRUE(!file && other);
+  file = std::move(other);
+  where.reset(); // a stream may outlive its locale, but not work without
+  EXPECT_EQ(STATUS_OF(file.write(u"x", error)), 38);
+  EXPECT_EQ(STATUS_OF(file.close(error)), 38);
+  EXPECT_FALSE(file);
+  EXPECT_EQ(STATUS_OF(file.write(u"x", error)), 37);
+}
+
+TEST_F(Streams, ReportWhatIsRefused) {
+  std::u16string line;
+  std::error_code cause;
+  EXPECT_FALSE(nls2::open_stream(where, "/", "r", "UTF-8").read_line(line, cause));
+  EXPECT_EQ(cause, std::errc::is_a_directory);
+  stream full = nls2::open_stream(where, "/dev/full", "w", "UTF-8");
+  full.write(u"x", cause);
+  full.close(cause);
+  EXPECT_EQ(cause, std::errc::no_space_on_device);
+  EXPECT_FALSE(nls2::open_stream(where, "/nowhere/x", "r", "UTF-8", cause));
+  EXPECT_EQ(cause, std::errc::no_such_file_or_directory);
+  open("w").write(u"keep");
+  const auto status = [&](const std::string &name, std::string_view mode, std::string_view code) {
+    return STATUS_OF(nls2::open_stream(where, name, mode, code, error));
+  };
+  EXPECT_EQ(status(path, "w", "no-such-page"), 4);
+  EXPECT_EQ(status(path, "w", ""), 37);
+  EXPECT_EQ(status(path, "w", "UTF-8\0"s), 37);
+  EXPECT_EQ(status(path, "w\0"s, "UTF-8"), 37);
+  EXPECT_EQ(status(path + "\0x"s, "w", "UTF-8"), 37);
+  EXPECT_EQ(status(path, "w+++++++", "UTF-8"), 31);
+  where.reset();
+  EXPECT_EQ(status(path, "w", "UTF-8"), 38);
+  expectBytes("keep");
+}
+
+} // namespace

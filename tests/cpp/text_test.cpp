@@ -1,0 +1,113 @@
+// Conversion, comparison and search: the C interface's answers, with lengths and nulls checked.
+
+#include "cpp/failure.h"
+
+namespace {
+
+using namespace std::string_literals;
+using nls2::code_page;
+using nls2::locale;
+
+nls2::locale in(int page, std::string_view name = "de_DE") {
+  return nls2::make_locale(nls2::language_id::from_name(name), code_page(page));
+}
+
+// The whole output fits a span of its size, and no smaller one.
+template <class Output, class Convert>
+void expectSpans(const Output &expected, Convert convert) {
+  Output out = expected;
+  std::error_code none;
+  EXPECT_EQ(convert(out, none), expected.size());
+  EXPECT_EQ(out, expected);
+  if (!out.empty()) {
+    out.pop_back();
+    EXPECT_EQ(STATUS_OF(convert(out, error)), U_BUFFER_OVERFLOW_ERROR);
+  }
+}
+
+class Text : public WithDefaultLocale {};
+
+TEST_F(Text, ConvertsByteForByteInEveryForm) {
+  const code_page utf8(1208);
+  for (const int number : {37, 930, 1141, 1200, 1204, 1208, 57361, 57363, 57369}) {
+    const locale where = in(number);
+    const code_page page(number);
+    const std::string grows(100, 'x'); // to four bytes each in UTF-32
+    for (const std::string &text : {""s, "A"s, "Gr\u00FC\u00DFe \u65E5"s, "a\0b"s, grows}) {
+      SCOPED_TRACE(std::to_string(number) + " " + text);
+      std::string c(2000, '?');
+      int32_t status = 0;
+      const auto length = static_cast<int32_t>(text.size());
+      c.resize(static_cast<std::size_t>(
+          NLS2_fromUTF8(where.get(), c.data(), 2000, text.data(), length, &status)));
+      EXPECT_EQ(from_utf8(where, text), c);
+      EXPECT_EQ(translate(page, utf8, text), c);
+      const std::string back = to_utf8(where, c);
+      EXPECT_EQ(translate(utf8, page, c), back);
+      const std::u16string units = to_utf16(where, c);
+      EXPECT_EQ(to_utf16(in(1208), back), units);
+      EXPECT_EQ(from_utf16(where, units), c);
+      expectSpans(c, [&](auto &out, auto &e) { return from_utf8(where, text, out, e); });
+      expectSpans(back, [&](auto &out, auto &e) { return to_utf8(where, c, out, e); });
+      expectSpans(units, [&](auto &out, auto &e) { return to_utf16(where, c, out, e); });
+      expectSpans(c, [&](auto &out, auto &e) { return from_utf16(where, units, out, e); });
+      expectSpans(c, [&](auto &out, auto &e) { return translate(page, utf8, text, out, e); });
+    }
+  }
+}
+
+TEST_F(Text, ThatIsTooLongOrHasNoPageIsRefused) {
+  const std::string_view bytes("x", 0x80000000U);
+  const std::u16string_view units(u"x", 0x80000000U);
+  const locale where = in(37);
+  std::array<char, 8> room{};
+  EXPECT_EQ(STATUS_OF(to_utf8(where, bytes, error)), 31);
+  EXPECT_EQ(STATUS_OF(from_utf16(where, units, room, error)), 31);
+  EXPECT_EQ(STATUS_OF(translate(code_page(37), code_page(37), bytes, room, error)), 31);
+  EXPECT_EQ(STATUS_OF(contains(where, bytes, "x", error)), 31);
+  EXPECT_EQ(STATUS_OF(to_utf8(in(4711), "x", error)), 4);
+  EXPECT_EQ(STATUS_OF(to_utf16(locale(), "x", error)), 38);
+  EXPECT_THROW(translate(code_page(0), code_page(37), "x"), nls2::error);
+}
+
+TEST_F(Text, IsComparedByTheRulesOfTheLanguage) {
+  using enum nls2::trailing_blanks;
+  const locale german = in(1208);
+  EXPECT_TRUE(compare(german, "\u00E4", "z") < 0 && compare(in(1208, "sv_SE"), "\u00E4", "z") > 0);
+  EXPECT_TRUE(compare(german, "a ", "a") > 0 && compare(german, "a \t", "a", ignore) == 0);
+  EXPECT_TRUE(compare(german, "a\0"s, "a") == 0 && compare(german, "a\0b"s, "ac") < 0);
+  const std::string most(32767, 'x');
+  EXPECT_TRUE(compare(german, most, most.substr(1)) > 0 && compare(german, "", most) < 0);
+  EXPECT_EQ(STATUS_OF(compare(german, most + 'x', "", error)), 31);
+  EXPECT_EQ(STATUS_OF(compare(german, "", most + 'x', error)), 31);
+  EXPECT_EQ(STATUS_OF(compare(locale(), "b", "a", error)), 38);
+  EXPECT_EQ(STATUS_OF(compare(in(4711), "b", "a", ignore, error)), 4);
+}
+
+TEST_F(Text, WithANullIsRefusedWhereTheSearchWouldEnd) {
+  const auto expectStatus = [](int expected, int page, const std::string &text) {
+    const locale where = in(page);
+    const auto ignore = nls2::trailing_blanks::ignore;
+    EXPECT_EQ(STATUS_OF(compare(where, text, "", ignore, error)), expected) << page << text;
+    EXPECT_EQ(STATUS_OF(contains(where, "", text, error)), expected) << page << text;
+  };
+  expectStatus(0, 1208, "a b");
+  expectStatus(37, 1208, std::string(300, 'x') + '\0');
+  expectStatus(0, 1200, "\0a\0b"s);
+  expectStatus(37, 1200, "\0a\0\0"s);
+  expectStatus(37, 57366, "a+AAA-b"); // UTF-7: a null without a zero byte
+}
+
+TEST_F(Text, IsFound) {
+  using enum nls2::letter_case;
+  const locale german = in(1208);
+  EXPECT_TRUE(contains(german, "Stra\u00DFe", "\u00DF") && contains(german, "", ""));
+  EXPECT_FALSE(contains(german, "Stra\u00DFe", "STRA"));
+  EXPECT_TRUE(contains(german, "Stra\u00DFe", "STRA", ignore));
+  EXPECT_EQ(STATUS_OF(contains(german, "\u0130", "i", ignore, error)), 16) << "it grows";
+  const nls2::unicode_signature signature = nls2::detect_unicode_signature("\xEF\xBB\xBFx");
+  EXPECT_TRUE(signature.encoding == "UTF-8" && signature.length == 3);
+  EXPECT_TRUE(nls2::detect_unicode_signature({}).encoding.empty());
+}
+
+} // namespace

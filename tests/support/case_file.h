@@ -1,0 +1,46 @@
+// Test cases in text files, which hold what a test expects.
+//
+//   # a comment
+//   == why this case exists
+//   key value
+//
+// A key may occur several times. An empty line ends a case. Whatever does not fit this is an error
+// that names the file and the line.
+#pragma once
+
+#include <stdexcept>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace support {
+
+struct CaseLine {
+  std::string key, value, place; // the place is "file:line"
+
+  std::runtime_error error(const std::string &what) const;
+  // The value with its escapes decoded: \n \t \0 \\ \xHH, \uHHHH and \UHHHHHHHH (a unit in the
+  // machine's byte order), \*COUNTc and \*COUNT(TEXT) (that many times).
+  std::string bytes() const;
+  // The value as a number, in hex after 0x. The second splits it at its first blank.
+  long long number() const;
+  std::pair<std::string, CaseLine> firstWord() const;
+};
+
+struct Case {
+  std::string why, place;
+  std::vector<CaseLine> lines;
+};
+
+// The cases of a file, in whose lines only these keys may occur; at least one.
+std::vector<Case> readCases(const std::string &path, const std::vector<std::string> &keys);
+
+// Every *.cases file of a folder in the order of their names; at least one.
+std::vector<std::string> caseFiles(const std::string &folder);
+
+// Empty where the two are alike. Otherwise writes the actual text to `folder`, in a file called as
+// `name`, and returns a message that names it and the first line that differs.
+std::string difference(const std::string &expected, const std::string &actual,
+                       const std::string &folder, const std::string &name);
+
+} // namespace support

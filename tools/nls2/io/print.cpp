@@ -1,0 +1,15 @@
+// Text on standard output, for commands that write it at once.
+
+#include "io/print.h"
+
+#include "io/output_file.h"
+
+namespace nls2::tool {
+
+void print(std::string_view text) {
+  OutputFile out("-");
+  out.write(text);
+  out.commit();
+}
+
+} // namespace nls2::tool

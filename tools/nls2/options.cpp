@@ -1,0 +1,217 @@
+// The command line: the parser of options and operands, and --help.
+
+#include "options.h"
+
+#include "near_names.h"
+
+#include <algorithm>
+#include <charconv>
+#include <getopt.h>
+#include <utility>
+
+namespace nls2::tool {
+
+namespace {
+
+// What getopt_long returns for the long option at an index of the table; letters come as they are.
+constexpr int firstLong = 256;
+
+const Option helpOption{.name = "help", .letter = 'h', .help = "print this help", .take = {}};
+const Option versionOption{
+    .name = "version", .help = "print how the library was built", .take = {}};
+
+using Given = std::vector<std::pair<const Option *, std::string>>;
+
+// The tables of a command as getopt_long wants them.
+class Getopt {
+public:
+  explicit Getopt(const Command &command) {
+    for (const Option &each : command.options) {
+      add(each);
+    }
+    add(helpOption);
+    add(versionOption);
+    long_.push_back({});
+  }
+
+  // The next option with its value; null when only operands are left. Throws usageError.
+  const Option *next(int argc, char **argv) {
+    const int code = getopt_long(argc, argv, letters_.c_str(), long_.data(), nullptr);
+    if (code == -1) {
+      return nullptr;
+    }
+    if (code == ':') {
+      const Option &option = optionOf(optopt);
+      throw usageError("--{} needs a value: {}", option.name, option.metavar);
+    }
+    if (code == '?') {
+      throw unknown(optopt, argv[optind - 1]);
+    }
+    return &optionOf(code);
+  }
+
+private:
+  void add(const Option &added) {
+    const int takesValue = added.metavar != nullptr ? required_argument : no_argument;
+    long_.push_back(
+        {added.name, takesValue, nullptr, firstLong + static_cast<int>(options_.size())});
+    options_.push_back(&added);
+    if (added.letter != '\0') {
+      letters_.append(1, added.letter).append(takesValue != 0 ? ":" : "");
+    }
+  }
+
+  const Option &optionOf(int code) const {
+    if (code >= firstLong) {
+      return *options_[static_cast<std::size_t>(code - firstLong)];
+    }
+    return **std::find_if(options_.begin(), options_.end(),
+                          [=](const Option *option) { return option->letter == code; });
+  }
+
+  Error unknown(int code, const std::string &word) const {
+    if (code >= firstLong) {
+      return usageError("--{} takes no value", optionOf(code).name);
+    }
+    std::vector<std::string> names;
+    for (const Option *option : options_) {
+      names.push_back(std::string("--") + option->name);
+    }
+    if (code != 0) {
+      std::erase_if(names, [=](const std::string &name) { return name[2] != code; });
+      return usageError("unknown option -{}{}", printable(std::string(1, static_cast<char>(code))),
+                        didYouMean(names));
+    }
+    const std::string name = word.substr(0, word.find('='));
+    std::vector<std::string> longer;
+    std::copy_if(names.begin(), names.end(), std::back_inserter(longer),
+                 [&](const std::string &known) { return known.starts_with(name); });
+    return usageError("unknown option {}{}", printable(name),
+                      didYouMean(longer.empty() ? nearNames(name, names) : longer));
+  }
+
+  std::vector<const Option *> options_;
+  std::vector<option> long_;
+  std::string letters_ = ":"; // a missing value is a fault of its own
+};
+
+void checkOperands(const Command &command, int count, char **operands) {
+  auto left = static_cast<std::size_t>(count);
+  const Operand *missing = nullptr;
+  for (const Operand &operand : command.operands) {
+    missing = missing == nullptr && left < operand.least ? &operand : missing;
+    left -= std::min(left, operand.most);
+  }
+  if (left > 0) {
+    throw usageError("extra operand {}",
+                     printable(operands[static_cast<std::size_t>(count) - left]));
+  }
+  if (missing != nullptr) {
+    throw usageError("{} is missing", missing->metavar);
+  }
+}
+
+void checkRequired(const Command &command, const Given &given) {
+  for (const Option &option : command.options) {
+    if (option.isRequired && std::none_of(given.begin(), given.end(), [&](const auto &each) {
+          return each.first == &option;
+        })) {
+      throw usageError("--{} {} is missing", option.name, option.metavar);
+    }
+  }
+}
+
+std::string usageOf(const char *name, const Command &command) {
+  std::string text = fmt::format("Usage: nls2 {}", name);
+  for (const Option &option : command.options) {
+    text += option.isRequired ? fmt::format(" --{} {}", option.name, option.metavar) : "";
+  }
+  text += " [OPTION]...";
+  for (const Operand &operand : command.operands) {
+    const char *more = operand.most == Operand::anyNumber ? "..." : "";
+    text += operand.least == 0 ? fmt::format(" [{}]{}", operand.metavar, more)
+                               : fmt::format(" {}{}", operand.metavar, more);
+  }
+  return text + "\n";
+}
+
+std::string helpLine(const std::string &what, const char *help) {
+  return fmt::format("  {:<24} {}\n", what, help);
+}
+
+std::string helpLine(const Option &option) {
+  std::string what = option.letter != '\0' ? fmt::format("-{}, ", option.letter) : "";
+  what += fmt::format("--{}", option.name);
+  return helpLine(option.metavar != nullptr ? what + " " + option.metavar : what, option.help);
+}
+
+} // namespace
+
+Request parse(const Command &command, int argc, char **argv) {
+  Getopt getopt(command);
+  Given given;
+  while (const Option *option = getopt.next(argc, argv)) {
+    if (option == &helpOption || option == &versionOption) {
+      return option == &helpOption ? Request::help : Request::version;
+    }
+    given.emplace_back(option, optarg != nullptr ? optarg : "");
+  }
+  char **operands = argv + optind;
+  checkOperands(command, argc - optind, operands);
+  checkRequired(command, given);
+  for (const auto &[option, value] : given) {
+    option->take(value);
+  }
+  for (const Operand &operand : command.operands) {
+    for (std::size_t i = 0; i < operand.most && operands != argv + argc; ++i) {
+      operand.take(*operands++);
+    }
+  }
+  return Request::work;
+}
+
+std::string helpOf(const CommandEntry &entry, const Command &command) {
+  std::string text = usageOf(entry.name, command) + entry.summary + ".\n\n";
+  for (const Operand &operand : command.operands) {
+    text += helpLine(operand.metavar, operand.help);
+  }
+  for (const Option &option : command.options) {
+    text += helpLine(option);
+  }
+  text += helpLine(helpOption) + helpLine(versionOption) + "\n";
+  return text + command.notes + "See nls2(1).\n";
+}
+
+int32_t parseNumber(const char *option, const std::string &text, int32_t least, int32_t most) {
+  const char *end = text.data() + text.size();
+  int32_t number = 0;
+  const auto [stop, error] = std::from_chars(text.data(), end, number);
+  if (error != std::errc() || stop != end || number < least || number > most) {
+    throw usageError("{}: \"{}\" is not a number from {} to {}", option, printable(text), least,
+                     most);
+  }
+  return number;
+}
+
+std::optional<uint32_t> wholeNumber(const std::string &text) {
+  const bool hexadecimal = text.starts_with("0x") || text.starts_with("0X");
+  const char *start = text.data() + (hexadecimal ? 2 : 0);
+  const char *end = text.data() + text.size();
+  uint32_t number = 0;
+  const auto [stop, error] = std::from_chars(start, end, number, hexadecimal ? 16 : 10);
+  return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
+}
+
+Take into(std::string &value) {
+  return [&value](const std::string &text) { value = text; };
+}
+
+Take into(std::vector<std::string> &values) {
+  return [&values](const std::string &text) { values.push_back(text); };
+}
+
+Take into(bool &flag) {
+  return [&flag](const std::string &) { flag = true; };
+}
+
+} // namespace nls2::tool
