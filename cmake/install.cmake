@@ -3,13 +3,23 @@
 
 include(CMakePackageConfigHelpers)
 
+# What names no component serves those who build programs.
+set(CMAKE_INSTALL_DEFAULT_COMPONENT_NAME development)
 set(_package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/zelnls2)
 
 set_target_properties(zelnls2 PROPERTIES INSTALL_RPATH "$ORIGIN")
 install(
-  TARGETS zelnls2 zelhost
+  TARGETS zelnls2
   EXPORT zelnls2Targets
-  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR})
+  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
+          COMPONENT library
+          NAMELINK_COMPONENT development)
+install(
+  TARGETS zelhost
+  EXPORT zelnls2Targets
+  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
+          COMPONENT command
+          NAMELINK_COMPONENT development)
 install(FILES ${PROJECT_SOURCE_DIR}/include/nls2.h ${PROJECT_SOURCE_DIR}/include/nls2.hpp
         DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/include/nls2 DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
@@ -19,11 +29,19 @@ install(FILES ${PROJECT_SOURCE_DIR}/host/trc1.h ${PROJECT_SOURCE_DIR}/host/sys1.
 if(ZELNLS2_BUILD_TOOL)
   file(RELATIVE_PATH _lib_from_bin ${CMAKE_INSTALL_FULL_BINDIR} ${CMAKE_INSTALL_FULL_LIBDIR})
   set_target_properties(nls2 PROPERTIES INSTALL_RPATH "$ORIGIN/${_lib_from_bin}")
-  install(TARGETS nls2 DESTINATION ${CMAKE_INSTALL_BINDIR})
-  install(FILES ${PROJECT_SOURCE_DIR}/docs/nls2.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
+  install(TARGETS nls2 DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT command)
+  install(
+    FILES ${PROJECT_SOURCE_DIR}/docs/nls2.1
+    DESTINATION ${CMAKE_INSTALL_MANDIR}/man1
+    COMPONENT command)
+  install(
+    FILES ${PROJECT_SOURCE_DIR}/docs/nls2.7
+    DESTINATION ${CMAKE_INSTALL_MANDIR}/man7
+    COMPONENT command)
   install(
     FILES ${PROJECT_SOURCE_DIR}/completions/nls2.bash
     DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions
+    COMPONENT command
     RENAME nls2)
 endif()
 

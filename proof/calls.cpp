@@ -4,6 +4,7 @@
 
 #include <cstdio>
 #include <cstring>
+#include <nls2/field_translator.hpp>
 #include <unicode/ucnv.h>
 #include <unistd.h>
 
@@ -134,7 +135,8 @@ Outcome codepageName(const NLS2_Locale * /*in*/) {
 
 Outcome codepageId(const NLS2_Locale * /*in*/) {
   int32_t result = 0;
-  return {result, NLS2_GetCodepageId("ibm-37", &result), {}};
+  const uint32_t page = NLS2_GetCodepageId("ibm-37", &result);
+  return {result, page, {}};
 }
 
 // Tests what a maker of a locale object gives back, and gives it back.
@@ -181,7 +183,8 @@ Outcome fromNative(const NLS2_Locale * /*in*/) {
 Outcome numbers(const NLS2_Locale *in) {
   int32_t result = 0;
   const uint32_t language = NLS2_GetLocaleNumInfo(in, NLS2_ATTRIBUTE_LANGUAGE_ID, &result);
-  return {result, language + NLS2_GetLocaleCodepageId(in, &result), {}};
+  const uint32_t page = NLS2_GetLocaleCodepageId(in, &result);
+  return {result, language + page, {}};
 }
 
 Outcome setNumber(const NLS2_Locale * /*in*/) {
@@ -249,6 +252,31 @@ Outcome constants(const NLS2_Locale *in) {
           NLS2_BuildStamp()};
 }
 
+// A short field, and one longer than the buffer that a translator begins with.
+template <auto padding, auto bad, int32_t sourcePage>
+Outcome field(const NLS2_Locale * /*in*/) {
+  std::error_code error;
+  nls2::field_translator translator(nls2::code_page{sourcePage}, nls2::code_page{1208},
+                                    {.padding = padding, .width = 8000, .bad = bad}, error);
+  if (error) {
+    return status(error.value());
+  }
+  std::string text(3000, '\xC1'); // A in EBCDIC
+  text.resize(3100, '\x40');
+  std::string out(8000, '\0');
+  Outcome outcome;
+  for (const size_t length : {size_t{5}, text.size(), size_t{5}}) {
+    const nls2::field_result result =
+        translator.translate(std::span(text).last(length), std::span(out));
+    if (!result) {
+      return status(result.problem == nls2::field_problem::no_memory ? NLS2_ERR_NO_MEMORY : -1);
+    }
+    outcome.answer += static_cast<int64_t>(result.written);
+    outcome.bytes.append(out, 0, result.written);
+  }
+  return outcome;
+}
+
 constexpr Call table[] = {
     {"NLS2_TranslateString, direct", translate<0>, 0},
     {"NLS2_TranslateString, terminated", translate<NLS2_STRING_TERMINATE>, 0},
@@ -284,6 +312,11 @@ constexpr Call table[] = {
     {"NLS2_detectUnicodeSignature", signature, 0},
     {"streams", streams, 0},
     {"NLS2_ResourceOpen, NLS2_GetStringByKey", bundle, 0},
+    {"field_translator, as it is", field<nls2::padding::as_is, nls2::on_bad::stop, 37>, 0},
+    {"field_translator, strip", field<nls2::padding::strip, nls2::on_bad::replace, 37>, 0},
+    {"field_translator, strip, mixed", field<nls2::padding::strip, nls2::on_bad::stop, 930>, 0},
+    {"field_translator, fill", field<nls2::padding::fill, nls2::on_bad::stop, 930>, 0},
+    {"field_translator, keep", field<nls2::padding::keep_blanks, nls2::on_bad::replace, 930>, 0},
     {"NLS2_Init, NLS2_ValidateLocale, NLS2_BuildStamp", constants, 0},
 };
 

@@ -2,6 +2,7 @@
 
 #include "locale/registry.h"
 
+#include "locale/walkers.h"
 #include "sys1.h"
 
 #include <cstddef>
@@ -18,6 +19,9 @@ NLS2_Locale *pLocaleObjectList = nullptr;
 uint32_t LocaleObjectList_Lock[7] = {};
 
 namespace nls2::locale {
+
+constinit std::atomic<std::size_t> removalCount{1};
+constinit thread_local Remembered remembered __attribute__((tls_model("initial-exec"))) = {};
 
 namespace {
 
@@ -90,6 +94,33 @@ void unlink(trace::Trace trace, Position at) {
 
 } // namespace
 
+bool contains(const NLS2_Locale *object) {
+  if (isRemembered(object)) {
+    return true;
+  }
+  const std::size_t removals = removalCount.load(std::memory_order_acquire);
+  const Walk walk;
+  NLS2_Locale *head = follow(pLocaleObjectList);
+  const NLS2_Locale *node = head;
+  while (node != nullptr && node != object) {
+    node = follow(node->pNext);
+  }
+  if (node != nullptr) {
+    remember(object, removals, head);
+  }
+  return node != nullptr;
+}
+
+int32_t validateInFrame(TRC1_EntryBlock &anchor, const NLS2_Locale *pLocale) {
+  trace::Frame frame(anchor);
+  if (!contains(pLocale)) {
+    NLS2_TRACE(frame, "Could not find locale on linked-list.");
+    return frame.result(int32_t{NLS2_ERR_INVALID_LOCALE});
+  }
+  NLS2_TRACE(frame, "Locale successfully found on linked-list.");
+  return frame.result(0);
+}
+
 void append(trace::Trace trace, NLS2_Locale *object) {
   NLS2_TRACE(trace, "Place locale object on linked list.");
   const ListLock lock(trace, "Linked-list modification complete, release lock.\n");
@@ -118,6 +149,7 @@ void remove(trace::Trace trace, NLS2_Locale *object) {
     return;
   }
   unlink(trace, at);
+  removalCount.fetch_add(1, std::memory_order_release);
   NLS2_TRACE(trace, "Locale structure removed from list.");
   waitForWalkers();
   std::free(at.current);

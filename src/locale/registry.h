@@ -1,7 +1,7 @@
 // The registry of live locale objects: the list behind pLocaleObjectList.
 #pragma once
 
-#include "locale/walkers.h"
+#include "locale/remembered.h"
 #include "nls2.h"
 #include "trace/frame.h"
 
@@ -21,26 +21,19 @@ inline NLS2_Locale *follow(NLS2_Locale *const &link) {
 }
 
 // True while the object is on the list; its contents are not looked at. Takes no lock.
-inline bool contains(const NLS2_Locale *object) {
-  const Walk walk;
-  const NLS2_Locale *node = follow(pLocaleObjectList);
-  while (node != nullptr && node != object) {
-    node = follow(node->pNext);
-  }
-  return node != nullptr;
-}
+bool contains(const NLS2_Locale *object);
 
-// The whole of NLS2_ValidateLocale, its trace frame included, to be compiled into callers that
-// count nanoseconds.
+// NLS2_ValidateLocale in its trace frame.
+int32_t validateInFrame(TRC1_EntryBlock &anchor, const NLS2_Locale *pLocale);
+
+// NLS2_ValidateLocale, to be compiled into callers that count nanoseconds: an object that the thread
+// remembers is valid, and while tracing is off there is nothing else to do.
 [[gnu::always_inline]] inline int32_t validateLocale(const NLS2_Locale *pLocale) {
   static constinit TRC1_EntryBlock anchor = trace::anchorOf("NLS2_ValidateLocale");
-  trace::Frame frame(anchor);
-  if (!contains(pLocale)) {
-    NLS2_TRACE(frame, "Could not find locale on linked-list.");
-    return frame.result(int32_t{NLS2_ERR_INVALID_LOCALE});
+  if (trace::Frame::isOff(anchor) && isRemembered(pLocale)) [[likely]] {
+    return 0;
   }
-  NLS2_TRACE(frame, "Locale successfully found on linked-list.");
-  return frame.result(0);
+  return validateInFrame(anchor, pLocale);
 }
 
 } // namespace nls2::locale

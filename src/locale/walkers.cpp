@@ -12,7 +12,7 @@ namespace detail {
 
 constinit std::atomic<uint32_t> currentRound{0};
 constinit Stripe stripeTable[stripes] = {};
-thread_local std::size_t ownStripe __attribute__((tls_model("initial-exec"))) = 0;
+constinit thread_local std::size_t ownStripe __attribute__((tls_model("initial-exec"))) = 0;
 
 std::size_t chooseStripe() {
   static constinit std::atomic<std::size_t> threads{0};

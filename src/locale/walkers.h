@@ -42,7 +42,7 @@ extern std::atomic<uint32_t> currentRound;
 extern Stripe stripeTable[stripes];
 
 // 0 until the thread's first walk, then the number of its stripe plus one.
-extern thread_local std::size_t ownStripe __attribute__((tls_model("initial-exec")));
+extern constinit thread_local std::size_t ownStripe __attribute__((tls_model("initial-exec")));
 std::size_t chooseStripe();
 
 inline std::atomic<uint32_t> &ownCount() {

@@ -71,6 +71,11 @@ private:
 // everything that was declared after the frame.
 class Frame : public Trace {
 public:
+  // True if a frame of this anchor would trace nothing and need not ask the host.
+  static bool isOff(const TRC1_EntryBlock &anchor) {
+    return isCurrent(anchor) && __atomic_load_n(&anchor.cachedFlags, __ATOMIC_RELAXED) == 0;
+  }
+
   explicit Frame(TRC1_EntryBlock &anchor) : Trace(anchor, currentFlags(anchor)) {
     if (events()) [[unlikely]] {
       TRC1_Event(&anchor, anchor.entryLine, TRC1_EVENT_ENTRY);
@@ -99,10 +104,13 @@ public:
 
 private:
   // The anchor's cached words and the sync word are shared by all threads and written by the host.
+  static bool isCurrent(const TRC1_EntryBlock &anchor) {
+    const uint32_t *sync = __atomic_load_n(&anchor.sync, __ATOMIC_RELAXED);
+    return __atomic_load_n(sync, __ATOMIC_RELAXED) ==
+           __atomic_load_n(&anchor.cachedSync, __ATOMIC_RELAXED);
+  }
   static uint32_t currentFlags(TRC1_EntryBlock &anchor) {
-    uint32_t *sync = __atomic_load_n(&anchor.sync, __ATOMIC_RELAXED);
-    if (__atomic_load_n(sync, __ATOMIC_RELAXED) ==
-        __atomic_load_n(&anchor.cachedSync, __ATOMIC_RELAXED)) [[likely]] {
+    if (isCurrent(anchor)) [[likely]] {
       return __atomic_load_n(&anchor.cachedFlags, __ATOMIC_RELAXED);
     }
     return TRC1_Sync(&anchor);

@@ -1,4 +1,4 @@
-// What NLS2_TranslateString must answer, told by the rules of the header over bare ICU: whole texts
+// What NLS2_TranslateString must answer, by the rules of the header over bare ICU: whole texts
 // converted into buffers that are large enough, then cut.
 #pragma once
 
@@ -32,27 +32,24 @@ struct Outcome {
   int32_t status;
   int32_t consumed;
   std::string dest; // the whole buffer
-  bool operator==(const Outcome &) const = default;
 };
 
-inline std::u16string decode(const Page &page, const std::string &bytes) {
+template <class To, class From, class Convert>
+std::basic_string<To> converted(const Page &page, const std::basic_string<From> &text,
+                                Convert convert) {
   UErrorCode error = U_ZERO_ERROR;
   const icu::LocalUConverterPointer converter(ucnv_open(page.icuName, &error));
-  std::u16string text(bytes.size() * 4 + 16, u'\0');
-  text.resize(static_cast<size_t>(ucnv_toUChars(converter.getAlias(), text.data(),
-                                                static_cast<int32_t>(text.size()), bytes.data(),
-                                                static_cast<int32_t>(bytes.size()), &error)));
-  return text;
+  std::basic_string<To> result(text.size() * 8 + 16, To{0});
+  result.resize(static_cast<size_t>(convert(converter.getAlias(), result.data(),
+                                            static_cast<int32_t>(result.size()), text.data(),
+                                            static_cast<int32_t>(text.size()), &error)));
+  return result;
 }
-
+inline std::u16string decode(const Page &page, const std::string &bytes) {
+  return converted<char16_t>(page, bytes, ucnv_toUChars);
+}
 inline std::string encode(const Page &page, const std::u16string &text) {
-  UErrorCode error = U_ZERO_ERROR;
-  const icu::LocalUConverterPointer converter(ucnv_open(page.icuName, &error));
-  std::string bytes(text.size() * 8 + 16, '\0');
-  bytes.resize(static_cast<size_t>(ucnv_fromUChars(converter.getAlias(), bytes.data(),
-                                                   static_cast<int32_t>(bytes.size()), text.data(),
-                                                   static_cast<int32_t>(text.size()), &error)));
-  return bytes;
+  return converted<char>(page, text, ucnv_fromUChars);
 }
 
 // As much as fits, and a zero byte where there is room for it.

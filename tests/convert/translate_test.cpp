@@ -1,16 +1,10 @@
-// NLS2_TranslateString: known answers and traces, and over every size of the destination, against
-// bare ICU.
+// NLS2_TranslateString against bare ICU, over every size of the destination.
 
 #include "convert/translate_oracle.h"
 #include "nls2.h"
-#include "support/known_call.h"
-#include "support/table.h"
+#include "support/call_cases.h"
 
 #include <gtest/gtest.h>
-#include <sstream>
-#if defined(__SANITIZE_ADDRESS__)
-#include <sanitizer/lsan_interface.h>
-#endif
 
 namespace {
 
@@ -19,18 +13,14 @@ using oracle::Page;
 using oracle::Request;
 using namespace std::string_literals;
 
-#if defined(__SANITIZE_ADDRESS__)
-constexpr size_t canaries = 0; // the sanitizer watches the block's end
-#else
-constexpr size_t canaries = 8;
-#endif
+using support::canaries;
+using support::shown;
 
-// The direct path of a two-null page may write one byte more than destLen. A test that lies about a
-// size gets a block that can be had.
+// The direct path of a two-null page may write one byte more than destLen.
 size_t destSize(const Request &request) {
   const bool direct = request.options == 0 || request.options == NLS2_STRING_TERMINATE;
   const size_t second = direct && request.dest.terminator == 2 ? 1 : 0;
-  return static_cast<size_t>(std::clamp(request.destLen, 0, 4096)) + std::max(canaries, second);
+  return static_cast<size_t>(request.destLen) + std::max(canaries, second);
 }
 
 // Both texts in blocks of exactly their size.
@@ -47,17 +37,16 @@ Outcome call(const Request &request) {
   return {result, status, consumed, std::string(dest.get(), destSize(request))};
 }
 
-std::string shown(const Outcome &outcome) {
-  return "result " + std::to_string(outcome.result) + ", status " + std::to_string(outcome.status) +
-         ", consumed " + std::to_string(outcome.consumed) + "," + support::hexBytes(outcome.dest);
+std::string told(const Outcome &outcome) {
+  return shown(outcome.result) + ", " + shown(outcome.consumed) + ", " + shown(outcome.status) +
+         ", " + shown(outcome.dest);
 }
 
 void expectAnswer(const Request &request) {
   const int before = support::openConverters();
   const Outcome outcome = call(request);
   ASSERT_EQ(support::openConverters(), before);
-  ASSERT_EQ(shown(outcome),
-            shown(oracle::translate(request, std::string(destSize(request), '\xA5'))))
+  ASSERT_EQ(told(outcome), told(oracle::translate(request, std::string(destSize(request), '\xA5'))))
       << std::hex << "options " << request.options << std::dec << ", sourceLen "
       << request.sourceLen << ", destLen " << request.destLen;
 }
@@ -145,62 +134,6 @@ TEST(Translate, AsBareIcuWithEveryCapacity) {
       sweep(source, dest, input.bytes.empty() ? oracle::encode(source, input.text) : input.bytes);
     }
   }
-}
-
-std::string bytesOf(const std::string &hex) {
-  std::istringstream digits(hex);
-  digits >> std::hex;
-  std::string bytes;
-  for (unsigned byte = 0; digits >> byte;) {
-    bytes += static_cast<char>(byte);
-  }
-  return bytes;
-}
-
-// A line of the table.
-void expectKnown(const std::vector<std::string> &row) {
-  const auto number = [&](size_t column, int base = 10) {
-    return static_cast<int32_t>(std::stoul(row.at(column), nullptr, base));
-  };
-  const Page source{number(2), "", 1};
-  const Page dest{number(5), "", number(5) == 1200 || number(5) == 57359 ? 2 : 1};
-  const Request request{source,    dest,      bytesOf(row.at(3)),
-                        number(4), number(6), static_cast<uint32_t>(number(7, 16))};
-  Outcome expected{number(8), number(9), number(10), bytesOf(row.at(11))};
-  expected.dest.resize(destSize(request), '\xA5');
-  Outcome outcome = expected;
-  if (row.at(1).empty()) {
-    outcome = call(request);
-  } else {
-    support::expectKnownCall(row.at(0), row.at(1), {}, [&](int32_t *status) {
-      outcome = call(request);
-      *status = outcome.status;
-      return outcome.result;
-    });
-  }
-  EXPECT_EQ(shown(outcome), shown(expected));
-}
-
-// The rows of the table that leave so many converters open.
-void expectTable(int leftOpen) {
-  for (const auto &row : support::tableRows(TRANSLATE_STRING_TSV)) {
-    const bool leaks = row.at(0).find("leaves two converters open") != std::string::npos;
-    if (leaks == (leftOpen == 2)) {
-      SCOPED_TRACE(row.at(0));
-      const int before = support::openConverters();
-      expectKnown(row);
-      EXPECT_EQ(support::openConverters() - before, leftOpen);
-    }
-  }
-}
-
-TEST(Translate, KnownAnswersAndTraces) { expectTable(0); }
-
-TEST(Translate, RefusedOptionLeavesTwoConvertersOpen) {
-#if defined(__SANITIZE_ADDRESS__)
-  const __lsan::ScopedDisabler theLeakIsMeant;
-#endif
-  expectTable(2);
 }
 
 } // namespace

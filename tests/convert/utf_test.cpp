@@ -1,9 +1,9 @@
 // A locale's code page and UTF-8 or UTF-16: against the same ICU calls made bare, with every size
 // of output.
 
+#include "convert/translate_oracle.h"
 #include "nls2.h"
-#include "support/icu_probe.h"
-#include "support/live_locale.h"
+#include "support/call_cases.h"
 #include "support/recording_host.h"
 
 #include <algorithm>
@@ -17,12 +17,6 @@ namespace {
 using support::exact;
 using support::LiveLocale;
 
-#if defined(__SANITIZE_ADDRESS__)
-constexpr int slack = 0; // the sanitizer guards the ends
-#else
-constexpr int slack = 4;
-#endif
-
 // Both calls take (target, capacity, status) and must agree on all of it, the canaries included,
 // with every capacity up to two more than are needed.
 template <class Unit, class Library, class Icu>
@@ -30,7 +24,8 @@ void sweep(int32_t successStatus, Library library, Icu icu) {
   UErrorCode error = U_ZERO_ERROR;
   const int32_t needed = icu(static_cast<Unit *>(nullptr), 0, &error);
   for (int32_t capacity = 0; capacity <= needed + 2; ++capacity) {
-    const std::basic_string<Unit> canaries(static_cast<size_t>(capacity + slack), Unit{0x55});
+    const std::basic_string<Unit> canaries(static_cast<size_t>(capacity) + support::canaries,
+                                           Unit{0x55});
     const auto ours = exact(canaries);
     const auto bare = exact(canaries);
     int32_t status = 99;
@@ -41,16 +36,6 @@ void sweep(int32_t successStatus, Library library, Icu icu) {
     EXPECT_EQ(length, U_FAILURE(error) ? 0 : expected) << "capacity " << capacity;
     EXPECT_TRUE(std::equal(ours.get(), ours.get() + canaries.size(), bare.get())) << capacity;
   }
-}
-
-std::string encoded(UConverter *converter, const std::u16string &text) {
-  UErrorCode error = U_ZERO_ERROR;
-  std::string bytes(16 + 8 * text.size(), '\0');
-  bytes.resize(static_cast<size_t>(ucnv_fromUChars(converter, bytes.data(),
-                                                   static_cast<int32_t>(bytes.size()), text.data(),
-                                                   static_cast<int32_t>(text.size()), &error)));
-  EXPECT_TRUE(U_SUCCESS(error));
-  return bytes;
 }
 
 // The length itself, and -1 where a terminator can stand for it.
@@ -65,10 +50,9 @@ void withBothLengths(const std::basic_string<Unit> &text, Check check) {
 void sweepAll(const NLS2_Locale *locale, const char *icuName, const std::u16string &text) {
   UErrorCode error = U_ZERO_ERROR;
   const icu::LocalUConverterPointer page(ucnv_open(icuName, &error));
-  const icu::LocalUConverterPointer utf8(ucnv_open("utf-8", &error));
   ASSERT_TRUE(U_SUCCESS(error)) << icuName;
   UConverter *converter = page.getAlias();
-  withBothLengths(encoded(converter, text), [=](const char *from, int32_t n) {
+  withBothLengths(oracle::encode({0, icuName, 1}, text), [=](const char *from, int32_t n) {
     sweep<char>(
         0, [=](char *to, int32_t m, auto *e) { return NLS2_toUTF8(locale, from, n, to, m, e); },
         [=](char *to, int32_t m, auto *e) {
@@ -78,7 +62,7 @@ void sweepAll(const NLS2_Locale *locale, const char *icuName, const std::u16stri
         0, [=](UChar *to, int32_t m, auto *e) { return NLS2_toUTF16(locale, from, n, to, m, e); },
         [=](UChar *to, int32_t m, auto *e) { return ucnv_toUChars(converter, to, m, from, n, e); });
   });
-  withBothLengths(encoded(utf8.getAlias(), text), [=](const char *from, int32_t n) {
+  withBothLengths(oracle::encode({0, "utf-8", 1}, text), [=](const char *from, int32_t n) {
     sweep<char>( // whose status a success never sets
         99, [=](char *to, int32_t m, auto *e) { return NLS2_fromUTF8(locale, to, m, from, n, e); },
         [=](char *to, int32_t m, auto *e) {

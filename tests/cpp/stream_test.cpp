@@ -8,13 +8,13 @@
 namespace {
 
 using namespace std::string_literals;
-using nls2::stream;
+using namespace nls2;
 
 class Streams : public WithDefaultLocale {
 protected:
   ~Streams() override { unlink(path.c_str()); }
   stream open(std::string_view mode, std::string_view encoding = "UTF-8") {
-    return nls2::open_stream(where, path, mode, encoding);
+    return open_stream(where, path, mode, encoding);
   }
   void expectBytes(const std::string &expected) {
     std::string bytes;
@@ -22,7 +22,7 @@ protected:
     EXPECT_EQ(bytes, expected);
   }
 
-  nls2::locale where = nls2::default_locale();
+  locale where = default_locale();
   const std::string path = testing::TempDir() + "nls2_cpp_" + std::to_string(getpid());
 };
 
@@ -71,17 +71,17 @@ TEST_F(Streams, OwnTheirFile) {
 TEST_F(Streams, ReportWhatIsRefused) {
   std::u16string line;
   std::error_code cause;
-  EXPECT_FALSE(nls2::open_stream(where, "/", "r", "UTF-8").read_line(line, cause));
+  EXPECT_FALSE(open_stream(where, "/", "r", "UTF-8").read_line(line, cause));
   EXPECT_EQ(cause, std::errc::is_a_directory);
-  stream full = nls2::open_stream(where, "/dev/full", "w", "UTF-8");
+  stream full = open_stream(where, "/dev/full", "w", "UTF-8");
   full.write(u"x", cause);
   full.close(cause);
   EXPECT_EQ(cause, std::errc::no_space_on_device);
-  EXPECT_FALSE(nls2::open_stream(where, "/nowhere/x", "r", "UTF-8", cause));
+  EXPECT_FALSE(open_stream(where, "/nowhere/x", "r", "UTF-8", cause));
   EXPECT_EQ(cause, std::errc::no_such_file_or_directory);
   open("w").write(u"keep");
   const auto status = [&](const std::string &name, std::string_view mode, std::string_view code) {
-    return STATUS_OF(nls2::open_stream(where, name, mode, code, error));
+    return STATUS_OF(open_stream(where, name, mode, code, error));
   };
   EXPECT_EQ(status(path, "w", "no-such-page"), 4);
   EXPECT_EQ(status(path, "w", ""), 37);

@@ -5,11 +5,10 @@
 namespace {
 
 using namespace std::string_literals;
-using nls2::code_page;
-using nls2::locale;
+using namespace nls2;
 
-nls2::locale in(int page, std::string_view name = "de_DE") {
-  return nls2::make_locale(nls2::language_id::from_name(name), code_page(page));
+locale in(int page, std::string_view name = "de_DE") {
+  return make_locale(language_id::from_name(name), code_page(page));
 }
 
 // The whole output fits a span of its size, and no smaller one.
@@ -67,11 +66,11 @@ TEST_F(Text, ThatIsTooLongOrHasNoPageIsRefused) {
   EXPECT_EQ(STATUS_OF(contains(where, bytes, "x", error)), 31);
   EXPECT_EQ(STATUS_OF(to_utf8(in(4711), "x", error)), 4);
   EXPECT_EQ(STATUS_OF(to_utf16(locale(), "x", error)), 38);
-  EXPECT_THROW(translate(code_page(0), code_page(37), "x"), nls2::error);
+  EXPECT_THROW(translate(code_page(0), code_page(37), "x"), error);
 }
 
 TEST_F(Text, IsComparedByTheRulesOfTheLanguage) {
-  using enum nls2::trailing_blanks;
+  using enum trailing_blanks;
   const locale german = in(1208);
   EXPECT_TRUE(compare(german, "\u00E4", "z") < 0 && compare(in(1208, "sv_SE"), "\u00E4", "z") > 0);
   EXPECT_TRUE(compare(german, "a ", "a") > 0 && compare(german, "a \t", "a", ignore) == 0);
@@ -87,7 +86,7 @@ TEST_F(Text, IsComparedByTheRulesOfTheLanguage) {
 TEST_F(Text, WithANullIsRefusedWhereTheSearchWouldEnd) {
   const auto expectStatus = [](int expected, int page, const std::string &text) {
     const locale where = in(page);
-    const auto ignore = nls2::trailing_blanks::ignore;
+    const auto ignore = trailing_blanks::ignore;
     EXPECT_EQ(STATUS_OF(compare(where, text, "", ignore, error)), expected) << page << text;
     EXPECT_EQ(STATUS_OF(contains(where, "", text, error)), expected) << page << text;
   };
@@ -99,15 +98,15 @@ TEST_F(Text, WithANullIsRefusedWhereTheSearchWouldEnd) {
 }
 
 TEST_F(Text, IsFound) {
-  using enum nls2::letter_case;
+  using enum letter_case;
   const locale german = in(1208);
   EXPECT_TRUE(contains(german, "Stra\u00DFe", "\u00DF") && contains(german, "", ""));
   EXPECT_FALSE(contains(german, "Stra\u00DFe", "STRA"));
   EXPECT_TRUE(contains(german, "Stra\u00DFe", "STRA", ignore));
   EXPECT_EQ(STATUS_OF(contains(german, "\u0130", "i", ignore, error)), 16) << "it grows";
-  const nls2::unicode_signature signature = nls2::detect_unicode_signature("\xEF\xBB\xBFx");
+  const unicode_signature signature = detect_unicode_signature("\xEF\xBB\xBFx");
   EXPECT_TRUE(signature.encoding == "UTF-8" && signature.length == 3);
-  EXPECT_TRUE(nls2::detect_unicode_signature({}).encoding.empty());
+  EXPECT_TRUE(detect_unicode_signature({}).encoding.empty());
 }
 
 } // namespace

@@ -14,52 +14,28 @@
 #define JOIN_(a, b) a##b
 #define JOIN(a, b) JOIN_(a, b)
 #define HOLDS(condition) typedef char JOIN(holds_, __LINE__)[(condition) ? 1 : -1]
-/* Offsets with 64-bit and with 32-bit pointers. */
-#define AT(record, field, wide, narrow)                                                            \
-  HOLDS((sizeof(void *) == 8 && offsetof(record, field) == (wide)) ||                              \
-        (sizeof(void *) == 4 && offsetof(record, field) == (narrow)))
+/* Layouts, by the size of a pointer. */
+#define W sizeof(void *)
+#define AT(record, field, offset) (offsetof(record, field) == (offset))
 
-HOLDS(sizeof(LocaleMapEntry) == 276);
-AT(LocaleMapEntry, languageId, 0, 0);
-AT(LocaleMapEntry, asciiCcsid, 4, 4);
-AT(LocaleMapEntry, ebcdicCcsid, 8, 8);
-AT(LocaleMapEntry, localeName, 12, 12);
-AT(LocaleMapEntry, shortName, 144, 144);
-HOLDS(sizeof(NLS2_Locale) == (sizeof(void *) == 8 ? 152 : 148));
-AT(NLS2_Locale, languageId, 0, 0);
-AT(NLS2_Locale, codepage, 4, 4);
-AT(NLS2_Locale, icuLocale, 8, 8);
-AT(NLS2_Locale, pNext, 144, 144);
-HOLDS(sizeof(CcsidMapEntry) == 136);
-AT(CcsidMapEntry, name, 0, 0);
-AT(CcsidMapEntry, ccsid, 132, 132);
-
-HOLDS(sizeof(TRC1_UnitBlock) == (sizeof(void *) == 8 ? 104 : 60));
-AT(TRC1_UnitBlock, formatVersion, 0, 0);
-AT(TRC1_UnitBlock, attributes, 4, 4);
-AT(TRC1_UnitBlock, fileName, 8, 8);
-AT(TRC1_UnitBlock, fileNameLength, 16, 12);
-AT(TRC1_UnitBlock, buildDate, 24, 16);
-AT(TRC1_UnitBlock, buildDateLength, 32, 20);
-AT(TRC1_UnitBlock, buildTime, 40, 24);
-AT(TRC1_UnitBlock, buildTimeLength, 48, 28);
-AT(TRC1_UnitBlock, level, 56, 32);
-AT(TRC1_UnitBlock, levelLength, 64, 36);
-AT(TRC1_UnitBlock, mark, 72, 40);
-AT(TRC1_UnitBlock, markLength, 80, 44);
-AT(TRC1_UnitBlock, reserved, 84, 48);
-AT(TRC1_UnitBlock, buildStamp, 96, 56);
-
-HOLDS(sizeof(TRC1_EntryBlock) == (sizeof(void *) == 8 ? 56 : 40));
-AT(TRC1_EntryBlock, unit, 0, 0);
-AT(TRC1_EntryBlock, functionName, 8, 4);
-AT(TRC1_EntryBlock, functionNameLength, 16, 8);
-AT(TRC1_EntryBlock, entryLine, 20, 12);
-AT(TRC1_EntryBlock, sync, 24, 16);
-AT(TRC1_EntryBlock, attributes, 32, 20);
-AT(TRC1_EntryBlock, cachedFlags, 36, 24);
-AT(TRC1_EntryBlock, cachedSync, 40, 28);
-AT(TRC1_EntryBlock, reserved, 44, 32);
+HOLDS(sizeof(LocaleMapEntry) == 276 && AT(LocaleMapEntry, asciiCcsid, 4) &&
+      AT(LocaleMapEntry, ebcdicCcsid, 8) && AT(LocaleMapEntry, localeName, 12) &&
+      AT(LocaleMapEntry, shortName, 144));
+HOLDS(sizeof(NLS2_Locale) == 144 + W && AT(NLS2_Locale, codepage, 4) &&
+      AT(NLS2_Locale, icuLocale, 8) && AT(NLS2_Locale, pNext, 144));
+HOLDS(sizeof(CcsidMapEntry) == 136 && AT(CcsidMapEntry, ccsid, 132));
+HOLDS(sizeof(TRC1_UnitBlock) == (W == 8 ? 104 : 60) && AT(TRC1_UnitBlock, attributes, 4) &&
+      AT(TRC1_UnitBlock, fileName, 8) && AT(TRC1_UnitBlock, fileNameLength, 8 + W) &&
+      AT(TRC1_UnitBlock, buildDate, 8 + 2 * W) && AT(TRC1_UnitBlock, buildDateLength, 8 + 3 * W) &&
+      AT(TRC1_UnitBlock, buildTime, 8 + 4 * W) && AT(TRC1_UnitBlock, buildTimeLength, 8 + 5 * W) &&
+      AT(TRC1_UnitBlock, level, 8 + 6 * W) && AT(TRC1_UnitBlock, levelLength, 8 + 7 * W) &&
+      AT(TRC1_UnitBlock, mark, 8 + 8 * W) && AT(TRC1_UnitBlock, markLength, 8 + 9 * W) &&
+      AT(TRC1_UnitBlock, reserved, 12 + 9 * W) && AT(TRC1_UnitBlock, buildStamp, W == 8 ? 96 : 56));
+HOLDS(sizeof(TRC1_EntryBlock) == (W == 8 ? 56 : 40) && AT(TRC1_EntryBlock, functionName, W) &&
+      AT(TRC1_EntryBlock, functionNameLength, 2 * W) && AT(TRC1_EntryBlock, entryLine, 4 + 2 * W) &&
+      AT(TRC1_EntryBlock, sync, 8 + 2 * W) && AT(TRC1_EntryBlock, attributes, 8 + 3 * W) &&
+      AT(TRC1_EntryBlock, cachedFlags, 12 + 3 * W) && AT(TRC1_EntryBlock, cachedSync, 16 + 3 * W) &&
+      AT(TRC1_EntryBlock, reserved, 20 + 3 * W));
 
 static int failures;
 

@@ -2,6 +2,7 @@
 
 #include "support/recording_host.h"
 
+#include "nls2.h"
 #include "sys1.h"
 #include "trc1.h"
 
@@ -15,7 +16,7 @@ namespace {
 
 std::mutex recordMutex;
 std::vector<std::string> recorded;
-bool recording = false;
+std::atomic<bool> recording{false};
 
 std::map<std::string, support::SeenFunction> seenFunctions;
 
@@ -56,22 +57,14 @@ std::vector<std::string> Recording::lines() const {
   return recorded;
 }
 
-std::vector<std::string> Recording::details(const std::string &function) const {
-  std::vector<std::string> texts;
-  for (const std::string &line : lines()) {
-    if (line.rfind(function + ": ", 0) == 0) {
-      texts.push_back(line.substr(function.size() + 2));
-    }
-  }
-  return texts;
-}
-
 SeenFunction seen(const std::string &function) {
   const std::lock_guard<std::mutex> guard(recordMutex);
   return seenFunctions[function];
 }
 
 void changeSyncWord() { setFlags(currentFlags); }
+
+bool isRecording() { return recording; }
 
 void mark(const std::string &line) {
   const std::lock_guard<std::mutex> guard(recordMutex);
@@ -82,16 +75,6 @@ void mark(const std::string &line) {
 
 uint32_t low32(const void *pointer) {
   return static_cast<uint32_t>(reinterpret_cast<uintptr_t>(pointer));
-}
-
-std::string hex(const void *pointer) {
-  char text[9];
-  std::snprintf(text, sizeof text, "%X", low32(pointer));
-  return text;
-}
-
-std::string exitValue(const void *pointer) {
-  return std::to_string(static_cast<int32_t>(low32(pointer)));
 }
 
 } // namespace support
@@ -162,10 +145,10 @@ void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t /*line*/, const void *address, 
 
 void SYS1_GetLock(void *lock) {
   listMutex.lock();
-  support::mark("lock " + support::hex(lock));
+  support::mark(lock == &LocaleObjectList_Lock ? "host lock" : "host lock of another");
 }
 
 void SYS1_ReleaseLock(void *lock) {
-  support::mark("unlock " + support::hex(lock));
+  support::mark(lock == &LocaleObjectList_Lock ? "host unlock" : "host unlock of another");
   listMutex.unlock();
 }

@@ -32,8 +32,6 @@ public:
   Recording &operator=(const Recording &) = delete;
 
   std::vector<std::string> lines() const;
-  // The lines of one function, its name and the sign cut off for detail lines: "detail text".
-  std::vector<std::string> details(const std::string &function) const;
 };
 
 // What the host has seen of one function; all zero before its first sync.
@@ -50,10 +48,9 @@ void changeSyncWord();
 
 // Adds a line to the recording that is open, if any; for probes that watch ICU or the heap.
 void mark(const std::string &line);
+bool isRecording();
 
-// How a pointer prints under "%X" and what an exit event carries of it.
+// What an exit event or "%X" carries of a pointer.
 uint32_t low32(const void *pointer);
-std::string hex(const void *pointer);
-std::string exitValue(const void *pointer);
 
 } // namespace support

@@ -3,7 +3,7 @@
 #include "commands.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
-#include "text/string_order.h"
+#include "text/line_order.h"
 
 #include <fmt/core.h>
 #include <memory>
@@ -15,7 +15,7 @@ namespace {
 
 constexpr const char *notes =
     R"(Prints -1 if A sorts before B, 1 if B sorts before A, 0 if they are equal. The order counts case,
-accents and punctuation. A and B are bytes of the code page, at most 32767 each.
+accents and punctuation. A and B are bytes of the code page.
 Exit codes: 0 equal, 1 not equal, 2 anything that went wrong.
 )";
 
@@ -26,19 +26,19 @@ struct Arguments {
   std::string b;
 };
 
-void require(StringOrder &order, const char *name, const std::string &text) {
-  if (const auto refusal = order.refusal(text)) {
-    throw failure("{}: {}", name, *refusal);
+std::string keyOf(LineOrder &order, const char *name, const std::string &text) {
+  if (const auto fault = order.makeKey(text)) {
+    throw failure("{}", describe(name, *fault));
   }
+  return std::string(order.key());
 }
 
 bool areEqual(const Arguments &arguments) {
-  StringOrder order(arguments.locale, arguments.ignoreTrailing);
-  require(order, "A", arguments.a);
-  require(order, "B", arguments.b);
-  const int32_t result = order.compare(arguments.a, arguments.b);
-  OutputFile("-").write(fmt::format("{}\n", result));
-  return result == 0;
+  LineOrder order(arguments.locale, arguments.ignoreTrailing);
+  const std::string a = keyOf(order, "A", arguments.a);
+  const std::string b = keyOf(order, "B", arguments.b);
+  OutputFile("-").write(a < b ? "-1\n" : a > b ? "1\n" : "0\n");
+  return a == b;
 }
 
 } // namespace

@@ -1,13 +1,12 @@
 // nls2 find: the lines in which a text occurs.
 
 #include "commands.h"
-#include "io/line_reader.h"
+#include "errors.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
-#include "nls2.h"
-#include "text/text_check.h"
+#include "text/line_reader.h"
+#include "text/text_search.h"
 
-#include <fmt/core.h>
 #include <memory>
 #include <string>
 #include <vector>
@@ -18,11 +17,10 @@ namespace {
 
 constexpr const char *notes =
     R"(PATTERN is plain text in UTF-8, whatever the code page of the files; an empty one occurs in every
-line. Lines end in U+000A as the code page writes it, and are printed in the code page.
+line. Lines end in U+000A as the code page writes it, and are printed in the code page. A line whose
+bytes are not valid in the code page ends the search of its file; the other files are searched.
 Exit codes: 0 found, 1 not found, 2 anything that went wrong.
 )";
-
-constexpr std::size_t mostBytes = std::size_t{1} << 30;
 
 struct Arguments {
   LocaleOptions locale;
@@ -32,75 +30,70 @@ struct Arguments {
   std::vector<std::string> inputs;
 };
 
-// A character that the page does not have would be looked for as its substitute.
-std::string translatePattern(const std::string &pattern, int32_t page) {
-  int32_t status = 0;
-  std::string translated = translateText(page, utf8Page, pattern, status);
-  if (translateText(utf8Page, page, translated, status) != pattern) {
-    throw usageError("PATTERN: not UTF-8, or a character that code page {} does not have", page);
-  }
-  return translated;
-}
-
 class FindRun {
 public:
   explicit FindRun(const Arguments &arguments)
-      : arguments_(arguments),
-        locale_(arguments.locale), format_{lineTerminator(arguments.locale.codepage)},
-        pattern_(translatePattern(arguments.pattern, arguments.locale.codepage)),
-        check_(arguments.locale.codepage, mostBytes, Nulls::endText) {
-    if (search(pattern_) < 0) {
-      throw usageError("PATTERN: a character grows in lower case");
-    }
-  }
+      : arguments_(arguments), search_(arguments.locale, arguments.pattern, arguments.ignoreCase),
+        format_{lineTerminator(arguments.locale.codepage)} {}
 
-  bool run() {
+  // A file that fails does not keep the others from being searched. Output that fails ends the run.
+  int run() {
     for (const std::string &path : arguments_.inputs) {
-      searchFile(path);
+      try {
+        searchFile(path);
+      } catch (const Error &error) {
+        if (isPrinting_) {
+          throw;
+        }
+        flush();
+        complain(error.what());
+        failed_ = true;
+      }
     }
-    return found_;
+    flush();
+    return failed_ ? exitUsage : found_ ? exitDone : exitFailed;
   }
 
 private:
-  int32_t search(std::string_view line) const {
-    return NLS2_Findstr(locale_.get(), line.data(), static_cast<int32_t>(line.size()),
-                        pattern_.data(), static_cast<int32_t>(pattern_.size()),
-                        arguments_.ignoreCase ? IGNORECASE : 0);
-  }
-
   void searchFile(const std::string &path) {
     LineReader reader(path, format_);
+    const std::string name =
+        arguments_.inputs.size() == 1 ? "" : (path == "-" ? "standard input" : path) + ":";
     for (std::string_view line; reader.next(line);) {
-      if (const auto refusal = check_.refusal(line)) {
-        reader.fail(*refusal);
+      bool found = false;
+      if (const auto fault = search_.search(line, found)) {
+        reader.fail(*fault);
       }
-      const int32_t answer = search(line);
-      if (answer < 0) {
-        reader.fail(arguments_.ignoreCase ? "a character grows in lower case, or no memory"
-                                          : "no memory");
-      }
-      if (answer > 0) {
-        print(reader, line);
+      if (found) {
+        print(arguments_.lineNumbers ? fmt::format("{}{}:", name, reader.number()) : name, line);
       }
     }
   }
 
-  void print(const LineReader &reader, std::string_view line) {
-    std::string prefix = arguments_.inputs.size() > 1 ? reader.name() + ":" : "";
-    prefix += arguments_.lineNumbers ? fmt::format("{}:", reader.number()) : "";
-    int32_t status = 0;
-    std::string text = translateText(arguments_.locale.codepage, utf8Page, prefix, status);
-    output_.write(text.append(line).append(format_.terminator));
+  void print(const std::string &prefix, std::string_view line) {
+    isPrinting_ = true;
+    if (!prefix.empty()) {
+      output_.put(search_.decoder().encode(prefix));
+    }
+    output_.put(line);
+    output_.put(format_.terminator);
+    isPrinting_ = false;
     found_ = true;
   }
 
+  void flush() {
+    isPrinting_ = true;
+    output_.flush();
+    isPrinting_ = false;
+  }
+
   const Arguments &arguments_;
-  const LocaleObject locale_;
+  TextSearch search_;
   const LineFormat format_;
-  const std::string pattern_;
-  TextCheck check_;
   OutputFile output_{"-"};
+  bool isPrinting_ = false;
   bool found_ = false;
+  bool failed_ = false;
 };
 
 } // namespace
@@ -113,7 +106,7 @@ Command findCommand() {
                        into(arguments->inputs), 0, Operand::anyNumber}};
   command.options = localeOptions(arguments->locale);
   command.options.push_back({.name = "ignore-case",
-                             .help = "compare both in lower case, by the language's rules",
+                             .help = "fold the case of both, by the language's rules",
                              .take = into(arguments->ignoreCase)});
   command.options.push_back({.name = "line-number",
                              .letter = 'n',
@@ -124,7 +117,7 @@ Command findCommand() {
     if (arguments->inputs.empty()) {
       arguments->inputs.emplace_back("-");
     }
-    return FindRun(*arguments).run() ? exitDone : exitFailed;
+    return FindRun(*arguments).run();
   };
   return command;
 }

@@ -1,16 +1,13 @@
 // nls2 sort: lines or records in the order of a language.
 
 #include "commands.h"
-#include "errors.h"
-#include "io/line_reader.h"
 #include "io/output_file.h"
-#include "text/string_order.h"
+#include "text/line_order.h"
+#include "text/line_reader.h"
+#include "text/sorted_lines.h"
 
-#include <algorithm>
-#include <future>
 #include <memory>
 #include <string>
-#include <thread>
 #include <vector>
 
 namespace nls2::tool {
@@ -19,13 +16,10 @@ namespace {
 
 constexpr const char *notes =
     R"(The order counts case, accents and punctuation; lines that it holds equal stay in the order of the
-input. Lines end in U+000A as the code page writes it; a last line without it gets one. A line of
-more than 32767 bytes, or whose bytes are not valid in the code page, is an error, and nothing is
-written then. All lines are held in memory. OUT may be one of the FILEs.
+input. Lines end in U+000A as the code page writes it; a last line without it gets one. A line whose
+bytes are not valid in the code page is an error, and nothing is written then. All lines are held in
+memory. OUT may be one of the FILEs.
 )";
-
-// Below it a thread costs more than it saves.
-constexpr std::ptrdiff_t fewLines = 1000;
 
 struct Arguments {
   LocaleOptions locale;
@@ -35,58 +29,36 @@ struct Arguments {
   std::string output = "-";
 };
 
-using Lines = std::vector<std::string>;
-
-void readLines(const std::string &path, const LineFormat &format, StringOrder &order,
-               Lines &lines) {
+void readLines(const std::string &path, const LineFormat &format, LineOrder &order,
+               SortedLines &lines) {
   LineReader reader(path, format);
   for (std::string_view line; reader.next(line);) {
-    if (const auto refusal = order.refusal(line)) {
-      reader.fail(*refusal);
+    if (const auto fault = order.makeKey(line)) {
+      reader.fail(*fault);
     }
-    lines.emplace_back(line);
+    lines.add(line, order.key());
   }
-}
-
-// One half in a thread of its own while there are threads to take, then merged. Waits for that half
-// also where a comparison throws.
-void sortLines(Lines::iterator first, Lines::iterator last, const StringOrder &order,
-               unsigned threads) {
-  const auto isLess = [&](const std::string &a, const std::string &b) {
-    return order.compare(a, b) < 0;
-  };
-  if (threads < 2 || last - first < fewLines) {
-    std::stable_sort(first, last, isLess);
-    return;
-  }
-  const Lines::iterator middle = first + (last - first) / 2;
-  std::future<void> firstHalf =
-      std::async([=, &order] { sortLines(first, middle, order, threads / 2); });
-  sortLines(middle, last, order, threads - threads / 2);
-  firstHalf.get();
-  std::inplace_merge(first, middle, last, isLess);
 }
 
 void sortFiles(const Arguments &arguments) {
-  StringOrder order(arguments.locale, arguments.ignoreTrailing);
+  LineOrder order(arguments.locale, arguments.ignoreTrailing);
   LineFormat format;
   if (arguments.recordLength != 0) {
     format.recordLength = static_cast<std::size_t>(arguments.recordLength);
   } else {
     format.terminator = lineTerminator(arguments.locale.codepage);
   }
-  Lines lines;
-  const Lines standardInput{"-"};
-  for (const std::string &path : arguments.inputs.empty() ? standardInput : arguments.inputs) {
+  SortedLines lines;
+  for (const std::string &path : arguments.inputs) {
     readLines(path, format, order, lines);
   }
   OutputFile output(arguments.output);
-  sortLines(lines.begin(), lines.end(), order, std::thread::hardware_concurrency());
-  std::string text;
-  for (const std::string &line : lines) {
-    text.append(line).append(format.terminator);
-  }
-  output.write(text);
+  lines.sort();
+  lines.forEach([&](std::string_view line) {
+    output.put(line);
+    output.put(format.terminator);
+  });
+  output.flush();
   output.commit();
 }
 
@@ -106,7 +78,8 @@ Command sortCommand() {
        .metavar = "N",
        .help = "sort records of N bytes instead of lines",
        .take = [arguments](const std::string &text) {
-         arguments->recordLength = parseNumber("--record-length", text, 1, StringOrder::mostBytes);
+         arguments->recordLength =
+             parseNumber("--record-length", text, 1, int32_t{Decoder::mostBytes});
        }});
   add({.name = "output",
        .letter = 'o',
@@ -115,6 +88,9 @@ Command sortCommand() {
        .take = into(arguments->output)});
   command.notes = notes;
   command.run = [arguments] {
+    if (arguments->inputs.empty()) {
+      arguments->inputs.emplace_back("-");
+    }
     sortFiles(*arguments);
     return exitDone;
   };

@@ -10,7 +10,6 @@
 #include <cstddef>
 #include <exception>
 #include <mutex>
-#include <system_error>
 #include <thread>
 #include <vector>
 
@@ -67,7 +66,7 @@ private:
       threads.reserve(workers_ + 1);
       threads.emplace_back([this] { workOnAll(); });
       threads.emplace_back([this] { readAll(); });
-    } catch (const std::system_error &) {
+    } catch (const std::exception &) { // no thread or no memory to be had
       stop();
       join(threads);
       return false;
@@ -76,7 +75,7 @@ private:
       for (unsigned i = 1; i < workers_; ++i) {
         threads.emplace_back([this] { workOnAll(); });
       }
-    } catch (const std::system_error &) {
+    } catch (const std::exception &) {
       return true;
     }
     return true;

@@ -1,4 +1,4 @@
-// The options --locale and --codepage, and the locale object that they ask for.
+// The options --locale and --codepage, and the locale that a command follows without --locale.
 #pragma once
 
 #include "codepage/code_page.h"
@@ -7,30 +7,24 @@
 #include <cstdint>
 #include <optional>
 #include <string>
-
-struct NLS2_Locale;
+#include <vector>
 
 namespace nls2::tool {
 
 struct LocaleOptions {
-  std::optional<std::string> locale; // a name or a language id of localeMap
+  std::optional<std::string> locale; // the name in ICU's spelling of a locale that is known
   int32_t codepage = utf8Page;
 };
 
 std::vector<Option> localeOptions(LocaleOptions &options);
 
-class LocaleObject {
-public:
-  // Throws Error.
-  explicit LocaleObject(const LocaleOptions &options);
-  ~LocaleObject();
-  LocaleObject(const LocaleObject &) = delete;
-  LocaleObject &operator=(const LocaleObject &) = delete;
+// The locale whose order of texts counts: of --locale, or of the environment (LC_ALL, LC_COLLATE,
+// LANG), which may also be another locale of a language that localeMap holds. Throws usageError
+// where localeMap does not hold the environment's language.
+std::string orderLocale(const LocaleOptions &options);
 
-  const NLS2_Locale *get() const { return pLocale_; }
-
-private:
-  NLS2_Locale *pLocale_ = nullptr;
-};
+// Whether i without a dot is a letter of the locale's language. The environment's language may be
+// any.
+bool hasDotlessI(const LocaleOptions &options);
 
 } // namespace nls2::tool

