@@ -49,12 +49,12 @@ class Sweep:
         files = {"IN": self.folder + "/in", "TEXT": self.folder + "/text", "OUT": place + ".out",
                  "REPORT": place + ".report"}
         environment = {"LC_ALL": "de_DE.UTF-8", "PATH": "/usr/bin:/bin", "FAULT_LOG": place}
-        environment.update(LD_PRELOAD=self.shim, **fault)
+        environment.update(fault)
         for path in (place, files["OUT"]):
             if os.path.exists(path):
                 os.unlink(path)
-        done = subprocess.run([self.tool] + [files.get(word, word) for word in arguments],
-                              env=environment, capture_output=True, timeout=30, check=False)
+        words = ["timeout", "-s", "ABRT", "20", "env", "LD_PRELOAD=" + self.shim, self.tool] + [files.get(w, w) for w in arguments]
+        done = subprocess.run(words, env=environment, capture_output=True, check=False)
         read = [open(path, "rb").read() if os.path.exists(path) else None
                 for path in (files["OUT"], place)]
         return done.returncode, done.stdout, read[0], done.stderr, (read[1] or b"").decode()

@@ -54,18 +54,24 @@ Json &Json::set(const char *key, Json value) {
 }
 
 std::string Json::text() const {
-  const auto append = [](const char *bytes, std::size_t length, void *text) noexcept {
-    try {
-      static_cast<std::string *>(text)->append(bytes, length);
-      return 0;
-    } catch (const std::bad_alloc &) {
-      return -1;
-    }
+  struct Dump {
+    std::string text;
+    bool failed = false; // libjansson does not look at what it is told of a key
   };
-  std::string text;
-  require(json_dump_callback(value_.get(), append, &text,
-                             JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9)) == 0);
-  return text + "\n";
+  Dump dumped;
+  const auto append = [](const char *bytes, std::size_t length, void *data) noexcept {
+    auto *dump = static_cast<Dump *>(data);
+    try {
+      dump->text.append(bytes, length);
+    } catch (const std::bad_alloc &) {
+      dump->failed = true;
+    }
+    return dump->failed ? -1 : 0;
+  };
+  require(json_dump_callback(value_.get(), append, &dumped,
+                             JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9)) == 0 &&
+          !dumped.failed);
+  return dumped.text + "\n";
 }
 
 } // namespace nls2::tool

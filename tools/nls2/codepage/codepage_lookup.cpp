@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <new>
 #include <set>
 
 namespace nls2::tool {
@@ -124,6 +125,9 @@ PageFacts describePage(int32_t number) {
   facts.number = number;
   int32_t twoNull = 0;
   const nls2::converter converter(NLS2_MapCodepageIdToName(number, &twoNull, &facts.status));
+  if (facts.status == U_MEMORY_ALLOCATION_ERROR) {
+    throw std::bad_alloc(); // a page that would open must not be called one that does not
+  }
   facts.hasTwoNulls = twoNull != 0;
   facts.opens = static_cast<bool>(converter);
   facts.converter = converterOf(number);
