@@ -1,6 +1,7 @@
 # The Debian packages, which cpack or the target "package" makes: the library, the development files, and
 # the command with the host library. The preset "packages" has Debian's places, /usr and the library
-# folder of the architecture, and no search path in the files.
+# folder of the architecture, and no search path in the files. The packages of other builds work too;
+# their libraries are in /usr/lib.
 #
 # libzelnls2.so.0 does not start without a libzelhost.so.0, even in a program with trace and lock services
 # of its own. So the library depends on the package that has it, and these two need each other: dpkg and

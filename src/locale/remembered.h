@@ -15,8 +15,8 @@
 //
 // The head is compared too: it is exported, so a program may set the list aside.
 //
-// Measured, trace frame and call included: 2.7 ns in place of 4.1 for a walk over one object, and
-// of 17 us over 10,000.
+// Measured: 2.7 ns a call in place of 4.1 for a walk over one object, and of 17 us over 10,000; a
+// call that returns at once is 2.5.
 #pragma once
 
 #include "nls2.h"

@@ -76,6 +76,16 @@ std::string listed(Names &names) {
   return text;
 }
 
+// A sanitizer's heap begins where addresses end in zero bits: in a trace its first blocks look like
+// small numbers, so the text gets a block beyond those.
+std::unique_ptr<char[]> farBlock(const std::string &text) {
+  std::vector<std::unique_ptr<char[]>> near;
+  while (near.empty() || low32(near.back().get()) < 0x10000) {
+    near.push_back(exact(text));
+  }
+  return std::move(near.back());
+}
+
 bool isWord(char c) { return std::isalnum(static_cast<unsigned char>(c)) != 0 || c == '-'; }
 
 void replaceWord(std::string &text, const std::string &word, const std::string &with) {
@@ -216,9 +226,13 @@ void expectCall(Trace expected, const Functions &functions, const Settings &sett
   if (expected.text.find(" left ") != expected.text.npos) {
     leak.emplace();
   }
-  const std::string block = ", blocks left 1"; // which a sanitizer's heap keeps to itself
-  if (const std::size_t at = expected.text.find(block); !heapIsOurs && at != expected.text.npos) {
-    expected.text.erase(at, block.size());
+  const auto withoutBlocks = [](std::string &text) { // which a sanitizer's heap keeps to itself
+    const std::size_t at = heapIsOurs ? text.npos : text.find(", blocks left 1");
+    at != text.npos ? text.resize(at) : void();
+  };
+  withoutBlocks(expected.text);
+  for (auto &[at, next] : expected.skips) {
+    withoutBlocks(next);
   }
   Trace actual;
   for (const std::string &line : run(functions, settings, flags)) {
@@ -229,7 +243,7 @@ void expectCall(Trace expected, const Functions &functions, const Settings &sett
       actual.text.replace(at, found - at, "... ");
     }
   }
-  EXPECT_EQ(difference(broken(expected.text), broken(actual.text), ".", place), "");
+  EXPECT_EQ(difference(broken(expected.text), broken(actual.text), ACTUAL_FOLDER, place), "");
 }
 
 void expectPlain(const Functions &functions, Settings settings, const CaseLine &line) {
@@ -295,7 +309,7 @@ Words::Words(const std::string &call) {
   stream >> word;
   while (stream >> word) {
     words_.push_back(word == "''" ? "" : CaseLine{"", word, call}.bytes());
-    texts_.push_back(word == "null" ? nullptr : exact(words_.back()));
+    texts_.push_back(word == "null" ? nullptr : farBlock(words_.back()));
     if (word[0] == 'L' && std::isdigit(static_cast<unsigned char>(word[1])) != 0 && word != "L0") {
       const std::size_t slash = word.find('/');
       auto &live = live_[word];

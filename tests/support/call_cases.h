@@ -104,7 +104,7 @@ std::string shown(const NLS2_Locale &object);
 // By name: the call, which returns its answer.
 using Functions = std::map<std::string, std::function<std::string(const Words &)>>;
 
-// Runs every case of a folder. Actual texts of those that fail go to the working directory.
+// Runs every case of a folder. Actual texts of those that fail go to the build folder.
 void expectCases(const std::string &folder, const Functions &functions);
 
 // A table's fingerprint: FNV-1a over bytes, and over numbers as four bytes, the lowest first.

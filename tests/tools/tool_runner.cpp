@@ -3,7 +3,6 @@
 #include "tool_runner.h"
 
 #include <algorithm>
-#include <csignal>
 #include <cstdlib>
 #include <fcntl.h>
 #include <filesystem>
@@ -19,23 +18,20 @@ namespace tools {
 
 namespace {
 
-// Standard input is a pipe where `input` is a descriptor of one, else a file.
-pid_t spawn(const std::vector<std::string> &command, int inputPipe, const std::string &input,
-            const std::string &output, const std::string &error, const std::string &directory) {
+pid_t spawn(const std::vector<std::string> &command, const TempDir &streams,
+            const std::string &directory) {
   std::vector<char *> argv;
+  argv.reserve(command.size() + 1);
   for (const std::string &argument : command) {
     argv.push_back(const_cast<char *>(argument.c_str()));
   }
   argv.push_back(nullptr);
   posix_spawn_file_actions_t actions;
   posix_spawn_file_actions_init(&actions);
-  if (inputPipe >= 0) {
-    posix_spawn_file_actions_adddup2(&actions, inputPipe, 0);
-  } else {
-    posix_spawn_file_actions_addopen(&actions, 0, input.c_str(), O_RDONLY, 0);
-  }
-  posix_spawn_file_actions_addopen(&actions, 1, output.c_str(), O_WRONLY | O_CREAT, 0666);
-  posix_spawn_file_actions_addopen(&actions, 2, error.c_str(), O_WRONLY | O_CREAT, 0666);
+  const int creates = O_WRONLY | O_CREAT;
+  posix_spawn_file_actions_addopen(&actions, 0, streams.path("in").c_str(), O_RDONLY, 0);
+  posix_spawn_file_actions_addopen(&actions, 1, streams.path("out").c_str(), creates, 0666);
+  posix_spawn_file_actions_addopen(&actions, 2, streams.path("err").c_str(), creates, 0666);
   posix_spawn_file_actions_addchdir_np(&actions, directory.c_str());
   pid_t pid = -1;
   const int failed = posix_spawn(&pid, argv[0], &actions, nullptr, argv.data(), environ);
@@ -98,8 +94,7 @@ static Result runCommand(const std::vector<std::string> &command, std::string_vi
                          const std::string &directory) {
   const TempDir dir;
   writeFile(dir.path("in"), input);
-  const int code =
-      exitCodeOf(spawn(command, -1, dir.path("in"), dir.path("out"), dir.path("err"), directory));
+  const int code = exitCodeOf(spawn(command, dir, directory));
   return {code, readFile(dir.path("out")), readFile(dir.path("err"))};
 }
 
@@ -110,48 +105,12 @@ Result runTool(const std::vector<std::string> &arguments, std::string_view input
 
 Result runShell(const std::string &line, std::string_view input, const std::string &directory) {
   const std::string path = "PATH=" + std::filesystem::path(NLS2_TOOL).parent_path().string();
-  return runCommand({"/bin/sh", "-c", path + ":$PATH; " + line}, input, directory);
+  return runCommand({"/bin/sh", "-c", path + ":$PATH FAULTS=" TOOL_FAULTS "; " + line}, input,
+                    directory);
 }
 
 Result runTool(const std::string &line, std::string_view input, const std::string &directory) {
   return runTool(words(line), input, directory);
-}
-
-RunningTool::RunningTool(const std::vector<std::string> &arguments, const std::string &outputPath,
-                         const std::string &errorPath) {
-  std::signal(SIGPIPE, SIG_IGN);
-  int ends[2];
-  if (pipe2(ends, O_CLOEXEC) != 0) {
-    throw std::runtime_error("cannot make a pipe");
-  }
-  pid_ = spawn(toolCommand(arguments), ends[0], "", outputPath, errorPath, ".");
-  close(ends[0]);
-  input_ = ends[1];
-}
-
-RunningTool::~RunningTool() {
-  if (pid_ > 0) {
-    kill(pid_, SIGKILL);
-    wait();
-  }
-}
-
-bool RunningTool::feed(std::string_view bytes) {
-  while (!bytes.empty()) {
-    const ssize_t written = write(input_, bytes.data(), bytes.size());
-    if (written < 0) {
-      return false;
-    }
-    bytes.remove_prefix(static_cast<std::size_t>(written));
-  }
-  return true;
-}
-
-int RunningTool::wait() {
-  close(input_);
-  const int code = exitCodeOf(pid_);
-  pid_ = -1;
-  return code;
 }
 
 } // namespace tools

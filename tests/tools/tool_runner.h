@@ -3,7 +3,6 @@
 
 #include <string>
 #include <string_view>
-#include <sys/types.h>
 #include <vector>
 
 namespace tools {
@@ -41,26 +40,7 @@ Result runTool(const std::vector<std::string> &arguments, std::string_view input
 Result runTool(const std::string &line, std::string_view input = "",
                const std::string &directory = ".");
 
-// The same for a line of sh, whose nls2 is the built one.
+// The same for a line of sh, whose nls2 is the built one and whose $FAULTS is faults.c.
 Result runShell(const std::string &line, std::string_view input, const std::string &directory);
-
-// A nls2 that is running, its standard input a pipe from here.
-class RunningTool {
-public:
-  // Standard output goes to `outputPath`.
-  RunningTool(const std::vector<std::string> &arguments, const std::string &outputPath,
-              const std::string &errorPath);
-  ~RunningTool();
-  RunningTool(const RunningTool &) = delete;
-  RunningTool &operator=(const RunningTool &) = delete;
-
-  pid_t pid() const { return pid_; }
-  bool feed(std::string_view bytes); // false when it reads no more
-  int wait();                        // closes its input; the exit code
-
-private:
-  pid_t pid_ = -1;
-  int input_ = -1;
-};
 
 } // namespace tools

@@ -91,33 +91,31 @@ std::size_t cutBlanks(std::u16string &text) {
   return blanks;
 }
 
-Bytes translated(const Page &from, const Page &to, const std::string &field, Padding padding,
-                 std::size_t most) {
-  auto text = from.decode(field);
-  if (!text) {
-    return {};
-  }
-  const std::size_t blanks = padding == Padding::none ? 0 : cutBlanks(*text);
-  if (padding != Padding::none && text->find(u'\0') != std::u16string::npos) {
-    return {};
-  }
-  Bytes bytes = to.encode(*text);
-  if (!bytes || (most != 0 && bytes->size() > most)) {
-    return {};
-  }
-  const bool fills = padding == Padding::fill;
-  const std::size_t tried = fills ? most : padding == Padding::keep ? blanks : 0;
-  for (std::size_t i = 0; i < tried && !(fills && bytes->size() == most); ++i) {
-    *text += u' ';
-    const Bytes longer = to.encode(*text);
-    if (!longer) {
-      return {};
-    }
-    if (most == 0 || longer->size() <= most) {
+// The longest text with blanks, of up to `tried`, that takes at most `most` bytes; 0: no limit.
+Bytes withBlanks(const Page &to, std::u16string text, std::size_t tried, std::size_t most) {
+  Bytes bytes = to.encode(text);
+  for (; bytes && tried > 0 && (most == 0 || bytes->size() != most); --tried) {
+    text += u' ';
+    const Bytes longer = to.encode(text);
+    if (!longer || most == 0 || longer->size() <= most) {
       bytes = longer;
     }
   }
-  return fills && bytes->size() != most ? std::nullopt : bytes;
+  return bytes;
+}
+
+Bytes translated(const Page &from, const Page &to, const std::string &field, Padding padding,
+                 std::size_t most) {
+  auto text = from.decode(field);
+  const std::size_t blanks = !text || padding == Padding::none ? 0 : cutBlanks(*text);
+  if (!text || (padding != Padding::none && text->find(u'\0') != std::u16string::npos)) {
+    return {};
+  }
+  const std::size_t tried = padding == Padding::fill ? most : padding == Padding::keep ? blanks : 0;
+  Bytes bytes = withBlanks(to, *text, tried, most);
+  const bool fits = bytes && (most == 0 || bytes->size() <= most) &&
+                    (padding != Padding::fill || bytes->size() == most);
+  return fits ? bytes : std::nullopt;
 }
 
 struct Field {
@@ -139,11 +137,14 @@ struct Trial {
   Bytes record(const std::string &bytes) const;
 
 private:
+  Bytes part(const Field &each, const std::string &bytes) const;
   Bytes field(const std::string &bytes, int source, Padding how, std::size_t most) const;
 };
 
 Trial::Trial(std::mt19937 &random) {
-  const auto page = [&] { return std::next(pages.begin(), random() % pages.size())->first; };
+  const auto page = [&] {
+    return std::next(pages.begin(), static_cast<long>(random() % pages.size()))->first;
+  };
   from = page();
   to = page();
   length = 1 + random() % 16;
@@ -217,7 +218,8 @@ Bytes Trial::field(const std::string &bytes, int source, Padding how, std::size_
 
 std::string hexOf(const std::string &bytes) {
   std::string text;
-  for (const unsigned char byte : bytes) {
+  for (const char each : bytes) {
+    const auto byte = static_cast<unsigned char>(each);
     text += {"0123456789ABCDEF"[byte >> 4], "0123456789ABCDEF"[byte & 15]};
   }
   return text;
@@ -231,29 +233,32 @@ std::string csvField(const std::string &field) {
   return field.find_first_of(",\"\r\n") == std::string::npos ? field : text + "\"";
 }
 
+Bytes Trial::part(const Field &each, const std::string &bytes) const {
+  if (each.kind < 0) {
+    return bytes;
+  }
+  if (each.kind == 0) {
+    const Padding how = each.width != 0 ? Padding::fill : Padding::none;
+    return translated(Page(1208, false), Page(to, false), hexOf(bytes), how, each.width);
+  }
+  return field(bytes, each.kind, each.width != 0 ? Padding::fill : padding,
+               each.width != 0 ? each.width : outLength);
+}
+
 Bytes Trial::record(const std::string &bytes) const {
-  std::string out;
+  Bytes whole = fields.empty() ? field(bytes, from, padding, outLength) : Bytes("");
   for (const Field &each : fields) {
-    const std::string part = bytes.substr(each.begin, each.length);
-    const Padding how = each.width != 0 ? Padding::fill : each.kind == 0 ? Padding::none : padding;
-    const std::size_t most = each.width != 0 ? each.width : each.kind == 0 ? 0 : outLength;
-    Bytes made = part;
-    if (each.kind == 0) {
-      made = translated(Page(1208, false), Page(to, false), hexOf(part), how, most);
-    } else if (each.kind > 0) {
-      made = field(part, each.kind, how, most);
-    }
+    const Bytes made = part(each, bytes.substr(each.begin, each.length));
     if (!made) {
       return {};
     }
-    out += (csv && &each != fields.data() ? "," : "") + (csv ? csvField(*made) : *made);
+    *whole += (csv && &each != fields.data() ? "," : "") + (csv ? csvField(*made) : *made);
   }
-  const Bytes whole = fields.empty() ? field(bytes, from, padding, outLength) : Bytes(out);
-  if (!whole || !newline) {
-    return whole;
+  if (whole && newline) {
+    const Page here(to, false); // a line feed after text has no signature
+    *whole += here.encode(u"A\n")->substr(here.encode(u"A")->size());
   }
-  const Page here(to, false); // a line feed after text has no signature
-  return *whole + here.encode(u"A\n")->substr(here.encode(u"A")->size());
+  return whole;
 }
 
 // Half of them text of the page, as long as it must be, with blanks of all kinds at the end.

@@ -53,25 +53,25 @@ Json &Json::set(const char *key, Json value) {
   return *this;
 }
 
+// The dump does not pass on every failure of its callback, so that is kept here.
 std::string Json::text() const {
-  struct Dump {
+  struct Output {
     std::string text;
-    bool failed = false; // libjansson does not look at what it is told of a key
-  };
-  Dump dumped;
-  const auto append = [](const char *bytes, std::size_t length, void *data) noexcept {
-    auto *dump = static_cast<Dump *>(data);
+    bool isWhole = true;
+  } output;
+  const auto append = [](const char *bytes, std::size_t length, void *to) noexcept {
+    auto &out = *static_cast<Output *>(to);
     try {
-      dump->text.append(bytes, length);
+      out.text.append(bytes, length);
     } catch (const std::bad_alloc &) {
-      dump->failed = true;
+      out.isWhole = false;
     }
-    return dump->failed ? -1 : 0;
+    return out.isWhole ? 0 : -1;
   };
-  require(json_dump_callback(value_.get(), append, &dumped,
-                             JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9)) == 0 &&
-          !dumped.failed);
-  return dumped.text + "\n";
+  const int result = json_dump_callback(value_.get(), append, &output,
+                                        JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9));
+  require(result == 0 && output.isWhole);
+  return output.text + "\n";
 }
 
 } // namespace nls2::tool

@@ -2,6 +2,7 @@
 
 #include "commands.h"
 #include "io/print.h"
+#include "memory.h"
 #include "near_names.h"
 #include "nls2.h"
 
@@ -9,6 +10,8 @@
 #include <array>
 #include <csignal>
 #include <cstdio>
+#include <cstdlib>
+#include <exception>
 #include <fcntl.h>
 #include <new>
 #include <string_view>
@@ -33,6 +36,10 @@ constexpr std::array commands{
     CommandEntry{"sort", "Sort lines or fixed-length records by the rules of a language",
                  exitFailed, sortCommand},
     CommandEntry{"find", "Print the lines in which a text occurs", exitUsage, findCommand}};
+
+constexpr const char *outOfMemory = "out of memory";
+
+int failureCode = exitFailed; // of the command
 
 constexpr const char *generalNotes =
     "Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of detect,\n"
@@ -122,26 +129,48 @@ int runCommand(const CommandEntry &entry, int argc, char **argv) {
   }
 }
 
-// The one place where failures become messages and exit codes.
+int runAny(const CommandEntry *entry, int argc, char **argv) {
+  const int code =
+      entry != nullptr ? runCommand(*entry, argc - 1, argv + 1) : runWithoutCommand(argc, argv);
+  requireMemory();
+  return code;
+}
+
+int report(const CommandEntry *entry, const Error &error) {
+  requireMemory();
+  if (error.code() != exitUsage) {
+    complain(error.what());
+    return failureCode;
+  }
+  std::fprintf(stderr, "nls2: %s; see nls2%s%s --help\n", error.what(), entry != nullptr ? " " : "",
+               entry != nullptr ? entry->name : "");
+  return exitUsage;
+}
+
+// The one place where failures become messages and exit codes. What ICU reports without memory is
+// not to be believed.
 int run(const CommandEntry *entry, int argc, char **argv) noexcept {
-  const int failureCode = entry != nullptr ? entry->failureCode : exitFailed;
   try {
-    return entry != nullptr ? runCommand(*entry, argc - 1, argv + 1)
-                            : runWithoutCommand(argc, argv);
-  } catch (const Error &error) {
-    if (error.code() != exitUsage) {
-      complain(error.what());
-      return failureCode;
+    try {
+      return runAny(entry, argc, argv);
+    } catch (const Error &error) {
+      return report(entry, error);
     }
-    std::fprintf(stderr, "nls2: %s; see nls2%s%s --help\n", error.what(),
-                 entry != nullptr ? " " : "", entry != nullptr ? entry->name : "");
-    return exitUsage;
   } catch (const std::bad_alloc &) {
-    complain("out of memory");
+    complain(outOfMemory);
   } catch (const std::exception &error) {
     complain(error.what());
   }
   return failureCode;
+}
+
+// Without memory for an exception the process would be aborted.
+void endWithoutMemory() {
+  if (!std::current_exception()) {
+    complain(outOfMemory);
+    _exit(failureCode);
+  }
+  std::abort();
 }
 
 } // namespace
@@ -151,5 +180,9 @@ int run(const CommandEntry *entry, int argc, char **argv) noexcept {
 int main(int argc, char **argv) {
   nls2::tool::occupyStandardStreams();
   std::signal(SIGXFSZ, SIG_IGN); // a full file is a write error, reported like any other
-  return nls2::tool::run(argc > 1 ? nls2::tool::commandNamed(argv[1]) : nullptr, argc, argv);
+  std::set_terminate(nls2::tool::endWithoutMemory);
+  nls2::tool::watchMemory();
+  const auto *entry = argc > 1 ? nls2::tool::commandNamed(argv[1]) : nullptr;
+  nls2::tool::failureCode = entry != nullptr ? entry->failureCode : nls2::tool::exitFailed;
+  return nls2::tool::run(entry, argc, argv);
 }

@@ -312,7 +312,8 @@ private:
     }
     const bool bare = policy_.padding == padding::strip ||
                       (policy_.padding == padding::keep_blanks && blanks == 0);
-    if (!bare && blank_depends_on_text_) {
+    // Half a pair at the end of the text is one thing before a blank and another at the end of all.
+    if (!bare && (blank_depends_on_text_ || (text != 0 && U16_IS_LEAD(units_[text - 1])))) {
       return together(field, text, blanks, out, result);
     }
     put_text(field, text, out, result);

@@ -4,12 +4,11 @@
 
 #include "codepage/page_names.h"
 #include "errors.h"
+#include "memory.h"
 #include "near_names.h"
 #include "options.h"
 
-#include <algorithm>
 #include <limits>
-#include <new>
 
 namespace nls2::tool {
 
@@ -17,12 +16,6 @@ namespace {
 
 // Enough for some characters of any page, with its signature and its shifts.
 constexpr int32_t fewBytes = 64;
-
-void requireMemory(int32_t status) {
-  if (status == U_MEMORY_ALLOCATION_ERROR || status == NLS2_ERR_NO_MEMORY) {
-    throw std::bad_alloc();
-  }
-}
 
 // The number that the text is; nothing where it is a name. Throws usageError.
 std::optional<int32_t> givenNumber(const char *option, const std::string &text) {
@@ -70,7 +63,6 @@ converter openEncoding(const char *option, const std::string &text) {
   }
   UErrorCode error = U_ZERO_ERROR;
   nls2::converter opened(text.empty() ? nullptr : ucnv_open(text.c_str(), &error));
-  requireMemory(error);
   if (!opened) {
     throw unknownPage(option, text);
   }
@@ -80,7 +72,6 @@ converter openEncoding(const char *option, const std::string &text) {
 CodePage::CodePage(int32_t number, const char *option) : number_(number) {
   std::error_code error;
   converter_ = open_converter(nls2::code_page(number), error);
-  requireMemory(error.value());
   if (!converter_) {
     throw usageError("{}: code page {} does not open: {}{}; `nls2 codepages` lists numbers", option,
                      number, error.message(), nearPages(std::to_string(number)));
@@ -94,7 +85,6 @@ std::string CodePage::encode(std::u16string_view text) const {
   UErrorCode error = U_ZERO_ERROR;
   const int32_t length = ucnv_fromUChars(converter(), bytes.data(), fewBytes, text.data(),
                                          static_cast<int32_t>(text.size()), &error);
-  requireMemory(error);
   bytes.resize(U_FAILURE(error) ? 0 : static_cast<std::size_t>(length));
   return bytes;
 }
@@ -107,27 +97,11 @@ std::optional<EncodedCharacter> CodePage::encoded(char16_t character) const {
   UErrorCode error = U_ZERO_ERROR;
   const int32_t units = ucnv_toUChars(converter(), back, fewBytes, one.data(),
                                       static_cast<int32_t>(one.size()), &error);
-  requireMemory(error);
+  requireMemory();
   if (U_FAILURE(error) || units != 1 || back[0] != character) {
     return {};
   }
   return EncodedCharacter{two.substr(one.size()), 2 * one.size() - two.size()};
-}
-
-std::string translateText(int32_t to, int32_t from, std::string_view text, int32_t &status) {
-  constexpr std::size_t most = std::numeric_limits<int32_t>::max();
-  std::string out(std::min(4 * text.size() + 16, most), '\0');
-  for (;;) {
-    int32_t consumed = 0;
-    const int32_t written =
-        NLS2_TranslateString(to, out.data(), static_cast<int32_t>(out.size()), from, text.data(),
-                             static_cast<int32_t>(text.size()), &consumed, 0, &status);
-    if (status != U_BUFFER_OVERFLOW_ERROR || out.size() == most) {
-      out.resize(static_cast<std::size_t>(written));
-      return out;
-    }
-    out.resize(std::min(2 * out.size(), most));
-  }
 }
 
 } // namespace nls2::tool

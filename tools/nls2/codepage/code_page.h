@@ -13,8 +13,6 @@
 namespace nls2::tool {
 
 constexpr int32_t utf8Page = 1208;
-constexpr int32_t utf16lePage = 57359;
-constexpr int32_t utf7Page = 57366;
 
 // The number of a code page that an option gives by number or by name. Whether the number opens is
 // seen when the page is. Throws usageError.
@@ -50,9 +48,5 @@ private:
   int32_t number_;
   nls2::converter converter_;
 };
-
-// A text from one code page to another as it is, in a buffer that grows until it fits. The status
-// is the library's; the text is empty on failure.
-std::string translateText(int32_t to, int32_t from, std::string_view text, int32_t &status);
 
 } // namespace nls2::tool

@@ -2,28 +2,22 @@
 
 #include "codepage/page_names.h"
 
+#include "memory.h"
 #include "near_names.h"
 #include "nls2/code_page.hpp"
 #include "options.h"
 
 #include <algorithm>
-#include <new>
 
 namespace nls2::tool {
 
 namespace {
 
-void requireMemory(int32_t status) {
-  if (status == U_MEMORY_ALLOCATION_ERROR || status == NLS2_ERR_NO_MEMORY) {
-    throw std::bad_alloc();
-  }
-}
-
 // Null where ICU does not know the name. An empty one would be its default converter.
 nls2::converter openNamed(const std::string &name, UErrorCode &status) {
   status = U_ZERO_ERROR;
   nls2::converter opened(name.empty() ? nullptr : ucnv_open(name.c_str(), &status));
-  requireMemory(status);
+  requireMemory();
   return opened;
 }
 
@@ -42,7 +36,6 @@ std::vector<std::string> aliasesOf(const char *converter) {
 std::optional<std::string> converterOf(int32_t number) {
   char name[UCNV_MAX_CONVERTER_NAME_LENGTH];
   const int32_t status = NLS2_GetCodepageName(number, name, sizeof name);
-  requireMemory(status);
   return status > U_ZERO_ERROR ? std::nullopt : std::optional<std::string>(name);
 }
 
@@ -64,7 +57,6 @@ std::optional<int32_t> ccsidOf(const std::string &name) {
   const bool isNumbered = ucnv_getCCSID(converter.get(), &error) != 0;
   const uint32_t number = isNumbered ? NLS2_GetCodepageId(name.c_str(), &status)
                                      : NLS2_MapWindowsNameToCCSID(name.c_str(), &status);
-  requireMemory(status);
   return status == U_ZERO_ERROR ? std::optional(static_cast<int32_t>(number)) : std::nullopt;
 }
 

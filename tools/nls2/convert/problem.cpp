@@ -8,7 +8,7 @@ namespace nls2::tool {
 
 namespace {
 
-// "the byte FF", "bytes D0 96"
+// "byte FF", "bytes D0 96"
 std::string bytesText(const Problem &problem) {
   return fmt::format("{} {}", problem.byteCount == 1 ? "byte" : "bytes", problem.hex());
 }
@@ -101,8 +101,8 @@ std::string reasonOf(const Problem &problem) {
     return fmt::format("the {} {} not valid in code page {}", bytesText(problem),
                        problem.byteCount == 1 ? "is" : "are", problem.page);
   case ProblemKind::notInPage:
-    return fmt::format("the character {} ({}) is not in code page {}", problem.codePointText(),
-                       bytesText(problem), problem.page);
+    return fmt::format("the character {}{} is not in code page {}", problem.codePointText(),
+                       problem.byteCount > 0 ? " (" + bytesText(problem) + ")" : "", problem.page);
   case ProblemKind::tooLong:
     return tooLong(problem);
   case ProblemKind::nullInside:

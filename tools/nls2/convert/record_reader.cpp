@@ -14,6 +14,18 @@ namespace {
 constexpr std::size_t usualBatch = std::size_t{256} * 1024;
 constexpr std::size_t longestLine = std::size_t{1} << 30;
 
+constexpr std::size_t usualOutput = std::size_t{2} << 20;
+
+// The bytes that a record takes in the output at the least, where it is filled.
+std::size_t filledLength(const TranslateOptions &options) {
+  const std::size_t filled = options.padding == nls2::padding::fill ? options.outLength : 0;
+  std::size_t length = options.fields.empty() ? filled : 0;
+  for (const FieldSpec &field : options.fields) {
+    length += field.width != 0 ? field.width : filled;
+  }
+  return length;
+}
+
 uint64_t product(uint64_t a, uint64_t b) {
   uint64_t result = 0;
   return __builtin_mul_overflow(a, b, &result) ? std::numeric_limits<uint64_t>::max() : result;
@@ -23,7 +35,8 @@ uint64_t product(uint64_t a, uint64_t b) {
 
 RecordReader::RecordReader(InputFile &input, const TranslateOptions &options, int wakeFd)
     : input_(input), wakeFd_(wakeFd), recordLength_(options.recordLength), toSkip_(options.skip),
-      left_(options.count) {
+      left_(options.count),
+      mostRecords_(std::max<std::size_t>(usualOutput / (filledLength(options) + 1), 1)) {
   if (recordLength_ == 0) {
     ends_.emplace(CodePage(options.from, "--from"));
   }
@@ -68,11 +81,10 @@ std::size_t RecordReader::readMore(RecordBatch &batch, std::size_t most) {
   return got;
 }
 
-// No byte behind the last record wanted is taken from the input.
+// No byte after the last record wanted is taken from the input.
 bool RecordReader::readRecords(RecordBatch &batch) {
-  const std::size_t wanted = static_cast<std::size_t>(
-      std::min<uint64_t>(product(left_, recordLength_),
-                         std::max<std::size_t>(usualBatch / recordLength_, 1) * recordLength_));
+  const uint64_t most = std::clamp<uint64_t>(usualBatch / recordLength_, 1, mostRecords_);
+  const auto wanted = static_cast<std::size_t>(std::min(left_, most) * recordLength_);
   while (batch.bytes.size() < recordLength_ && !ended_) {
     readMore(batch, std::min(wanted - batch.bytes.size(), usualBatch));
   }
@@ -88,34 +100,39 @@ bool RecordReader::readLines(RecordBatch &batch) {
   batch.lines.clear();
   scanned_ = 0;
   ends_->restart();
-  while (batch.lines.empty() && !ended_) {
+  for (;;) {
+    const std::size_t before = scanned_;
+    findLines(batch);
+    skipLines(batch);
+    if (!batch.lines.empty() || (ended_ && scanned_ == batch.bytes.size())) {
+      break;
+    }
     if (batch.bytes.size() - scanned_ > longestLine) {
       refuseLongLine();
     }
-    readMore(batch, usualBatch);
-    findLines(batch);
-    skipLines(batch);
+    if (scanned_ == before) {
+      readMore(batch, usualBatch);
+    }
   }
-  if (batch.lines.size() > left_) {
-    batch.lines.resize(static_cast<std::size_t>(left_));
-  }
-  std::size_t end = batch.begin;
-  for (const LineBounds &line : batch.lines) {
-    end += line.end;
-  }
-  carried_ = batch.bytes.bytes().substr(end);
-  batch.bytes.truncate(end);
+  carried_ = batch.bytes.bytes().substr(scanned_);
+  batch.bytes.truncate(scanned_);
   return !batch.lines.empty();
 }
 
 // The last line may have no end.
 void RecordReader::findLines(RecordBatch &batch) {
   const std::string_view text = batch.bytes.bytes();
-  while (const auto line = ends_->lineAt(text, scanned_)) {
+  const uint64_t most =
+      left_ < mostRecords_ ? std::min<uint64_t>(left_ + toSkip_, mostRecords_) : mostRecords_;
+  while (batch.lines.size() < most) {
+    const auto line = ends_->lineAt(text, scanned_);
+    if (!line) {
+      break;
+    }
     batch.lines.push_back(*line);
     scanned_ += line->end;
   }
-  if (ended_ && scanned_ < text.size()) {
+  if (ended_ && batch.lines.size() < most && scanned_ < text.size()) {
     batch.lines.push_back({text.size() - scanned_, text.size() - scanned_});
     scanned_ = text.size();
   }

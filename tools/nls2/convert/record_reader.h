@@ -70,9 +70,10 @@ private:
   const std::size_t recordLength_;
   std::optional<LineEnds> ends_; // of lines
   uint64_t toSkip_;
-  uint64_t left_;           // records that may still be read
-  std::string carried_;     // the beginning of a record whose end has not been read
-  std::size_t scanned_ = 0; // where the next line of the batch begins
+  uint64_t left_;                 // records that may still be read
+  const std::size_t mostRecords_; // in a batch, so that its output stays small too
+  std::string carried_;           // the beginning of a record whose end has not been read
+  std::size_t scanned_ = 0;       // where the next line of the batch begins
   uint64_t records_ = 0;
   uint64_t offset_ = 0;
   bool started_ = false;

@@ -4,7 +4,9 @@
 
 #include "errors.h"
 #include "io/file_attributes.h"
+#include "memory.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <charconv>
 #include <climits>
@@ -31,11 +33,26 @@ std::string resolved(const std::string &path) {
 // The file that a path leads to, through symbolic links: a link stays a link when its file is
 // replaced.
 std::string realPathOf(const std::string &path) {
-  const std::string real = resolved(path);
+  std::string real = resolved(path);
   if (real.empty()) {
     throw failure("cannot write {}: {}", printable(path), std::strerror(errno));
   }
   return real;
+}
+
+std::optional<int> numberIn(const std::string &text) {
+  int number = -1;
+  const char *end = text.data() + text.size();
+  const auto [stop, error] = std::from_chars(text.data(), end, number);
+  return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
+}
+
+// Where a symbolic link leads; empty for everything else.
+std::string targetOf(const std::string &path) {
+  std::string target(PATH_MAX, '\0');
+  const ssize_t length = readlink(path.c_str(), target.data(), target.size());
+  target.resize(static_cast<std::size_t>(std::max<ssize_t>(length, 0)));
+  return target;
 }
 
 // The number in /proc/self/fd/NUMBER, to which /dev/stdout, /dev/fd/NUMBER and links of users lead.
@@ -43,23 +60,17 @@ std::string realPathOf(const std::string &path) {
 std::optional<int> descriptorOf(std::string path) {
   const std::string ours = "/proc/" + std::to_string(getpid()) + "/";
   for (int links = 0; links < 40; ++links) {
-    const std::size_t slash = path.rfind('/');
-    const std::string directory = slash == std::string::npos ? "." : path.substr(0, slash + 1);
-    const std::string name = slash == std::string::npos ? path : path.substr(slash + 1);
+    const std::size_t name = path.rfind('/') + 1; // 0 without a slash
+    const std::string directory = name == 0 ? "./" : path.substr(0, name);
     const std::string real = resolved(directory);
     if (real.starts_with(ours) && real.ends_with("/fd")) {
-      int number = -1;
-      const char *end = name.data() + name.size();
-      const auto [stop, error] = std::from_chars(name.data(), end, number);
-      return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
+      return numberIn(path.substr(name));
     }
-    std::string target(PATH_MAX, '\0');
-    const ssize_t length = readlink(path.c_str(), target.data(), target.size());
-    if (length <= 0) {
+    const std::string target = targetOf(path);
+    if (target.empty()) {
       return {};
     }
-    target.resize(static_cast<std::size_t>(length));
-    path = target.starts_with("/") ? target : directory + "/" + target;
+    path = target.starts_with("/") ? target : directory + target;
   }
   return {};
 }
@@ -103,7 +114,7 @@ void OutputFile::open(const std::string &path) {
     throw failure("cannot write {}: it is a symbolic link that leads nowhere", name_);
   }
   replacedPath_ = path;
-  temporary_ = std::make_unique<TemporaryFile>(path, 0666);
+  temporary_ = std::make_unique<TemporaryFile>(path, name_, 0666);
   fd_ = temporary_->fd();
 }
 
@@ -124,7 +135,7 @@ void OutputFile::replaceFile(const std::string &path, const struct stat &existin
     throw failure("cannot write {}: it is another user's, in a directory with the sticky bit",
                   name_);
   }
-  temporary_ = std::make_unique<TemporaryFile>(replacedPath_, 0600);
+  temporary_ = std::make_unique<TemporaryFile>(replacedPath_, name_, 0600);
   fd_ = temporary_->fd();
   copyAttributes(replacedPath_, existing, fd_);
 }
@@ -167,6 +178,7 @@ void OutputFile::flush() {
 
 // Closing a second descriptor makes a file system report lost bytes, and standard output stays.
 void OutputFile::commit(bool sync) {
+  requireMemory(); // what ICU made without it must not take a file's place
   flush();
   if (temporary_) {
     temporary_->publish(sync);

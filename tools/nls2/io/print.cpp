@@ -3,10 +3,12 @@
 #include "io/print.h"
 
 #include "io/output_file.h"
+#include "memory.h"
 
 namespace nls2::tool {
 
 void print(std::string_view text) {
+  requireMemory();
   OutputFile out("-");
   out.write(text);
   out.commit();

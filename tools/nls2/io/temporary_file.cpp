@@ -83,7 +83,7 @@ std::string ownPath(int fd) { return fmt::format("/proc/self/fd/{}", fd); }
 
 // Calls `make` with names beside the target until one is free.
 template <typename Make>
-std::string takeFreeName(const std::string &target, Make make) {
+std::string takeFreeName(const std::string &target, const std::string &shownName, Make make) {
   for (int attempt = 0; attempt < 1000; ++attempt) {
     std::string name = fmt::format("{}/.nls2-{}-{}.tmp", directoryOf(target), getpid(), attempt);
     if (make(name.c_str()) >= 0) {
@@ -93,7 +93,7 @@ std::string takeFreeName(const std::string &target, Make make) {
       break;
     }
   }
-  throw failure("cannot write {}: no new file in its directory: {}", printable(target),
+  throw failure("cannot write {}: no new file in its directory: {}", shownName,
                 std::strerror(errno));
 }
 
@@ -110,7 +110,8 @@ void endBySignal(int signal) {
   _exit(128 + signal);
 }
 
-TemporaryFile::TemporaryFile(std::string target, mode_t mode) : target_(std::move(target)) {
+TemporaryFile::TemporaryFile(std::string target, std::string name, mode_t mode)
+    : target_(std::move(target)), shownName_(std::move(name)) {
   catchEndingSignals();
   fd_ = open(directoryOf(target_).c_str(), O_TMPFILE | O_RDWR | O_CLOEXEC, mode);
   if (fd_ >= 0 && access(ownPath(fd_).c_str(), F_OK) == 0) {
@@ -134,7 +135,7 @@ TemporaryFile::~TemporaryFile() {
 }
 
 void TemporaryFile::fail() const {
-  throw failure("cannot write {}: {}", printable(target_), std::strerror(errno));
+  throw failure("cannot write {}: {}", shownName_, std::strerror(errno));
 }
 
 void TemporaryFile::enlist() {
@@ -154,7 +155,7 @@ void TemporaryFile::leaveList() {
 
 void TemporaryFile::openNamed(mode_t mode) {
   const SignalsHeldBack held;
-  name_ = takeFreeName(target_, [&](const char *name) {
+  name_ = takeFreeName(target_, shownName_, [&](const char *name) {
     return fd_ = open(name, O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, mode);
   });
   enlist();
@@ -162,7 +163,7 @@ void TemporaryFile::openNamed(mode_t mode) {
 
 // An unnamed file can take a free name only; the step from there to the target is a rename.
 void TemporaryFile::giveTemporaryName() {
-  name_ = takeFreeName(target_, [&](const char *name) {
+  name_ = takeFreeName(target_, shownName_, [&](const char *name) {
     return linkat(AT_FDCWD, ownPath(fd_).c_str(), AT_FDCWD, name, AT_SYMLINK_FOLLOW);
   });
   enlist();

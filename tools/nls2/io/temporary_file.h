@@ -10,8 +10,8 @@ namespace nls2::tool {
 // gone; a signal that ends the process takes it along.
 class TemporaryFile {
 public:
-  // Throws Error.
-  TemporaryFile(std::string target, mode_t mode);
+  // `name` is what messages call the target. Throws Error.
+  TemporaryFile(std::string target, std::string name, mode_t mode);
   ~TemporaryFile();
   TemporaryFile(const TemporaryFile &) = delete;
   TemporaryFile &operator=(const TemporaryFile &) = delete;
@@ -31,6 +31,7 @@ private:
   [[noreturn]] void fail() const;
 
   const std::string target_;
+  const std::string shownName_;
   std::string name_;                        // the temporary name, while there is one
   const char *volatile toRemove_ = nullptr; // the same, for a signal handler
   TemporaryFile *volatile next_ = nullptr;  // in the list of those that have a name

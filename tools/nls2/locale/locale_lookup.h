@@ -24,9 +24,6 @@ struct FoundLocales {
 // where there is none.
 FoundLocales lookUpLocale(const std::string &asked);
 
-// Names of the table that somebody may have meant who wrote de-DE, DE_de, de_DE.UTF-8 or de_XX.
-std::vector<std::string> nearLocales(const std::string &asked);
-
 std::string localesAsText(const LocaleRecords &records); // a heading and one line a record
 std::string foundLocalesAsText(const FoundLocales &found);
 

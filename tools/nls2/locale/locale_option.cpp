@@ -176,6 +176,8 @@ EnvironmentLocale environmentLocale() {
 
 } // namespace
 
+std::string localesNear(const std::string &name) { return suggestions(name); }
+
 std::vector<Option> localeOptions(LocaleOptions &options) {
   return {{.name = "locale",
            .metavar = "LOCALE",

@@ -16,6 +16,9 @@ struct LocaleOptions {
   int32_t codepage = utf8Page;
 };
 
+// " (did you mean de_DE?)" for a name that is not in the table.
+std::string localesNear(const std::string &name);
+
 std::vector<Option> localeOptions(LocaleOptions &options);
 
 // The locale whose order of texts counts: of --locale, or of the environment (LC_ALL, LC_COLLATE,
