@@ -4,7 +4,7 @@
 #include "checks.h"
 #include "convert/record_reader.h"
 #include "errors.h"
-#include "io/line_reader.h"
+#include "text/line_reader.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
