@@ -10,6 +10,7 @@
 #include <limits>
 #include <optional>
 #include <string>
+#include <type_traits>
 #include <vector>
 
 namespace nls2::tool {
@@ -62,6 +63,7 @@ enum class Request { work, help, version };
 Request parse(const Command &command, int argc, char **argv);
 
 std::string helpOf(const CommandEntry &entry, const Command &command);
+std::string helpLine(const std::string &what, const char *help);
 
 // Nothing where the text is not a decimal number of that type, to its end.
 template <typename Number>
@@ -84,8 +86,18 @@ Number parseNumber(const char *option, const std::string &text, Number least, Nu
 }
 std::optional<uint32_t> wholeNumber(const std::string &text); // decimal or 0x...; never octal
 
-Take into(std::string &value);
-Take into(std::vector<std::string> &values);
-Take into(bool &flag);
+// Keeps the value as a text or an optional one, appends it to a list, or sets a flag.
+template <class Value>
+Take into(Value &value) {
+  return [&value](const std::string &text) {
+    if constexpr (std::is_same_v<Value, bool>) {
+      value = true;
+    } else if constexpr (std::is_same_v<Value, std::vector<std::string>>) {
+      value.push_back(text);
+    } else {
+      value = text;
+    }
+  };
+}
 
 } // namespace nls2::tool
