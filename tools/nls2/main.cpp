@@ -37,8 +37,6 @@ constexpr std::array commands{
                  exitFailed, sortCommand},
     CommandEntry{"find", "Print the lines in which a text occurs", exitUsage, findCommand}};
 
-constexpr const char *outOfMemory = "out of memory";
-
 int failureCode = exitFailed; // of the command
 
 constexpr const char *generalNotes =
@@ -141,7 +139,7 @@ int run(const CommandEntry *entry, int argc, char **argv) noexcept {
       return report(entry, error);
     }
   } catch (const std::bad_alloc &) {
-    complain(outOfMemory);
+    complain("out of memory");
   } catch (const std::exception &error) {
     complain(error.what());
   }
@@ -151,7 +149,7 @@ int run(const CommandEntry *entry, int argc, char **argv) noexcept {
 // Without memory for an exception the process would be aborted.
 void endWithoutMemory() {
   if (!std::current_exception()) {
-    complain(outOfMemory);
+    complain("out of memory");
     _exit(failureCode);
   }
   std::abort();

@@ -36,17 +36,16 @@ public:
 
   // The next option with its value; null when only operands are left. Throws usageError.
   const Option *next(int argc, char **argv) {
-    const int code = getopt_long(argc, argv, letters_.c_str(), long_.data(), nullptr);
-    if (code == -1) {
+    switch (const int code = getopt_long(argc, argv, letters_.c_str(), long_.data(), nullptr)) {
+    case -1:
       return nullptr;
-    }
-    if (code == ':') {
+    case ':':
       throw usageError("--{} needs a value: {}", optionOf(optopt).name, optionOf(optopt).metavar);
-    }
-    if (code == '?') {
+    case '?':
       throw unknown(optopt, argv[optind - 1]);
+    default:
+      return &optionOf(code);
     }
-    return &optionOf(code);
   }
 
 private:

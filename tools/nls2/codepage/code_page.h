@@ -64,7 +64,6 @@ public:
   int32_t number() const { return number_; }
   UConverter *converter() const { return converter_.get(); }
   nls2::converter take() { return std::move(converter_); }
-  bool isSingleByte() const { return ucnv_getMaxCharSize(converter()) == 1; }
 
   // Nothing where the page does not have the character, or only a substitute for it.
   std::optional<EncodedCharacter> encoded(char16_t character) const;

@@ -57,14 +57,12 @@ Signature detect(const std::string &path) {
     found.encoding = name != nullptr ? std::optional<std::string>(name) : std::nullopt;
   } catch (const Error &error) {
     found.error = error.what();
+    complain(error.what());
   }
   return found;
 }
 
 std::string asText(const Signature &found) {
-  if (found.error) {
-    return "";
-  }
   return fmt::format("{}: {}\n", printable(found.file),
                      found.encoding ? fmt::format("{}, {} bytes", *found.encoding, found.length)
                                     : "no signature");
@@ -82,11 +80,8 @@ int detectAll(const Arguments &arguments) {
   int code = exitDone;
   for (const std::string &path : arguments.paths) {
     const Signature &found = signatures.emplace_back(detect(path));
-    if (found.error) {
-      complain(found.error->c_str());
-    }
     code = std::max<int>(code, found.error ? exitUsage : found.encoding ? exitDone : exitFailed);
-    text += asText(found);
+    text += found.error ? "" : asText(found);
   }
   print(arguments.asJson ? Json::array(signatures, asJson).text() : text);
   return code;

@@ -73,13 +73,65 @@ public:
   std::string takeLines() { return std::exchange(lines_, {}); }
 
 private:
-  static void onInvalid(const void *dump, UConverterToUnicodeArgs *arguments, const char *bytes,
-                        int32_t length, UConverterCallbackReason reason, UErrorCode *error);
+  // Every byte that is not valid is a dot. It may come before a character of the same call.
+  static void onInvalid(const void *dump, UConverterToUnicodeArgs *, const char *, int32_t length,
+                        UConverterCallbackReason reason, UErrorCode *error) {
+    if (reason <= UCNV_IRREGULAR) {
+      static_cast<PageDump *>(const_cast<void *>(dump))->addDots(static_cast<std::size_t>(length));
+      *error = U_ZERO_ERROR;
+    }
+  }
 
-  void decode(const char *byte, bool isLast);
-  void addCharacter(std::u16string_view text, std::size_t length);
-  void addDots(std::size_t length);
-  void endLine(std::size_t length);
+  // Some converters count bytes once more that they had taken before.
+  void addDots(std::size_t length) {
+    cells_.insert(cells_.end(), std::min(length, bytes_.size() - cells_.size()), ".");
+  }
+
+  // One column a byte. What a wide character covers is an empty cell.
+  void addCharacter(std::u16string_view text, std::size_t length) {
+    const Display display = displayOf(text);
+    for (std::size_t i = 0; i < length; ++i) {
+      const bool isCovered = static_cast<int>(i) < display.columns;
+      cells_.push_back((i == 0 ? display.text : std::string()) + (isCovered ? "" : " "));
+    }
+  }
+
+  // What the converter has taken without a character, or a character's part, such as a shift, is a
+  // dot.
+  void decode(const char *byte, bool isLast) {
+    std::array<char16_t, 32> units;
+    char16_t *end = units.data();
+    UErrorCode error = U_ZERO_ERROR;
+    ucnv_toUnicode(page_.converter(), &end, units.data() + units.size(), &byte,
+                   byte + (isLast ? 0 : 1), nullptr, static_cast<UBool>(isLast), &error);
+    require(error);
+    const auto pending = static_cast<std::size_t>(ucnv_toUCountPending(page_.converter(), &error));
+    const std::size_t unknown = bytes_.size() - cells_.size();
+    const std::size_t length = unknown - std::min(pending, unknown);
+    if (end == units.data()) {
+      addDots(length);
+    } else {
+      addCharacter({units.data(), end}, length);
+    }
+  }
+
+  void endLine(std::size_t length) {
+    constexpr const char *digits = "0123456789abcdef";
+    std::string hex;
+    std::string text;
+    bool isCovered = true; // by a character of the line before, whose columns are not here
+    for (std::size_t i = 0; i < length; ++i) {
+      const auto byte = static_cast<unsigned char>(bytes_[i]);
+      hex.append(i == bytesALine / 2 ? "  " : " ").append(1, digits[byte / 16]);
+      hex += digits[byte % 16];
+      isCovered = isCovered && cells_[i].empty();
+      text += isCovered ? " " : cells_[i];
+    }
+    lines_ += fmt::format("{:08x} {:<49}  |{}|\n", offset_, hex, text);
+    offset_ += length;
+    bytes_.erase(0, length);
+    cells_.erase(cells_.begin(), cells_.begin() + static_cast<std::ptrdiff_t>(length));
+  }
 
   CodePage page_;
   uint64_t offset_ = 0;            // of the first byte that is not in a line yet
@@ -87,64 +139,6 @@ private:
   std::vector<std::string> cells_; // what stands in their columns, as far as it is known
   std::string lines_;
 };
-
-// Every byte that is not valid is a dot. It may come before a character of the same call.
-void PageDump::onInvalid(const void *dump, UConverterToUnicodeArgs *, const char *, int32_t length,
-                         UConverterCallbackReason reason, UErrorCode *error) {
-  if (reason <= UCNV_IRREGULAR) {
-    static_cast<PageDump *>(const_cast<void *>(dump))->addDots(static_cast<std::size_t>(length));
-    *error = U_ZERO_ERROR;
-  }
-}
-
-// Some converters count bytes once more that they had taken before.
-void PageDump::addDots(std::size_t length) {
-  cells_.insert(cells_.end(), std::min(length, bytes_.size() - cells_.size()), ".");
-}
-
-// One column a byte. What a wide character covers is an empty cell.
-void PageDump::addCharacter(std::u16string_view text, std::size_t length) {
-  const Display display = displayOf(text);
-  for (std::size_t i = 0; i < length; ++i) {
-    const bool isCovered = static_cast<int>(i) < display.columns;
-    cells_.push_back((i == 0 ? display.text : std::string()) + (isCovered ? "" : " "));
-  }
-}
-
-// What the converter has taken without a character, or a character's part, such as a shift, is a
-// dot.
-void PageDump::decode(const char *byte, bool isLast) {
-  std::array<char16_t, 32> units;
-  char16_t *end = units.data();
-  UErrorCode error = U_ZERO_ERROR;
-  ucnv_toUnicode(page_.converter(), &end, units.data() + units.size(), &byte,
-                 byte + (isLast ? 0 : 1), nullptr, static_cast<UBool>(isLast), &error);
-  require(error);
-  const auto pending = static_cast<std::size_t>(ucnv_toUCountPending(page_.converter(), &error));
-  const std::size_t unknown = bytes_.size() - cells_.size();
-  const std::size_t length = unknown - std::min(pending, unknown);
-  if (end == units.data()) {
-    addDots(length);
-  } else {
-    addCharacter({units.data(), end}, length);
-  }
-}
-
-void PageDump::endLine(std::size_t length) {
-  std::string hex;
-  std::string text;
-  bool isCovered = true; // by a character of the line before, whose columns are not here
-  for (std::size_t i = 0; i < length; ++i) {
-    hex += i == bytesALine / 2 ? "  " : " ";
-    hex += fmt::format("{:02x}", static_cast<unsigned char>(bytes_[i]));
-    isCovered = isCovered && cells_[i].empty();
-    text += isCovered ? " " : cells_[i];
-  }
-  lines_ += fmt::format("{:08x} {:<49}  |{}|\n", offset_, hex, text);
-  offset_ += length;
-  bytes_.erase(0, length);
-  cells_.erase(cells_.begin(), cells_.begin() + static_cast<std::ptrdiff_t>(length));
-}
 
 int dumpFile(const Arguments &arguments) {
   PageDump dump(CodePage(arguments.page, "--from"));
