@@ -1,4 +1,4 @@
-// What --help shows completes in bash, and the examples of the manual page are cases.
+// What --help shows completes in bash, and the manual pages show what the commands do.
 
 #include "support/case_file.h"
 #include "tool_runner.h"
@@ -97,6 +97,35 @@ TEST(Manual, EveryExampleIsACase) {
     }
   }
   EXPECT_GE(examples, 8);
+}
+
+// In literal blocks, "$ " begins a command, and what follows is its output. \e is a backslash, at
+// whose end a command goes on; a backslash alone joins two lines.
+TEST(Manual, ShowsWhatTheCommandsOfItsWorkedExampleDo) {
+  std::string script = "exec 2>&1\n";
+  std::string output;
+  bool literal = false;
+  bool goesOn = false;
+  for (std::string line : linesOf(readFile(TOOL_MANUALS "/nls2.7"))) {
+    if (line == ".Bd -literal" || line == ".Ed") {
+      literal = line != ".Ed";
+      continue;
+    }
+    if (!literal) {
+      continue;
+    }
+    const bool joined = line.ends_with('\\');
+    line.replace(joined ? line.size() - 1 : line.size(), 1, joined ? "" : "\n");
+    line = std::regex_replace(line, std::regex(R"(\\e)"), "\\");
+    const bool begins = line.starts_with("$ ");
+    (begins || goesOn ? script : output) += begins ? line.substr(2) : line;
+    goesOn = (begins || goesOn) && line.ends_with("\\\n");
+  }
+  ASSERT_FALSE(output.empty());
+  const TempDir dir;
+  const Result result = runShell(script, "", dir.path("."));
+  EXPECT_EQ(result.out, output);
+  EXPECT_EQ(result.exitCode, 0);
 }
 
 } // namespace

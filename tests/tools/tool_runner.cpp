@@ -8,7 +8,6 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
-#include <spawn.h>
 #include <sstream>
 #include <stdexcept>
 #include <sys/wait.h>
@@ -18,34 +17,26 @@ namespace tools {
 
 namespace {
 
+// Standard input is the file `in` of `streams`, and the others are `out` and `err` there.
 pid_t spawn(const std::vector<std::string> &command, const TempDir &streams,
             const std::string &directory) {
   std::vector<char *> argv;
-  argv.reserve(command.size() + 1);
   for (const std::string &argument : command) {
     argv.push_back(const_cast<char *>(argument.c_str()));
   }
   argv.push_back(nullptr);
-  posix_spawn_file_actions_t actions;
-  posix_spawn_file_actions_init(&actions);
-  const int creates = O_WRONLY | O_CREAT;
-  posix_spawn_file_actions_addopen(&actions, 0, streams.path("in").c_str(), O_RDONLY, 0);
-  posix_spawn_file_actions_addopen(&actions, 1, streams.path("out").c_str(), creates, 0666);
-  posix_spawn_file_actions_addopen(&actions, 2, streams.path("err").c_str(), creates, 0666);
-  posix_spawn_file_actions_addchdir_np(&actions, directory.c_str());
-  pid_t pid = -1;
-  const int failed = posix_spawn(&pid, argv[0], &actions, nullptr, argv.data(), environ);
-  posix_spawn_file_actions_destroy(&actions);
-  if (failed != 0) {
-    throw std::runtime_error("cannot start " + command[0]);
+  const std::string paths[] = {streams.path("in"), streams.path("out"), streams.path("err")};
+  const pid_t pid = fork();
+  if (pid == 0) {
+    for (int i = 0; i < 3; ++i) {
+      dup2(open(paths[i].c_str(), (i == 0 ? O_RDONLY : O_WRONLY | O_CREAT) | O_CLOEXEC, 0666), i);
+    }
+    if (chdir(directory.c_str()) == 0) {
+      execv(argv[0], argv.data());
+    }
+    _exit(127);
   }
   return pid;
-}
-
-std::vector<std::string> toolCommand(const std::vector<std::string> &arguments) {
-  std::vector<std::string> command{NLS2_TOOL};
-  command.insert(command.end(), arguments.begin(), arguments.end());
-  return command;
 }
 
 int exitCodeOf(pid_t pid) {
@@ -100,7 +91,9 @@ static Result runCommand(const std::vector<std::string> &command, std::string_vi
 
 Result runTool(const std::vector<std::string> &arguments, std::string_view input,
                const std::string &directory) {
-  return runCommand(toolCommand(arguments), input, directory);
+  std::vector<std::string> command{NLS2_TOOL};
+  command.insert(command.end(), arguments.begin(), arguments.end());
+  return runCommand(command, input, directory);
 }
 
 Result runShell(const std::string &line, std::string_view input, const std::string &directory) {

@@ -1,7 +1,10 @@
 // How a command gives up: one exception, with an exit code and a message for standard error.
 #pragma once
 
+#include "nls2/error.hpp"
+
 #include <cstdint>
+#include <cstdio>
 #include <fmt/core.h>
 #include <optional>
 #include <stdexcept>
@@ -41,12 +44,29 @@ Error usageError(fmt::format_string<Arguments...> format, Arguments &&...argumen
 using Refusal = std::optional<std::string>;
 
 // A status of the library or of ICU in words.
-std::string statusText(int32_t status);
+inline std::string statusText(int32_t status) { return category().message(status); }
 
-// A file name for a message: its control characters are escaped.
-std::string printable(std::string_view name);
+// A file name for a message: its control characters are escaped, U+0080 to U+009F too.
+inline std::string printable(std::string_view name) {
+  std::string text;
+  for (std::size_t i = 0; i < name.size(); ++i) {
+    const auto byte = static_cast<unsigned char>(name[i]);
+    const auto next = static_cast<unsigned char>(i + 1 < name.size() ? name[i + 1] : '\0');
+    if (byte == '\n') {
+      text += "\\n";
+    } else if (byte < 0x20 || byte == 0x7F) {
+      text += fmt::format("\\x{:02X}", byte);
+    } else if (byte == 0xC2 && (next & 0xE0) == 0x80) {
+      text += fmt::format("\\xC2\\x{:02X}", next);
+      ++i;
+    } else {
+      text += name[i];
+    }
+  }
+  return text;
+}
 
 // A message of the command on standard error. Allocates nothing.
-void complain(const char *text) noexcept;
+inline void complain(const char *text) noexcept { std::fprintf(stderr, "nls2: %s\n", text); }
 
 } // namespace nls2::tool

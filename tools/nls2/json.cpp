@@ -16,62 +16,49 @@ void require(bool done) {
   }
 }
 
-std::string validUtf8(std::string_view text) {
+json_t *makeString(std::string_view text) {
   const auto units = icu::UnicodeString::fromUTF8({text.data(), static_cast<int32_t>(text.size())});
   require(!units.isBogus());
   std::string valid;
-  return units.toUTF8String(valid);
-}
-
-json_t *makeString(std::string_view text) {
-  const std::string valid = validUtf8(text);
+  units.toUTF8String(valid);
   return json_stringn(valid.data(), valid.size());
 }
 
 } // namespace
 
-void Json::Release::operator()(json_t *value) const noexcept { json_decref(value); }
-
-Json::Json(json_t *owned) : value_(owned) { require(owned != nullptr); }
+Json::Json(json_t *owned) : value_(owned, json_decref) { require(owned != nullptr); }
 Json::Json(std::nullptr_t) : Json(json_null()) {}
 Json::Json(bool value) : Json(json_boolean(value)) {}
 Json::Json(double value) : Json(json_real(value)) {}
-Json::Json(Exact number) : Json(json_integer(number.value)) {}
 Json::Json(std::string_view text) : Json(makeString(text)) {}
+json_t *Json::integer(int64_t value) { return json_integer(value); }
+Json Json::emptyArray() { return Json(json_array()); }
 
-Json Json::array() { return Json(json_array()); }
-Json Json::object() { return Json(json_object()); }
+Json Json::object(std::initializer_list<std::pair<const char *, Json>> members) {
+  Json object(json_object());
+  for (const auto &[key, value] : members) {
+    object.set(key, value);
+  }
+  return object;
+}
 
-// The setters with "new" in their names take the value over, also where they fail.
-Json &Json::append(Json value) {
-  require(json_array_append_new(value_.get(), value.value_.release()) == 0);
+Json &Json::set(const char *key, const Json &value) {
+  require(json_object_set(value_.get(), key, value.value_.get()) == 0);
   return *this;
 }
 
-Json &Json::set(const char *key, Json value) {
-  require(json_object_set_new(value_.get(), key, value.value_.release()) == 0);
-  return *this;
+void Json::append(const Json &value) {
+  require(json_array_append(value_.get(), value.value_.get()) == 0);
 }
 
-// The dump does not pass on every failure of its callback, so that is kept here.
 std::string Json::text() const {
-  struct Output {
-    std::string text;
-    bool isWhole = true;
-  } output;
-  const auto append = [](const char *bytes, std::size_t length, void *to) noexcept {
-    auto &out = *static_cast<Output *>(to);
-    try {
-      out.text.append(bytes, length);
-    } catch (const std::bad_alloc &) {
-      out.isWhole = false;
-    }
-    return out.isWhole ? 0 : -1;
+  const auto dump = [this](char *to, std::size_t size) {
+    return json_dumpb(value_.get(), to, size,
+                      JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9));
   };
-  const int result = json_dump_callback(value_.get(), append, &output,
-                                        JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9));
-  require(result == 0 && output.isWhole);
-  return output.text + "\n";
+  std::string text(dump(nullptr, 0), '\0');
+  require(!text.empty() && dump(text.data(), text.size()) == text.size());
+  return text + "\n";
 }
 
 } // namespace nls2::tool

@@ -43,7 +43,7 @@ int failureCode = exitFailed; // of the command
 
 constexpr const char *generalNotes =
     "Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of detect,\n"
-    "compare and find, which answer a question: 0 yes, 1 no, 2 trouble.\n";
+    "compare and find, which answer a question: 0 yes, 1 no, 2 trouble.\nSee nls2(1).\n";
 
 // A standard stream that the caller closed must not become a file opened here: its descriptor is
 // taken by an open file that can only fail.
@@ -61,79 +61,60 @@ const CommandEntry *commandNamed(std::string_view name) {
   return found == commands.end() ? nullptr : &*found;
 }
 
-const CommandEntry &requireCommand(const std::string &name) {
-  if (const CommandEntry *entry = commandNamed(name)) {
-    return *entry;
-  }
+Error unknownCommand(const std::string &name) {
   std::vector<std::string> names{"help"};
   for (const CommandEntry &entry : commands) {
     names.emplace_back(entry.name);
   }
-  throw usageError("unknown command {}{}", printable(name), didYouMean(nearNames(name, names)));
+  return usageError("unknown command {}{}", printable(name), didYouMean(nearNames(name, names)));
 }
+
+std::string versionText() { return std::string(NLS2_BuildStamp()) + "\n"; }
 
 std::string generalHelp() {
   std::string text = "Usage: nls2 COMMAND [OPTION]... [OPERAND]...\n"
                      "National-language support from the command line.\n\n";
   for (const CommandEntry &entry : commands) {
-    text += fmt::format("  {:<24} {}\n", entry.name, entry.summary);
+    text += helpLine(entry.name, entry.summary);
   }
-  text += fmt::format("  {:<24} {}\n", "help [COMMAND]", "Print this help, or that of a command");
-  text +=
-      fmt::format("  {:<24} {}\n", "-h, --help", "Print this help, or a command's after its name");
-  text += fmt::format("  {:<24} {}\n", "--version", "Print how the library was built");
-  return text + "\n" + generalNotes + "See nls2(1).\n";
-}
-
-int printVersion() {
-  print(std::string(NLS2_BuildStamp()) + "\n");
-  return exitDone;
+  return text + helpLine("help [COMMAND]", "Print this help, or that of a command") +
+         helpLine("-h, --help", "Print this help, or a command's after its name") +
+         helpLine("--version", "Print how the library was built") + "\n" + generalNotes;
 }
 
 // Options before the command, `nls2 help`, or nothing at all.
 int runWithoutCommand(int argc, char **argv) {
+  const std::string first = argc > 1 ? argv[1] : "-";
+  const bool isHelp = first == "help";
   std::string topic;
-  const bool isHelp = argc > 1 && std::string_view(argv[1]) == "help";
   Command general;
   if (isHelp) {
     general.operands.push_back({"COMMAND", "", into(topic)});
-  } else if (argc > 1 && argv[1][0] != '-') {
-    requireCommand(argv[1]);
+  } else if (!first.starts_with("-")) {
+    throw unknownCommand(first);
   }
   const Request request = parse(general, isHelp ? argc - 1 : argc, isHelp ? argv + 1 : argv);
-  if (request == Request::version) {
-    return printVersion();
-  }
+  const CommandEntry *entry = commandNamed(topic);
   if (!isHelp && request == Request::work) {
     throw usageError("COMMAND is missing");
   }
-  if (topic.empty()) {
-    print(generalHelp());
-  } else {
-    const CommandEntry &entry = requireCommand(topic);
-    print(helpOf(entry, entry.make()));
+  if (entry == nullptr && !topic.empty()) {
+    throw unknownCommand(topic);
   }
+  print(request == Request::version ? versionText()
+        : entry != nullptr          ? helpOf(*entry, entry->make())
+                                    : generalHelp());
   return exitDone;
 }
 
 int runCommand(const CommandEntry &entry, int argc, char **argv) {
   const Command command = entry.make();
-  switch (parse(command, argc, argv)) {
-  case Request::help:
-    print(helpOf(entry, command));
-    return exitDone;
-  case Request::version:
-    return printVersion();
-  default:
+  const Request request = parse(command, argc, argv);
+  if (request == Request::work) {
     return command.run();
   }
-}
-
-int runAny(const CommandEntry *entry, int argc, char **argv) {
-  const int code =
-      entry != nullptr ? runCommand(*entry, argc - 1, argv + 1) : runWithoutCommand(argc, argv);
-  requireMemory();
-  return code;
+  print(request == Request::help ? helpOf(entry, command) : versionText());
+  return exitDone;
 }
 
 int report(const CommandEntry *entry, const Error &error) {
@@ -152,7 +133,10 @@ int report(const CommandEntry *entry, const Error &error) {
 int run(const CommandEntry *entry, int argc, char **argv) noexcept {
   try {
     try {
-      return runAny(entry, argc, argv);
+      const int code =
+          entry != nullptr ? runCommand(*entry, argc - 1, argv + 1) : runWithoutCommand(argc, argv);
+      requireMemory();
+      return code;
     } catch (const Error &error) {
       return report(entry, error);
     }

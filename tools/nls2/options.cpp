@@ -41,8 +41,7 @@ public:
       return nullptr;
     }
     if (code == ':') {
-      const Option &option = optionOf(optopt);
-      throw usageError("--{} needs a value: {}", option.name, option.metavar);
+      throw usageError("--{} needs a value: {}", optionOf(optopt).name, optionOf(optopt).metavar);
     }
     if (code == '?') {
       throw unknown(optopt, argv[optind - 1]);
@@ -135,17 +134,17 @@ std::string usageOf(const char *name, const Command &command) {
   return text + "\n";
 }
 
-std::string helpLine(const std::string &what, const char *help) {
-  return fmt::format("  {:<24} {}\n", what, help);
-}
-
-std::string helpLine(const Option &option) {
+std::string optionLine(const Option &option) {
   std::string what = option.letter != '\0' ? fmt::format("-{}, ", option.letter) : "";
   what += fmt::format("--{}", option.name);
   return helpLine(option.metavar != nullptr ? what + " " + option.metavar : what, option.help);
 }
 
 } // namespace
+
+std::string helpLine(const std::string &what, const char *help) {
+  return fmt::format("  {:<24} {}\n", what, help);
+}
 
 Request parse(const Command &command, int argc, char **argv) {
   Getopt getopt(command);
@@ -176,21 +175,10 @@ std::string helpOf(const CommandEntry &entry, const Command &command) {
     text += helpLine(operand.metavar, operand.help);
   }
   for (const Option &option : command.options) {
-    text += helpLine(option);
+    text += optionLine(option);
   }
-  text += helpLine(helpOption) + helpLine(versionOption) + "\n";
+  text += optionLine(helpOption) + optionLine(versionOption) + "\n";
   return text + command.notes + "See nls2(1).\n";
-}
-
-int32_t parseNumber(const char *option, const std::string &text, int32_t least, int32_t most) {
-  const char *end = text.data() + text.size();
-  int32_t number = 0;
-  const auto [stop, error] = std::from_chars(text.data(), end, number);
-  if (error != std::errc() || stop != end || number < least || number > most) {
-    throw usageError("{}: \"{}\" is not a number from {} to {}", option, printable(text), least,
-                     most);
-  }
-  return number;
 }
 
 std::optional<uint32_t> wholeNumber(const std::string &text) {
@@ -200,18 +188,6 @@ std::optional<uint32_t> wholeNumber(const std::string &text) {
   uint32_t number = 0;
   const auto [stop, error] = std::from_chars(start, end, number, hexadecimal ? 16 : 10);
   return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
-}
-
-Take into(std::string &value) {
-  return [&value](const std::string &text) { value = text; };
-}
-
-Take into(std::vector<std::string> &values) {
-  return [&values](const std::string &text) { values.push_back(text); };
-}
-
-Take into(bool &flag) {
-  return [&flag](const std::string &) { flag = true; };
 }
 
 } // namespace nls2::tool

@@ -3,12 +3,14 @@
 
 #include "errors.h"
 
+#include <charconv>
 #include <cstddef>
 #include <cstdint>
 #include <functional>
 #include <limits>
 #include <optional>
 #include <string>
+#include <type_traits>
 #include <vector>
 
 namespace nls2::tool {
@@ -61,13 +63,41 @@ enum class Request { work, help, version };
 Request parse(const Command &command, int argc, char **argv);
 
 std::string helpOf(const CommandEntry &entry, const Command &command);
+std::string helpLine(const std::string &what, const char *help);
+
+// Nothing where the text is not a decimal number of that type, to its end.
+template <typename Number>
+std::optional<Number> decimalNumber(std::string_view text) {
+  Number number = 0;
+  const char *end = text.data() + text.size();
+  const auto [stop, error] = std::from_chars(text.data(), end, number);
+  return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
+}
 
 // Values. `option` is what messages name.
-int32_t parseNumber(const char *option, const std::string &text, int32_t least, int32_t most);
+template <typename Number>
+Number parseNumber(const char *option, const std::string &text, Number least, Number most) {
+  const auto number = decimalNumber<Number>(text);
+  if (!number || *number < least || *number > most) {
+    throw usageError("{}: \"{}\" is not a number from {} to {}", option, printable(text), least,
+                     most);
+  }
+  return *number;
+}
 std::optional<uint32_t> wholeNumber(const std::string &text); // decimal or 0x...; never octal
 
-Take into(std::string &value);
-Take into(std::vector<std::string> &values);
-Take into(bool &flag);
+// Keeps the value as a text or an optional one, appends it to a list, or sets a flag.
+template <class Value>
+Take into(Value &value) {
+  return [&value](const std::string &text) {
+    if constexpr (std::is_same_v<Value, bool>) {
+      value = true;
+    } else if constexpr (std::is_same_v<Value, std::vector<std::string>>) {
+      value.push_back(text);
+    } else {
+      value = text;
+    }
+  };
+}
 
 } // namespace nls2::tool

@@ -2,33 +2,98 @@
 
 #include "codepage/code_page.h"
 
-#include "codepage/page_names.h"
 #include "errors.h"
 #include "memory.h"
 #include "near_names.h"
 #include "options.h"
 
+#include <algorithm>
 #include <limits>
 
 namespace nls2::tool {
 
 namespace {
 
+constexpr int32_t mostNumber = std::numeric_limits<int32_t>::max();
+
 // Enough for some characters of any page, with its signature and its shifts.
 constexpr int32_t fewBytes = 64;
 
-// The number that the text is; nothing where it is a name. Throws usageError.
-std::optional<int32_t> givenNumber(const char *option, const std::string &text) {
-  const bool isDecimal = text.find_first_of("0123456789") == (text.starts_with("-") ? 1 : 0) &&
-                         text.find_first_not_of("0123456789", 1) == std::string::npos;
-  if (isDecimal) {
-    return parseNumber(option, text, std::numeric_limits<int32_t>::min(),
-                       std::numeric_limits<int32_t>::max());
+// Null where ICU does not know the name. An empty one would be its default converter.
+nls2::converter openNamed(const std::string &name, UErrorCode &status) {
+  status = U_ZERO_ERROR;
+  nls2::converter opened(name.empty() ? nullptr : ucnv_open(name.c_str(), &status));
+  requireMemory();
+  return opened;
+}
+
+std::vector<std::string> aliasesOf(const char *converter) {
+  std::vector<std::string> aliases;
+  UErrorCode status = U_ZERO_ERROR;
+  const uint16_t count = ucnv_countAliases(converter, &status);
+  for (uint16_t i = 0; i < count && U_SUCCESS(status); ++i) {
+    aliases.emplace_back(ucnv_getAlias(converter, i, &status));
   }
-  const auto number = wholeNumber(text); // 0x...
-  return number && *number <= std::numeric_limits<int32_t>::max()
-             ? std::optional(static_cast<int32_t>(*number))
-             : std::nullopt;
+  return aliases;
+}
+
+// The converters of ICU's that have this name, where it means several tables; else none. ICU warns
+// of names that several standards use, too.
+std::vector<std::string> meaningsOf(const std::string &name) {
+  UErrorCode status = U_ZERO_ERROR;
+  openNamed(name, status);
+  std::vector<std::string> meanings;
+  for (int32_t i = 0; status == U_AMBIGUOUS_ALIAS_WARNING && i < ucnv_countAvailable(); ++i) {
+    const char *converter = ucnv_getAvailableName(i);
+    const std::vector<std::string> aliases = aliasesOf(converter);
+    if (std::any_of(aliases.begin(), aliases.end(), [&](const std::string &alias) {
+          return ucnv_compareNames(alias.c_str(), name.c_str()) == 0;
+        })) {
+      meanings.emplace_back(converter);
+    }
+  }
+  return meanings.size() > 1 ? meanings : std::vector<std::string>();
+}
+
+// The number that opens what ICU opens for the name: that of the library's Windows name, else the
+// CCSID or one of the numbers with names. Nothing where the name means several tables.
+std::optional<int32_t> numberOf(const std::string &name) {
+  const auto windows = windowsPage(name);
+  const auto converter = converterOf(name);
+  const auto opensIt = [&](int32_t number) { return converterOf(number) == converter; };
+  if (!converter || (windows && opensIt(*windows))) {
+    return windows;
+  }
+  if (!meaningsOf(name).empty()) {
+    return {};
+  }
+  if (const auto ccsid = ccsidOf(name); ccsid && opensIt(*ccsid)) {
+    return ccsid;
+  }
+  const auto found = std::find_if(pagesWithNames.begin(), pagesWithNames.end(), opensIt);
+  return found != pagesWithNames.end() ? std::optional(*found) : std::nullopt;
+}
+
+// ICU's converters with their aliases, and the library's Windows names.
+std::vector<std::string> allPageNames() {
+  std::vector<std::string> names;
+  for (int32_t i = 0; i < ucnv_countAvailable(); ++i) {
+    const std::vector<std::string> aliases = aliasesOf(ucnv_getAvailableName(i));
+    names.insert(names.end(), aliases.begin(), aliases.end());
+  }
+  for (const CcsidMapEntry &entry : windows_names()) {
+    names.emplace_back(entry.name);
+  }
+  return names;
+}
+
+// The number that an option's text is; nothing where it is a name. Throws usageError.
+std::optional<int32_t> givenNumber(const char *option, const std::string &text) {
+  const std::string digits = text.substr(text.starts_with("-") ? 1 : 0);
+  if (!digits.empty() && digits.find_first_not_of("0123456789") == std::string::npos) {
+    return parseNumber(option, text, std::numeric_limits<int32_t>::min(), mostNumber);
+  }
+  return pageNumber(text); // 0x...
 }
 
 Error unknownPage(const char *option, const std::string &text) {
@@ -37,6 +102,57 @@ Error unknownPage(const char *option, const std::string &text) {
 }
 
 } // namespace
+
+std::optional<int32_t> pageNumber(const std::string &text) {
+  const auto number = wholeNumber(text);
+  return number && *number <= mostNumber ? std::optional(static_cast<int32_t>(*number))
+                                         : std::nullopt;
+}
+
+std::optional<std::string> converterOf(int32_t number) {
+  std::error_code error;
+  std::string name = name_of(nls2::code_page(number), error);
+  return error ? std::nullopt : std::optional(std::move(name));
+}
+
+std::optional<std::string> converterOf(const std::string &name) {
+  UErrorCode status = U_ZERO_ERROR;
+  const nls2::converter converter = openNamed(name, status);
+  const char *canonical = converter ? ucnv_getName(converter.get(), &status) : nullptr;
+  return canonical != nullptr ? std::optional<std::string>(canonical) : std::nullopt;
+}
+
+std::optional<int32_t> ccsidOf(const std::string &name) {
+  std::error_code error;
+  const int32_t number = nls2::code_page::from_name(name, error).number();
+  requireMemory();
+  return error ? std::nullopt : std::optional(number);
+}
+
+std::optional<int32_t> windowsPage(const std::string &name) {
+  for (const CcsidMapEntry &entry : windows_names()) {
+    if (entry.name == name) {
+      return static_cast<int32_t>(entry.ccsid);
+    }
+  }
+  return {};
+}
+
+std::vector<std::string> namesWithNumbers() {
+  std::vector<std::string> names = allPageNames();
+  std::erase_if(names, [](const std::string &name) { return !numberOf(name); });
+  std::sort(names.begin(), names.end());
+  names.erase(std::unique(names.begin(), names.end()), names.end());
+  return names;
+}
+
+std::string nearPages(const std::string &asked) {
+  if (const auto number = wholeNumber(asked)) {
+    const auto page = windowsPage(fmt::format("windows-{}", *number));
+    return page ? didYouMean({std::to_string(*page)}) : "";
+  }
+  return didYouMean(nearNames(asked, allPageNames()));
+}
 
 int32_t parsePage(const char *option, const std::string &text) {
   if (const auto number = givenNumber(option, text)) {
@@ -62,7 +178,7 @@ converter openEncoding(const char *option, const std::string &text) {
     return CodePage(*number, option).take();
   }
   UErrorCode error = U_ZERO_ERROR;
-  nls2::converter opened(text.empty() ? nullptr : ucnv_open(text.c_str(), &error));
+  nls2::converter opened = openNamed(text, error);
   if (!opened) {
     throw unknownPage(option, text);
   }
@@ -77,8 +193,6 @@ CodePage::CodePage(int32_t number, const char *option) : number_(number) {
                      number, error.message(), nearPages(std::to_string(number)));
   }
 }
-
-bool CodePage::isSingleByte() const { return ucnv_getMaxCharSize(converter()) == 1; }
 
 std::string CodePage::encode(std::u16string_view text) const {
   std::string bytes(fewBytes, '\0');

@@ -1,8 +1,11 @@
 // Characters on a terminal: whether they print, and how many columns they take.
 #pragma once
 
+#include <fmt/core.h>
 #include <string>
 #include <string_view>
+#include <unicode/uchar.h>
+#include <unicode/unistr.h>
 
 namespace nls2::tool {
 
@@ -11,10 +14,42 @@ struct Display {
   int columns = 0;
 };
 
+// A line separator would break the line, as a control character does.
+inline bool prints(UChar32 character) {
+  return u_isprint(character) != 0 &&
+         (U_MASK(u_charType(character)) & (U_GC_ZL_MASK | U_GC_ZP_MASK)) == 0;
+}
+
+inline int columnsOf(UChar32 character) {
+  if ((U_MASK(u_charType(character)) & (U_GC_MN_MASK | U_GC_ME_MASK)) != 0) {
+    return 0;
+  }
+  const int32_t width = u_getIntPropertyValue(character, UCHAR_EAST_ASIAN_WIDTH);
+  return width == U_EA_WIDE || width == U_EA_FULLWIDTH ? 2 : 1;
+}
+
 // What a piece of text, mostly one character, looks like.
-Display displayOf(std::u16string_view text);
+inline Display displayOf(std::u16string_view text) {
+  Display display;
+  for (std::size_t i = 0; i < text.size();) {
+    UChar32 character = 0;
+    U16_NEXT(text.data(), i, text.size(), character);
+    const UChar32 shown = prints(character) ? character : U'.';
+    icu::UnicodeString(shown).toUTF8String(display.text);
+    display.columns += columnsOf(shown);
+  }
+  return display;
+}
 
 // "U+00A2"; of several characters "U+304B U+309A".
-std::string codePointsOf(std::u16string_view text);
+inline std::string codePointsOf(std::u16string_view text) {
+  std::string points;
+  for (std::size_t i = 0; i < text.size();) {
+    uint32_t character = 0;
+    U16_NEXT(text.data(), i, text.size(), character);
+    points += fmt::format("{}U+{:04X}", points.empty() ? "" : " ", character);
+  }
+  return points;
+}
 
 } // namespace nls2::tool

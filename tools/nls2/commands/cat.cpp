@@ -25,18 +25,6 @@ struct Arguments {
   std::vector<std::string> paths;
 };
 
-// Runs a step of reading. A failure is reported, and leaves the other files to be read.
-template <class Step>
-bool succeeds(Step step) {
-  try {
-    step();
-    return true;
-  } catch (const Error &error) {
-    complain(error.what());
-    return false;
-  }
-}
-
 void reportReplaced(const std::string &name, uint64_t count, const std::string &encoding) {
   const char *verb = count == 1 ? " is" : "s are";
   complain(fmt::format("{}: {} byte sequence{} not valid {}; each was replaced", printable(name),
@@ -44,21 +32,31 @@ void reportReplaced(const std::string &name, uint64_t count, const std::string &
                .c_str());
 }
 
-// The exit code for this file.
+// The exit code for this file. A failure to read is reported, and leaves the others to be read.
 int copy(const Arguments &arguments, const std::string &path, UConverter *converter,
          OutputFile &out) {
   std::optional<TextStream> in;
-  std::string text;
-  bool isRead = succeeds([&] { in.emplace(path, converter); });
-  do {
-    isRead = isRead && succeeds([&] { text = in->read(); });
+  int code = exitDone;
+  bool isOpen = true;
+  while (isOpen) {
+    std::string text;
+    try {
+      if (!in) {
+        in.emplace(path, converter);
+      }
+      text = in->read();
+    } catch (const Error &error) {
+      complain(error.what());
+      code = exitUsage;
+    }
+    isOpen = !text.empty();
     out.write(text);
-  } while (isRead && !text.empty());
+  }
   if (in && in->replaced() != 0) {
     reportReplaced(in->name(), in->replaced(), arguments.encoding);
-    return isRead ? exitFailed : exitUsage;
+    code = std::max<int>(code, exitFailed);
   }
-  return isRead ? exitDone : exitUsage;
+  return code;
 }
 
 int copyAll(const Arguments &arguments) {
@@ -76,17 +74,15 @@ int copyAll(const Arguments &arguments) {
 
 Command catCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {{"FILE", "files to read, one after another; - is standard input",
-                       into(arguments->paths), 1, Operand::anyNumber}};
-  command.options = {{.name = "encoding",
-                      .metavar = "NAME",
-                      .help = "the files' encoding",
-                      .take = into(arguments->encoding),
-                      .isRequired = true}};
-  command.notes = notes;
-  command.run = [arguments] { return copyAll(*arguments); };
-  return command;
+  return {.operands = {{"FILE", "files to read, one after another; - is standard input",
+                        into(arguments->paths), 1, Operand::anyNumber}},
+          .options = {{.name = "encoding",
+                       .metavar = "NAME",
+                       .help = "the files' encoding",
+                       .take = into(arguments->encoding),
+                       .isRequired = true}},
+          .notes = notes,
+          .run = [arguments] { return copyAll(*arguments); }};
 }
 
 } // namespace nls2::tool

@@ -1,12 +1,14 @@
 // nls2 codepages: the library's numbers and names of code pages, what is known of one, its chart,
 // and where two differ.
 
-#include "codepage/byte_chart.h"
-#include "codepage/codepage_render.h"
-#include "codepage/page_names.h"
+#include "codepage/code_page.h"
+#include "codepage/display.h"
+#include "codepage/page_facts.h"
 #include "commands.h"
 #include "io/print.h"
 
+#include <algorithm>
+#include <fmt/format.h>
 #include <memory>
 
 namespace nls2::tool {
@@ -27,13 +29,101 @@ struct Arguments {
   bool asJson = false;
 };
 
-template <class Text, class AsJson>
-std::string rendered(const Arguments &arguments, Text asText, AsJson asJson) {
-  return arguments.asJson ? asJson().text() : asText();
+struct ByteMeaning {
+  enum Kind { character, leadByte, shift, none };
+
+  Kind kind = none;
+  std::u16string text; // of a character; empty for all else
+};
+
+// What each single byte of a code page means.
+struct ByteChart {
+  int32_t page = 0;
+  std::array<ByteMeaning, 256> bytes;
+};
+
+ByteMeaning meaningOf(UConverter *converter, char byte) {
+  std::array<char16_t, 32> units;
+  char16_t *end = units.data();
+  const char *source = &byte;
+  UErrorCode error = U_ZERO_ERROR;
+  ucnv_reset(converter);
+  ucnv_toUnicode(converter, &end, units.data() + units.size(), &source, &byte + 1, nullptr, 0,
+                 &error);
+  if (U_FAILURE(error)) {
+    return {ByteMeaning::none, {}};
+  }
+  if (end != units.data()) {
+    return {ByteMeaning::character, {units.data(), end}};
+  }
+  const bool isPending = ucnv_toUCountPending(converter, &error) > 0;
+  return {isPending ? ByteMeaning::leadByte : ByteMeaning::shift, {}};
 }
 
-ByteChart chartOf(const char *option, const std::string &page) {
-  return tool::chartOf(CodePage(parsePage(option, page), option));
+// Throws Error where the page does not open or no byte of it is a character by itself.
+ByteChart chartOf(const char *option, const std::string &name) {
+  const CodePage page(parsePage(option, name), option);
+  ByteChart chart{.page = page.number(), .bytes = {}};
+  UErrorCode error = U_ZERO_ERROR;
+  ucnv_setToUCallBack(page.converter(), UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr, &error);
+  bool hasCharacters = false;
+  for (std::size_t byte = 0; byte < chart.bytes.size(); ++byte) {
+    chart.bytes[byte] = meaningOf(page.converter(), static_cast<char>(byte));
+    hasCharacters = hasCharacters || chart.bytes[byte].kind == ByteMeaning::character;
+  }
+  if (!hasCharacters) {
+    throw failure("code page {} has no characters of one byte", page.number());
+  }
+  return chart;
+}
+
+// Two columns, so that no mark can be taken for a character.
+std::string cellOf(const ByteMeaning &meaning) {
+  constexpr std::array marks{"", ">>", "<>", "--"};
+  if (meaning.kind != ByteMeaning::character) {
+    return marks[meaning.kind];
+  }
+  if (meaning.text == u" ") {
+    return "SP";
+  }
+  const Display display = displayOf(meaning.text);
+  if (display.text == "." && meaning.text != u".") {
+    return "..";
+  }
+  return display.text +
+         std::string(static_cast<std::size_t>(std::max(0, 2 - display.columns)), ' ');
+}
+
+std::string asText(const ByteChart &chart) {
+  std::string text = "   0  1  2  3  4  5  6  7  8  9  A  B  C  D  E  F\n";
+  for (std::size_t row = 0; row < 16; ++row) {
+    std::string line = fmt::format("{:X} ", row);
+    for (std::size_t column = 0; column < 16; ++column) {
+      line += " " + cellOf(chart.bytes[16 * row + column]);
+    }
+    text += line.substr(0, line.find_last_not_of(' ') + 1) + "\n";
+  }
+  return text + "SP blank, .. does not print, >> lead byte, <> shift, -- no character\n";
+}
+
+Json asJson(const ByteMeaning &meaning) {
+  return meaning.kind == ByteMeaning::character ? Json(codePointsOf(meaning.text)) : Json();
+}
+
+Json asJson(const ByteChart &chart) {
+  constexpr std::array kinds{"character", "lead byte", "shift", "none"};
+  const auto row = [&](const ByteMeaning &meaning) {
+    return Json::object({{"byte", fmt::format("{:02X}", &meaning - chart.bytes.data())},
+                         {"kind", kinds[meaning.kind]},
+                         {"character", asJson(meaning)}});
+  };
+  return Json::object({{"codepage", chart.page}, {"bytes", Json::array(chart.bytes, row)}});
+}
+
+std::string asText(const ByteMeaning &meaning) {
+  return meaning.kind == ByteMeaning::character
+             ? displayOf(meaning.text).text + " " + codePointsOf(meaning.text)
+             : "-";
 }
 
 std::string difference(const Arguments &arguments) {
@@ -42,24 +132,24 @@ std::string difference(const Arguments &arguments) {
   }
   const ByteChart a = chartOf("--diff", arguments.pages[0]);
   const ByteChart b = chartOf("--diff", arguments.pages[1]);
-  return rendered(
-      arguments, [&] { return differenceAsText(a, b); }, [&] { return differenceAsJson(a, b); });
-}
-
-std::string namesAsText() {
   std::string text;
-  for (const std::string &name : namesWithNumbers()) {
-    text += name + "\n";
+  std::vector<Json> rows;
+  for (std::size_t i = 0; i < a.bytes.size(); ++i) {
+    if (a.bytes[i].text != b.bytes[i].text) {
+      const std::string byte = fmt::format("{:02X}", i);
+      text += fmt::format("{}  {}  {}\n", byte, asText(a.bytes[i]), asText(b.bytes[i]));
+      rows.push_back(Json::object(
+          {{"byte", byte}, {"first", asJson(a.bytes[i])}, {"second", asJson(b.bytes[i])}}));
+    }
   }
-  return text;
+  const Json json = Json::object(
+      {{"codepages", Json::array(std::array{a.page, b.page})}, {"differences", Json::array(rows)}});
+  return arguments.asJson ? json.text() : text;
 }
 
-Json namesAsJson() {
-  Json names = Json::array();
-  for (const std::string &name : namesWithNumbers()) {
-    names.append(name);
-  }
-  return names;
+std::string names(const Arguments &arguments) {
+  const std::vector<std::string> names = namesWithNumbers();
+  return arguments.asJson ? Json::array(names).text() : fmt::format("{}\n", fmt::join(names, "\n"));
 }
 
 std::string answer(const Arguments &arguments) {
@@ -74,47 +164,39 @@ std::string answer(const Arguments &arguments) {
     throw usageError("extra operand {}", printable(arguments.pages[most]));
   }
   if (arguments.asNames) {
-    return rendered(arguments, namesAsText, namesAsJson);
-  }
-  if (arguments.asChart) {
-    if (arguments.pages.empty()) {
-      throw usageError("--chart needs a PAGE");
-    }
-    const ByteChart chart = chartOf("--chart", arguments.pages[0]);
-    return rendered(
-        arguments, [&] { return chartAsText(chart); }, [&] { return chartAsJson(chart); });
+    return names(arguments);
   }
   if (arguments.pages.empty()) {
-    return rendered(arguments, allPagesAsText, allPagesAsJson);
+    if (arguments.asChart) {
+      throw usageError("--chart needs a PAGE");
+    }
+    return arguments.asJson ? allPagesAsJson().text() : allPagesAsText();
   }
-  const FoundPages found = lookUpPage(arguments.pages[0]);
-  return rendered(
-      arguments, [&] { return foundPagesAsText(found); }, [&] { return foundPagesAsJson(found); });
+  const auto rendered = [&](const auto &facts) {
+    return arguments.asJson ? asJson(facts).text() : asText(facts);
+  };
+  return arguments.asChart ? rendered(chartOf("--chart", arguments.pages[0]))
+                           : rendered(lookUpPage(arguments.pages[0]));
 }
 
 } // namespace
 
 Command codepagesCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {{"PAGE", "show what the library and ICU make of this number or name",
-                       into(arguments->pages), 0, 2}};
-  command.options = {{.name = "chart",
-                      .help = "show what every byte of PAGE means",
-                      .take = into(arguments->asChart)},
-                     {.name = "diff",
-                      .help = "show the bytes whose characters differ in two PAGEs",
-                      .take = into(arguments->asDifference)},
-                     {.name = "names",
-                      .help = "list the names that options take for a PAGE",
-                      .take = into(arguments->asNames)},
-                     {.name = "json", .help = "write JSON", .take = into(arguments->asJson)}};
-  command.notes = notes;
-  command.run = [arguments] {
-    print(answer(*arguments));
-    return exitDone;
-  };
-  return command;
+  return {.operands = {{"PAGE", "show what the library and ICU make of this number or name",
+                        into(arguments->pages), 0, 2}},
+          .options = {{.name = "chart",
+                       .help = "show what every byte of PAGE means",
+                       .take = into(arguments->asChart)},
+                      {.name = "diff",
+                       .help = "show the bytes whose characters differ in two PAGEs",
+                       .take = into(arguments->asDifference)},
+                      {.name = "names",
+                       .help = "list the names that options take for a PAGE",
+                       .take = into(arguments->asNames)},
+                      {.name = "json", .help = "write JSON", .take = into(arguments->asJson)}},
+          .notes = notes,
+          .run = [arguments] { return print(answer(*arguments)), exitDone; }};
 }
 
 } // namespace nls2::tool

@@ -6,7 +6,7 @@
 #include "json.h"
 #include "nls2.h"
 
-#include <array>
+#include <algorithm>
 #include <memory>
 
 namespace nls2::tool {
@@ -35,13 +35,13 @@ struct Signature {
 
 std::string beginningOf(const std::string &path) {
   InputFile file(path);
-  std::array<char, longestSignature> buffer;
+  std::string bytes(longestSignature, '\0');
   std::size_t length = 0;
-  std::size_t got = 0;
-  while ((got = file.read(buffer.data() + length, buffer.size() - length, -1)) > 0) {
+  while (const std::size_t got = file.read(bytes.data() + length, bytes.size() - length)) {
     length += got;
   }
-  return {buffer.data(), length};
+  bytes.resize(length);
+  return bytes;
 }
 
 Signature detect(const std::string &path) {
@@ -61,46 +61,34 @@ Signature detect(const std::string &path) {
   return found;
 }
 
-std::string asText(const std::vector<Signature> &signatures) {
-  std::string text;
-  for (const Signature &found : signatures) {
-    if (!found.error) {
-      text += printable(found.file) + ": ";
-      text += found.encoding ? fmt::format("{}, {} bytes\n", *found.encoding, found.length)
-                             : "no signature\n";
-    }
+std::string asText(const Signature &found) {
+  if (found.error) {
+    return "";
   }
-  return text;
+  return fmt::format("{}: {}\n", printable(found.file),
+                     found.encoding ? fmt::format("{}, {} bytes", *found.encoding, found.length)
+                                    : "no signature");
 }
 
-Json asJson(const std::vector<Signature> &signatures) {
-  Json rows = Json::array();
-  for (const Signature &found : signatures) {
-    Json row = Json::object();
-    row.set("file", found.file);
-    row.set("encoding", found.encoding);
-    row.set("signatureLength", found.length);
-    if (found.error) {
-      row.set("error", found.error);
-    }
-    rows.append(std::move(row));
-  }
-  return rows;
+Json asJson(const Signature &found) {
+  Json row = Json::object(
+      {{"file", found.file}, {"encoding", found.encoding}, {"signatureLength", found.length}});
+  return found.error ? row.set("error", found.error) : row;
 }
 
 int detectAll(const Arguments &arguments) {
   std::vector<Signature> signatures;
+  std::string text;
   int code = exitDone;
   for (const std::string &path : arguments.paths) {
     const Signature &found = signatures.emplace_back(detect(path));
     if (found.error) {
       complain(found.error->c_str());
-      code = exitUsage;
-    } else if (!found.encoding && code == exitDone) {
-      code = exitFailed;
     }
+    code = std::max<int>(code, found.error ? exitUsage : found.encoding ? exitDone : exitFailed);
+    text += asText(found);
   }
-  print(arguments.asJson ? asJson(signatures).text() : asText(signatures));
+  print(arguments.asJson ? Json::array(signatures, asJson).text() : text);
   return code;
 }
 
@@ -108,13 +96,11 @@ int detectAll(const Arguments &arguments) {
 
 Command detectCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {{"FILE", "files to look at; - is standard input", into(arguments->paths), 1,
-                       Operand::anyNumber}};
-  command.options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}};
-  command.notes = notes;
-  command.run = [arguments] { return detectAll(*arguments); };
-  return command;
+  return {.operands = {{"FILE", "files to look at; - is standard input", into(arguments->paths), 1,
+                        Operand::anyNumber}},
+          .options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}},
+          .notes = notes,
+          .run = [arguments] { return detectAll(*arguments); }};
 }
 
 } // namespace nls2::tool

@@ -1,12 +1,14 @@
 // nls2 dump: a file in hex and, side by side, as text of a code page.
 
-#include "codepage/page_dump.h"
+#include "codepage/code_page.h"
+#include "codepage/display.h"
 #include "commands.h"
 #include "io/input_file.h"
 #include "io/output_file.h"
 
 #include <algorithm>
 #include <memory>
+#include <new>
 
 namespace nls2::tool {
 
@@ -18,38 +20,151 @@ not print, shifts and bytes that are not valid are dots. Records begin a new lin
 their own. The last line is the offset of the end.
 )";
 
-constexpr std::size_t chunkBytes = std::size_t{64} * 1024;
+constexpr std::size_t bytesALine = 16;
 
 struct Arguments {
   std::string path = "-";
   int32_t page = 0;
-  std::size_t recordLength = 0; // 0: the whole file is one record
+  int32_t recordLength = 0; // 0: the whole file is one record
 };
 
-int dump(const Arguments &arguments) {
+void require(UErrorCode error) {
+  if (error == U_MEMORY_ALLOCATION_ERROR) {
+    throw std::bad_alloc();
+  }
+  if (U_FAILURE(error)) {
+    throw failure("cannot decode: {}", statusText(error));
+  }
+}
+
+// Decodes byte by byte, since only that shows which bytes each character takes.
+class PageDump {
+public:
+  explicit PageDump(CodePage page) : page_(std::move(page)) {
+    UErrorCode error = U_ZERO_ERROR;
+    ucnv_setToUCallBack(page_.converter(), onInvalid, this, nullptr, nullptr, &error);
+    require(error);
+  }
+  PageDump(const PageDump &) = delete; // the converter reports into it
+  PageDump &operator=(const PageDump &) = delete;
+
+  // Goes on within a record. A line is ready as soon as its text is known.
+  void add(const char &byte) {
+    bytes_ += byte;
+    decode(&byte, false);
+    while (cells_.size() >= bytesALine) {
+      endLine(bytesALine);
+    }
+  }
+
+  // The next byte begins a record: a line, and the decoding, too.
+  void endRecord() {
+    decode("", true);
+    ucnv_reset(page_.converter());
+    while (!bytes_.empty()) {
+      endLine(std::min(bytesALine, bytes_.size()));
+    }
+  }
+
+  // The line with the offset of the end.
+  void end() { lines_ += offset_ > 0 ? fmt::format("{:08x}\n", offset_) : ""; }
+
+  // The lines that are ready since the last call.
+  std::string takeLines() { return std::exchange(lines_, {}); }
+
+private:
+  static void onInvalid(const void *dump, UConverterToUnicodeArgs *arguments, const char *bytes,
+                        int32_t length, UConverterCallbackReason reason, UErrorCode *error);
+
+  void decode(const char *byte, bool isLast);
+  void addCharacter(std::u16string_view text, std::size_t length);
+  void addDots(std::size_t length);
+  void endLine(std::size_t length);
+
+  CodePage page_;
+  uint64_t offset_ = 0;            // of the first byte that is not in a line yet
+  std::string bytes_;              // from there
+  std::vector<std::string> cells_; // what stands in their columns, as far as it is known
+  std::string lines_;
+};
+
+// Every byte that is not valid is a dot. It may come before a character of the same call.
+void PageDump::onInvalid(const void *dump, UConverterToUnicodeArgs *, const char *, int32_t length,
+                         UConverterCallbackReason reason, UErrorCode *error) {
+  if (reason <= UCNV_IRREGULAR) {
+    static_cast<PageDump *>(const_cast<void *>(dump))->addDots(static_cast<std::size_t>(length));
+    *error = U_ZERO_ERROR;
+  }
+}
+
+// Some converters count bytes once more that they had taken before.
+void PageDump::addDots(std::size_t length) {
+  cells_.insert(cells_.end(), std::min(length, bytes_.size() - cells_.size()), ".");
+}
+
+// One column a byte. What a wide character covers is an empty cell.
+void PageDump::addCharacter(std::u16string_view text, std::size_t length) {
+  const Display display = displayOf(text);
+  for (std::size_t i = 0; i < length; ++i) {
+    const bool isCovered = static_cast<int>(i) < display.columns;
+    cells_.push_back((i == 0 ? display.text : std::string()) + (isCovered ? "" : " "));
+  }
+}
+
+// What the converter has taken without a character, or a character's part, such as a shift, is a
+// dot.
+void PageDump::decode(const char *byte, bool isLast) {
+  std::array<char16_t, 32> units;
+  char16_t *end = units.data();
+  UErrorCode error = U_ZERO_ERROR;
+  ucnv_toUnicode(page_.converter(), &end, units.data() + units.size(), &byte,
+                 byte + (isLast ? 0 : 1), nullptr, static_cast<UBool>(isLast), &error);
+  require(error);
+  const auto pending = static_cast<std::size_t>(ucnv_toUCountPending(page_.converter(), &error));
+  const std::size_t unknown = bytes_.size() - cells_.size();
+  const std::size_t length = unknown - std::min(pending, unknown);
+  if (end == units.data()) {
+    addDots(length);
+  } else {
+    addCharacter({units.data(), end}, length);
+  }
+}
+
+void PageDump::endLine(std::size_t length) {
+  std::string hex;
+  std::string text;
+  bool isCovered = true; // by a character of the line before, whose columns are not here
+  for (std::size_t i = 0; i < length; ++i) {
+    hex += i == bytesALine / 2 ? "  " : " ";
+    hex += fmt::format("{:02x}", static_cast<unsigned char>(bytes_[i]));
+    isCovered = isCovered && cells_[i].empty();
+    text += isCovered ? " " : cells_[i];
+  }
+  lines_ += fmt::format("{:08x} {:<49}  |{}|\n", offset_, hex, text);
+  offset_ += length;
+  bytes_.erase(0, length);
+  cells_.erase(cells_.begin(), cells_.begin() + static_cast<std::ptrdiff_t>(length));
+}
+
+int dumpFile(const Arguments &arguments) {
   PageDump dump(CodePage(arguments.page, "--from"));
   InputFile in(arguments.path);
   OutputFile out("-");
-  std::string bytes(chunkBytes, '\0');
-  std::size_t left = arguments.recordLength; // of the record
-  for (std::size_t got = 0; (got = in.read(bytes.data(), bytes.size(), -1)) > 0;) {
-    std::string text;
-    for (std::string_view rest(bytes.data(), got); !rest.empty();) {
-      const std::size_t length = left != 0 ? std::min(left, rest.size()) : rest.size();
-      dump.add(rest.substr(0, length), text);
-      rest.remove_prefix(length);
-      left -= left != 0 ? length : 0;
-      if (left == 0 && arguments.recordLength != 0) {
-        dump.endRecord(text);
-        left = arguments.recordLength;
+  std::string bytes(std::size_t{64} * 1024, '\0');
+  int32_t done = 0; // of the record
+  while (const std::size_t got = in.read(bytes.data(), bytes.size())) {
+    for (std::size_t i = 0; i < got; ++i) {
+      dump.add(bytes[i]);
+      if (arguments.recordLength != 0 && ++done == arguments.recordLength) {
+        dump.endRecord();
+        done = 0;
       }
     }
-    out.write(text);
+    out.write(dump.takeLines());
   }
-  std::string text;
-  dump.endRecord(text);
-  dump.end(text);
-  out.write(text);
+  dump.endRecord();
+  dump.end();
+  out.write(dump.takeLines());
   out.commit();
   return exitDone;
 }
@@ -58,26 +173,23 @@ int dump(const Arguments &arguments) {
 
 Command dumpCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {
-      {"FILE", "file to read; standard input if - or not given", into(arguments->path)}};
-  command.options = {
-      {.name = "from",
-       .metavar = "PAGE",
-       .help = "code page of the file",
-       .take =
-           [arguments](const std::string &text) { arguments->page = parsePage("--from", text); },
-       .isRequired = true},
-      {.name = "record-length",
-       .metavar = "N",
-       .help = "bytes of every record",
-       .take = [arguments](const std::string &text) {
-         arguments->recordLength =
-             static_cast<std::size_t>(parseNumber("--record-length", text, 1, 1 << 30));
-       }}};
-  command.notes = notes;
-  command.run = [arguments] { return dump(*arguments); };
-  return command;
+  return {
+      .operands = {{"FILE", "file to read; standard input if - or not given",
+                    into(arguments->path)}},
+      .options = {{.name = "from",
+                   .metavar = "PAGE",
+                   .help = "code page of the file",
+                   .take = [=](const auto &text) { arguments->page = parsePage("--from", text); },
+                   .isRequired = true},
+                  {.name = "record-length",
+                   .metavar = "N",
+                   .help = "bytes of every record",
+                   .take =
+                       [=](const auto &text) {
+                         arguments->recordLength = parseNumber("--record-length", text, 1, 1 << 30);
+                       }}},
+      .notes = notes,
+      .run = [arguments] { return dumpFile(*arguments); }};
 }
 
 } // namespace nls2::tool

@@ -1,15 +1,12 @@
 // nls2 find: the lines in which a text occurs.
 
 #include "commands.h"
-#include "errors.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
-#include "text/line_reader.h"
-#include "text/text_search.h"
+#include "memory.h"
+#include "text/lines.h"
 
 #include <memory>
-#include <string>
-#include <vector>
 
 namespace nls2::tool {
 
@@ -30,68 +27,170 @@ struct Arguments {
   std::vector<std::string> inputs;
 };
 
+// Most lines are ASCII, whose folding is a loop over many units at once. False for other text, of
+// which the output has nothing of use.
+bool foldAscii(std::u16string_view text, char16_t *folded) {
+  char16_t all = 0;
+  for (const char16_t unit : text) {
+    all |= unit;
+    *folded++ = static_cast<char16_t>(unit + (unit >= u'A' && unit <= u'Z' ? 0x20 : 0));
+  }
+  return all < 0x80;
+}
+
+// Whether the page has all of these characters, and not only substitutes for them.
+bool hasAll(const Decoder &decoder, const icu::UnicodeString &text) {
+  const std::string bytes = decoder.encode(text);
+  UErrorCode error = U_ZERO_ERROR;
+  const icu::UnicodeString back(bytes.data(), static_cast<int32_t>(bytes.size()),
+                                decoder.page().converter(), error);
+  return U_SUCCESS(error) && back == text;
+}
+
+// The page may have a pair of characters that it does not have alone, so the whole is tried first.
+void requireCharacters(const Decoder &decoder, const icu::UnicodeString &pattern) {
+  if (hasAll(decoder, pattern)) {
+    return;
+  }
+  const int32_t page = decoder.page().number();
+  for (int32_t at = 0; at < pattern.length(); at = pattern.moveIndex32(at, 1)) {
+    const UChar32 character = pattern.char32At(at);
+    if (!hasAll(decoder, character)) {
+      throw usageError("PATTERN: the character U+{:04X} is not in code page {}",
+                       static_cast<uint32_t>(character), page);
+    }
+  }
+  throw usageError("PATTERN: code page {} does not have all of its characters", page);
+}
+
+std::u16string decodedPattern(const std::string &pattern) {
+  try {
+    return std::u16string(Decoder(utf8Page).decode(pattern));
+  } catch (const TextFault &fault) {
+    throw usageError("PATTERN{}", fault.what());
+  }
+}
+
+// The search for a text in lines of a code page.
+class TextSearch {
+public:
+  // Throws usageError where the code page lacks a character of the pattern.
+  explicit TextSearch(const Arguments &arguments)
+      : decoder_(arguments.locale.codepage), ignoreCase_(arguments.ignoreCase),
+        pattern_(decodedPattern(arguments.pattern)) {
+    requireCharacters(decoder_, {pattern_.data(), static_cast<int32_t>(pattern_.size())});
+    if (ignoreCase_) {
+      folding_ =
+          hasDotlessI(arguments.locale) ? U_FOLD_CASE_EXCLUDE_SPECIAL_I : U_FOLD_CASE_DEFAULT;
+      pattern_ = folded(pattern_);
+    } else if (decoder_.isUtf8()) {
+      utf8Pattern_ = arguments.pattern;
+    }
+  }
+
+  // Whether the pattern occurs in the line. Throws TextFault.
+  bool isIn(std::string_view line) {
+    if (!utf8Pattern_.empty() && isAscii(line) && line.find('\0') == line.npos) {
+      return line.find(utf8Pattern_) != line.npos;
+    }
+    const std::u16string_view decoded = withoutNulls(decoder_.decode(line));
+    const std::u16string_view text = ignoreCase_ ? folded(decoded) : decoded;
+    return u_strFindFirst(text.data(), static_cast<int32_t>(text.size()), pattern_.data(),
+                          static_cast<int32_t>(pattern_.size())) != nullptr;
+  }
+
+  // UTF-8 as the lines' code page has it.
+  std::string encode(const std::string &utf8) const {
+    const bool isSame = utf8.empty() || decoder_.isUtf8();
+    return isSame ? utf8 : decoder_.encode(icu::UnicodeString::fromUTF8(utf8));
+  }
+
+private:
+  std::u16string_view folded(std::u16string_view text) {
+    folded_.resize(std::max(folded_.size(), text.size() + 1));
+    if (folding_ == U_FOLD_CASE_DEFAULT && foldAscii(text, folded_.data())) {
+      return {folded_.data(), text.size()};
+    }
+    UErrorCode error = U_ZERO_ERROR;
+    const auto length = static_cast<std::size_t>(
+        u_strFoldCase(folded_.data(), static_cast<int32_t>(folded_.size()), text.data(),
+                      static_cast<int32_t>(text.size()), folding_, &error));
+    if (error == U_BUFFER_OVERFLOW_ERROR) {
+      folded_.resize(length + 1);
+      return folded(text);
+    }
+    if (U_FAILURE(error)) {
+      throw std::bad_alloc();
+    }
+    return {folded_.data(), length};
+  }
+
+  Decoder decoder_;
+  const bool ignoreCase_;
+  uint32_t folding_ = 0; // U_FOLD_CASE_*
+  std::u16string pattern_;
+  std::string utf8Pattern_; // where lines of ASCII may be searched as bytes; else empty
+  std::u16string folded_;   // the last line
+};
+
 class FindRun {
 public:
   explicit FindRun(const Arguments &arguments)
-      : arguments_(arguments), search_(arguments.locale, arguments.pattern, arguments.ignoreCase),
-        format_{lineTerminator(arguments.locale.codepage)} {}
+      : arguments_(arguments), search_(arguments),
+        terminator_(lineTerminator(arguments.locale.codepage)) {}
 
-  // A file that fails does not keep the others from being searched. Output that fails ends the run.
   int run() {
-    for (const std::string &path : arguments_.inputs) {
-      try {
-        searchFile(path);
-      } catch (const Error &error) {
-        if (isPrinting_) {
-          throw;
-        }
-        flush();
-        complain(error.what());
-        failed_ = true;
-      }
+    for (const std::string &path : inputsOf(arguments_.inputs)) {
+      searchFile(path);
     }
-    flush();
+    output_.flush();
     return failed_ ? exitUsage : found_ ? exitDone : exitFailed;
   }
 
 private:
+  // A file that fails does not keep the others from being searched. Output that fails ends the run.
   void searchFile(const std::string &path) {
-    LineReader reader(path, format_);
-    const std::string name =
-        arguments_.inputs.size() == 1 ? "" : (path == "-" ? "standard input" : path) + ":";
-    for (std::string_view line; reader.next(line);) {
-      bool found = false;
-      if (const auto fault = search_.search(line, found)) {
-        reader.fail(*fault);
+    const std::string name = (path == "-" ? "standard input" : path) + ":";
+    const std::string prefix = arguments_.inputs.size() > 1 ? name : "";
+    std::optional<LineReader> reader;
+    for (;;) {
+      std::optional<std::string_view> line;
+      try {
+        line = nextMatch(reader ? *reader : reader.emplace(path, terminator_));
+      } catch (const Error &error) {
+        requireMemory(); // without it the text may be valid
+        output_.flush();
+        complain(error.what());
+        failed_ = true;
       }
-      if (found) {
-        print(arguments_.lineNumbers ? fmt::format("{}{}:", name, reader.number()) : name, line);
+      if (!line) {
+        return;
       }
+      found_ = true;
+      output_.put(search_.encode(
+          arguments_.lineNumbers ? fmt::format("{}{}:", prefix, reader->number()) : prefix));
+      output_.put(*line);
+      output_.put(terminator_);
     }
   }
 
-  void print(const std::string &prefix, std::string_view line) {
-    isPrinting_ = true;
-    if (!prefix.empty()) {
-      output_.put(search_.decoder().encode(prefix));
+  std::optional<std::string_view> nextMatch(LineReader &reader) {
+    while (const auto line = reader.next()) {
+      try {
+        if (search_.isIn(*line)) {
+          return line;
+        }
+      } catch (const TextFault &fault) {
+        reader.fail(fault.what());
+      }
     }
-    output_.put(line);
-    output_.put(format_.terminator);
-    isPrinting_ = false;
-    found_ = true;
-  }
-
-  void flush() {
-    isPrinting_ = true;
-    output_.flush();
-    isPrinting_ = false;
+    return {};
   }
 
   const Arguments &arguments_;
   TextSearch search_;
-  const LineFormat format_;
+  const std::string terminator_;
   OutputFile output_{"-"};
-  bool isPrinting_ = false;
   bool found_ = false;
   bool failed_ = false;
 };
@@ -100,26 +199,19 @@ private:
 
 Command findCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {{"PATTERN", "the text to find", into(arguments->pattern), 1},
-                      {"FILE", "files to read; standard input if - or not given",
-                       into(arguments->inputs), 0, Operand::anyNumber}};
-  command.options = localeOptions(arguments->locale);
-  command.options.push_back({.name = "ignore-case",
-                             .help = "fold the case of both, by the language's rules",
-                             .take = into(arguments->ignoreCase)});
-  command.options.push_back({.name = "line-number",
-                             .letter = 'n',
-                             .help = "print the lines' numbers",
-                             .take = into(arguments->lineNumbers)});
-  command.notes = notes;
-  command.run = [arguments] {
-    if (arguments->inputs.empty()) {
-      arguments->inputs.emplace_back("-");
-    }
-    return FindRun(*arguments).run();
-  };
-  return command;
+  return {.operands = {{"PATTERN", "the text to find", into(arguments->pattern), 1},
+                       {"FILE", "files to read; standard input if - or not given",
+                        into(arguments->inputs), 0, Operand::anyNumber}},
+          .options = localeOptions(arguments->locale,
+                                   {{.name = "ignore-case",
+                                     .help = "fold the case of both, by the language's rules",
+                                     .take = into(arguments->ignoreCase)},
+                                    {.name = "line-number",
+                                     .letter = 'n',
+                                     .help = "print the lines' numbers",
+                                     .take = into(arguments->lineNumbers)}}),
+          .notes = notes,
+          .run = [arguments] { return FindRun(*arguments).run(); }};
 }
 
 } // namespace nls2::tool

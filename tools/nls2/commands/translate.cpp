@@ -1,10 +1,11 @@
 // nls2 translate: its options and its help.
 
+#include "convert/translate.h"
 #include "codepage/code_page.h"
 #include "commands.h"
-#include "convert/translate_run.h"
 
-#include <charconv>
+#include <algorithm>
+#include <fmt/format.h>
 #include <memory>
 #include <string>
 
@@ -19,227 +20,159 @@ inside the text is refused. Nothing is lost in silence: what cannot be translate
 is treated as --on-error says. An output file appears only when it is complete.
 )";
 
-constexpr int32_t longest = 1 << 30;
-
 struct Arguments {
   TranslateOptions options;
-  bool hasTo = false;
+  std::optional<int32_t> to;
   bool lines = false;
   std::optional<std::string> fields;
 };
 
-std::size_t parseLength(const char *option, const std::string &text) {
-  return static_cast<std::size_t>(parseNumber(option, text, 1, longest));
-}
+struct Rule {
+  bool isBroken;
+  const char *message;
+};
 
-uint64_t parseCount(const char *option, const std::string &text) {
-  constexpr uint64_t most = std::numeric_limits<int64_t>::max();
-  uint64_t number = 0;
-  const char *end = text.data() + text.size();
-  const auto [stop, error] = std::from_chars(text.data(), end, number);
-  if (error != std::errc() || stop != end || number > most) {
-    throw usageError("{}: \"{}\" is not a number from 0 to {}", option, printable(text), most);
-  }
-  return number;
-}
-
-void choosePadding(nls2::padding &padding, nls2::padding chosen) {
-  if (padding != nls2::padding::as_is && padding != chosen) {
-    throw usageError("--fill, --keep-blanks and --strip exclude each other");
-  }
-  padding = chosen;
-}
-
-Newline parseNewline(const std::string &text) {
-  if (text == "none") {
-    return Newline::none;
-  }
-  if (text == "lf") {
-    return Newline::lf;
-  }
-  if (text == "crlf") {
-    return Newline::crlf;
-  }
-  if (text == "nel") {
-    return Newline::nel;
-  }
-  throw usageError("--newline: \"{}\" is not none, lf, crlf or nel", printable(text));
-}
-
-OnError parseOnError(const std::string &text) {
-  if (text == "stop") {
-    return OnError::stop;
-  }
-  if (text == "replace") {
-    return OnError::replace;
-  }
-  if (text == "reject") {
-    return OnError::reject;
-  }
-  throw usageError("--on-error: \"{}\" is not stop, replace or reject", printable(text));
-}
-
-void checkInput(const Arguments &arguments) {
-  const bool hasLength = arguments.options.recordLength != 0;
-  if (hasLength && arguments.lines) {
-    throw usageError("--record-length and --lines exclude each other");
-  }
-  if (arguments.fields && !hasLength) {
-    throw usageError("--fields needs --record-length");
-  }
-  if (!hasLength && !arguments.lines) {
-    throw usageError("--record-length N or --lines is missing");
-  }
-}
-
-void checkCsv(const Arguments &arguments) {
+// The first rule that is broken is the one to report.
+void check(const Arguments &arguments) {
   const TranslateOptions &options = arguments.options;
-  if (options.to != utf8Page) {
-    throw usageError("--csv writes UTF-8: --to must be 1208, or left out");
-  }
-  if (options.newline.value_or(Newline::lf) != Newline::lf) {
-    throw usageError("--csv ends its lines in LF: --newline must be lf, or left out");
-  }
-  if (options.padding == nls2::padding::fill || options.padding == nls2::padding::keep_blanks ||
-      options.outLength != 0) {
-    throw usageError("--csv strips its fields: --fill, --keep-blanks and --out-length make no "
-                     "sense");
-  }
-}
-
-void checkFiles(const TranslateOptions &options) {
-  if (options.onError == OnError::reject && options.rejects.empty()) {
-    throw usageError("--on-error reject needs --rejects FILE");
-  }
-  if (options.onError != OnError::reject && !options.rejects.empty()) {
-    throw usageError("--rejects needs --on-error reject");
-  }
+  const bool hasLength = options.recordLength != 0;
+  const bool fills = options.padding == nls2::padding::fill;
+  const bool keeps = options.padding == nls2::padding::keep_blanks;
+  const bool rejects = options.onError == OnError::reject;
   const std::string output = options.dryRun ? "" : options.output;
-  if (!options.rejects.empty() &&
-      (options.rejects == output || options.rejects == options.report)) {
-    throw usageError("--rejects names a file that is written already");
-  }
-  if (!options.report.empty() && options.report == output) {
-    throw usageError("--report names a file that is written already");
+  for (const auto &[isBroken, message] : {
+           Rule{!arguments.to && !options.csv, "--to PAGE is missing"},
+           Rule{hasLength && arguments.lines, "--record-length and --lines exclude each other"},
+           Rule{arguments.fields && !hasLength, "--fields needs --record-length"},
+           Rule{!hasLength && !arguments.lines, "--record-length N or --lines is missing"},
+           Rule{options.csv && arguments.to.value_or(utf8Page) != utf8Page,
+                "--csv writes UTF-8: --to must be 1208, or left out"},
+           Rule{options.csv && options.newline.value_or(Newline::lf) != Newline::lf,
+                "--csv ends its lines in LF: --newline must be lf, or left out"},
+           Rule{options.csv && (fills || keeps || options.outLength != 0),
+                "--csv strips its fields: --fill, --keep-blanks and --out-length make no sense"},
+           Rule{fills && options.outLength == 0 && !arguments.fields, "--fill needs --out-length"},
+           Rule{rejects && options.rejects.empty(), "--on-error reject needs --rejects FILE"},
+           Rule{!rejects && !options.rejects.empty(), "--rejects needs --on-error reject"},
+           Rule{rejects && (options.rejects == output || options.rejects == options.report),
+                "--rejects names a file that is written already"},
+           Rule{!options.report.empty() && options.report == output,
+                "--report names a file that is written already"},
+       }) {
+    if (isBroken) {
+      throw usageError("{}", message);
+    }
   }
 }
 
 int run(Arguments &arguments) {
+  check(arguments);
   TranslateOptions &options = arguments.options;
-  if (!arguments.hasTo) {
-    if (!options.csv) {
-      throw usageError("--to PAGE is missing");
-    }
-    options.to = utf8Page;
-  }
-  checkInput(arguments);
-  if (options.csv) {
-    checkCsv(arguments);
-  }
-  if (options.padding == nls2::padding::fill && options.outLength == 0 && !arguments.fields) {
-    throw usageError("--fill needs --out-length");
-  }
-  checkFiles(options);
+  options.to = arguments.to.value_or(utf8Page);
   if (arguments.fields) {
-    options.fields =
-        parseFields(*arguments.fields, options.recordLength, options.from, options.csv);
+    options.fields = parseFields(*arguments.fields, options);
   }
   return translateFile(options);
 }
 
-std::vector<Option> pageOptions(Arguments &arguments) {
-  TranslateOptions &options = arguments.options;
-  return {{.name = "from",
-           .metavar = "PAGE",
-           .help = "code page of the input",
-           .take = [&](const std::string &text) { options.from = parsePage("--from", text); },
-           .isRequired = true},
-          {.name = "to",
-           .metavar = "PAGE",
-           .help = "code page of the output; required but for --csv",
-           .take = [&](const std::string &text) {
-             options.to = parsePage("--to", text);
-             arguments.hasTo = true;
-           }}};
+// Tables of options: flags, and those that have a value.
+Option flag(const char *name, const char *help, Take take) {
+  return {.name = name, .help = help, .take = std::move(take)};
+}
+
+Option value(const char *name, const char *metavar, const char *help, Take take) {
+  return {.name = name, .metavar = metavar, .help = help, .take = std::move(take)};
+}
+
+template <typename Value>
+Take set(Value &value, bool to) {
+  return [&value, to](const std::string &) { value = to; };
+}
+
+Take set(nls2::padding &padding, nls2::padding chosen) {
+  return [&padding, chosen](const std::string &) {
+    if (padding != nls2::padding::as_is && padding != chosen) {
+      throw usageError("--fill, --keep-blanks and --strip exclude each other");
+    }
+    padding = chosen;
+  };
+}
+
+template <typename Page>
+Take page(const char *option, Page &page) {
+  return [=, &page](const std::string &text) { page = parsePage(option, text); };
+}
+
+Take number(const char *option, uint64_t &number, uint64_t least, uint64_t most) {
+  return [=, &number](const std::string &text) {
+    number = parseNumber<uint64_t>(option, text, least, most);
+  };
+}
+
+// One of the words of `kinds`, whose numbers are those of the enumerators.
+template <typename Kind, typename Target>
+Take word(const char *option, Target &target, std::vector<const char *> kinds) {
+  return [=, &target](const std::string &text) {
+    const auto found = std::find(kinds.begin(), kinds.end(), text);
+    if (found == kinds.end()) {
+      throw usageError("{}: \"{}\" is not {} or {}", option, printable(text),
+                       fmt::join(kinds.begin(), kinds.end() - 1, ", "), kinds.back());
+    }
+    target = static_cast<Kind>(found - kinds.begin());
+  };
 }
 
 std::vector<Option> inputOptions(Arguments &arguments) {
+  constexpr uint64_t longest = 1 << 30;
+  constexpr uint64_t most = std::numeric_limits<int64_t>::max();
   TranslateOptions &options = arguments.options;
-  return {{.name = "record-length",
-           .metavar = "N",
-           .help = "bytes of every input record",
-           .take =
-               [&](const std::string &text) {
-                 options.recordLength = parseLength("--record-length", text);
-               }},
-          {.name = "lines",
-           .help = "read lines that end in LF, CR LF or NEL in place of records",
-           .take = into(arguments.lines)},
-          {.name = "skip",
-           .metavar = "N",
-           .help = "leave out the first N records",
-           .take = [&](const std::string &text) { options.skip = parseCount("--skip", text); }},
-          {.name = "count",
-           .metavar = "M",
-           .help = "translate M records at the most",
-           .take = [&](const std::string &text) { options.count = parseCount("--count", text); }},
-          {.name = "fields",
-           .metavar = "LIST",
-           .help = "START-END[=KIND][:WIDTH],...: the bytes of a record to put out",
-           .take = [&](const std::string &text) { arguments.fields = text; }}};
-}
-
-std::vector<Option> shapeOptions(TranslateOptions &options) {
-  const auto padding = [&](nls2::padding chosen) {
-    return [&options, chosen](const std::string &) { choosePadding(options.padding, chosen); };
-  };
   return {
-      {.name = "out-length",
-       .metavar = "M",
-       .help = "the most bytes of an output record",
-       .take =
-           [&](const std::string &text) { options.outLength = parseLength("--out-length", text); }},
-      {.name = "fill", .help = "pad with blanks to M bytes", .take = padding(nls2::padding::fill)},
-      {.name = "keep-blanks",
-       .help = "keep the trailing blanks, or as many as fit in M",
-       .take = padding(nls2::padding::keep_blanks)},
-      {.name = "strip", .help = "drop trailing blanks", .take = padding(nls2::padding::strip)},
-      {.name = "newline",
-       .metavar = "KIND",
-       .help = "what ends every output record: none, lf, crlf or nel",
-       .take = [&](const std::string &text) { options.newline = parseNewline(text); }},
-      {.name = "csv", .help = "write comma-separated values in UTF-8", .take = into(options.csv)}};
+      {.name = "from",
+       .metavar = "PAGE",
+       .help = "code page of the input",
+       .take = page("--from", options.from),
+       .isRequired = true},
+      value("to", "PAGE", "code page of the output; required but for --csv",
+            page("--to", arguments.to)),
+      value("record-length", "N", "bytes of every input record",
+            number("--record-length", options.recordLength, 1, longest)),
+      flag("lines", "read lines that end in LF, CR LF or NEL in place of records",
+           into(arguments.lines)),
+      value("skip", "N", "leave out the first N records", number("--skip", options.skip, 0, most)),
+      value("count", "M", "translate M records at the most",
+            number("--count", options.count, 0, most)),
+      value("fields", "LIST", "START-END[=KIND][:WIDTH],...: the bytes of a record to put out",
+            [&](const std::string &text) { arguments.fields = text; }),
+      value("out-length", "M", "the most bytes of an output record",
+            number("--out-length", options.outLength, 1, longest)),
+  };
 }
 
-std::vector<Option> safetyOptions(TranslateOptions &options) {
-  return {{.name = "on-error",
-           .metavar = "WHAT",
-           .help = "stop (the default), replace characters or reject records",
-           .take = [&](const std::string &text) { options.onError = parseOnError(text); }},
-          {.name = "rejects",
-           .metavar = "FILE",
-           .help = "where rejected records go",
-           .take = into(options.rejects)},
-          {.name = "verify",
-           .help = "translate every record back and compare",
-           .take = into(options.verify)},
-          {.name = "dry-run", .help = "write no output", .take = into(options.dryRun)},
-          {.name = "report",
-           .metavar = "FILE",
-           .help = "write what was done as JSON",
-           .take = into(options.report)},
-          {.name = "progress",
-           .help = "show how far the run is; the default on a terminal",
-           .take = [&](const std::string &) { options.progress = true; }},
-          {.name = "no-progress",
-           .help = "do not show it",
-           .take = [&](const std::string &) { options.progress = false; }},
-          {.name = "output",
-           .letter = 'o',
-           .metavar = "OUT",
-           .help = "file to write; standard output if - or not given",
-           .take = into(options.output)},
-          {.name = "sync", .help = "wait until the disk has it", .take = into(options.sync)}};
+std::vector<Option> outputOptions(TranslateOptions &options) {
+  return {
+      flag("fill", "pad with blanks to M bytes", set(options.padding, nls2::padding::fill)),
+      flag("keep-blanks", "keep the trailing blanks, or as many as fit in M",
+           set(options.padding, nls2::padding::keep_blanks)),
+      flag("strip", "drop trailing blanks", set(options.padding, nls2::padding::strip)),
+      value("newline", "KIND", "what ends every output record: none, lf, crlf or nel",
+            word<Newline>("--newline", options.newline, {"none", "lf", "crlf", "nel"})),
+      flag("csv", "write comma-separated values in UTF-8", into(options.csv)),
+      value("on-error", "WHAT", "stop (the default), replace characters or reject records",
+            word<OnError>("--on-error", options.onError, {"stop", "replace", "reject"})),
+      value("rejects", "FILE", "where rejected records go", into(options.rejects)),
+      flag("verify", "translate every record back and compare", into(options.verify)),
+      flag("dry-run", "write no output", into(options.dryRun)),
+      value("report", "FILE", "write what was done as JSON", into(options.report)),
+      flag("progress", "show how far the run is; the default on a terminal",
+           set(options.progress, true)),
+      flag("no-progress", "do not show it", set(options.progress, false)),
+      {.name = "output",
+       .letter = 'o',
+       .metavar = "OUT",
+       .help = "file to write; standard output if - or not given",
+       .take = into(options.output)},
+      flag("sync", "wait until the disk has it", into(options.sync)),
+  };
 }
 
 } // namespace
@@ -250,9 +183,9 @@ Command translateCommand() {
   command.operands = {{.metavar = "INPUT",
                        .help = "file to read; standard input if - or not given",
                        .take = into(arguments->options.input)}};
-  for (auto &group : {pageOptions(*arguments), inputOptions(*arguments),
-                      shapeOptions(arguments->options), safetyOptions(arguments->options)}) {
-    command.options.insert(command.options.end(), group.begin(), group.end());
+  command.options = inputOptions(*arguments);
+  for (Option &option : outputOptions(arguments->options)) {
+    command.options.push_back(std::move(option));
   }
   command.notes = notes;
   command.run = [arguments] { return run(*arguments); };

@@ -2,7 +2,6 @@
 #pragma once
 
 #include <algorithm>
-#include <cstddef>
 #include <cstdlib>
 #include <cstring>
 #include <memory>
@@ -17,7 +16,14 @@ public:
   // Room behind the bytes, `length` of it at least. Throws std::bad_alloc.
   std::span<char> room(std::size_t length) {
     if (capacity_ - size_ < length) {
-      grow(std::max(size_ + length, capacity_ + capacity_ / 2));
+      const std::size_t capacity = std::max(size_ + length, capacity_ + capacity_ / 2);
+      auto *grown = static_cast<char *>(std::realloc(data_.get(), capacity));
+      if (grown == nullptr) {
+        throw std::bad_alloc();
+      }
+      static_cast<void>(data_.release());
+      data_.reset(grown);
+      capacity_ = capacity;
     }
     return {data_.get() + size_, capacity_ - size_};
   }
@@ -39,8 +45,6 @@ public:
     }
   }
 
-  const char *data() const { return data_.get(); }
-  char *data() { return data_.get(); }
   std::size_t size() const { return size_; }
   std::string_view bytes() const { return {data_.get(), size_}; }
 
@@ -48,16 +52,6 @@ private:
   struct Free {
     void operator()(char *block) const noexcept { std::free(block); }
   };
-
-  void grow(std::size_t capacity) {
-    auto *grown = static_cast<char *>(std::realloc(data_.get(), capacity));
-    if (grown == nullptr) {
-      throw std::bad_alloc();
-    }
-    static_cast<void>(data_.release());
-    data_.reset(grown);
-    capacity_ = capacity;
-  }
 
   std::unique_ptr<char, Free> data_;
   std::size_t size_ = 0;

@@ -1,87 +1,78 @@
-// What keeps a record from being translated, where it is, and how it is said.
+// What keeps a record from being translated, where it is, and how that and a whole run are reported.
 
 #include "convert/problem.h"
 
-#include <fmt/core.h>
+#include "json.h"
+
+#include <array>
+#include <fmt/format.h>
 
 namespace nls2::tool {
 
 namespace {
 
-// "byte FF", "bytes D0 96"
-std::string bytesText(const Problem &problem) {
-  return fmt::format("{} {}", problem.byteCount == 1 ? "byte" : "bytes", problem.hex());
+// "D0 96"
+std::string hexOf(const Problem &problem) {
+  const auto bytes = problem.found.source_bytes();
+  const std::vector<unsigned char> numbers(bytes.begin(), bytes.end());
+  return fmt::format("{:02X}", fmt::join(numbers, " "));
 }
 
-std::string tooLong(const Problem &problem) {
-  const std::string takes = fmt::format("the text takes {} bytes, but ", problem.needed);
-  switch (problem.limitedBy) {
-  case Limit::fieldWidth:
-    return fmt::format("{}the width is {}", takes, problem.limit);
-  case Limit::ownLength:
-    return fmt::format("{}the field has {}", takes, problem.limit);
-  default:
-    return fmt::format("{}--out-length is {}", takes, problem.limit);
-  }
+// "byte FF", "bytes D0 96"
+std::string bytesText(const Problem &problem) {
+  return (problem.found.byte_count == 1 ? "byte " : "bytes ") + hexOf(problem);
+}
+
+std::string codePointText(const Problem &problem) {
+  return fmt::format("U+{:04X}", static_cast<uint32_t>(problem.found.code_point));
 }
 
 std::string notReversible(const Problem &problem) {
-  if (problem.byteCount == 0) {
-    return fmt::format("it does not come back from code page {}", problem.page);
-  }
+  const std::string what = problem.found.byte_count == 0 ? "it" : "the " + bytesText(problem);
   if (problem.cameBack < 0) {
-    return fmt::format("the byte {} does not come back from code page {}", problem.hex(),
-                       problem.page);
+    return fmt::format("{} does not come back from code page {}", what, problem.page);
   }
-  return fmt::format("the byte {} comes back from code page {} as {:02X}", problem.hex(),
-                     problem.page, problem.cameBack);
+  return fmt::format("{} comes back from code page {} as {:02X}", what, problem.page,
+                     problem.cameBack);
 }
 
-const char *widerAdvice(Limit limitedBy, const char *forOutLength) {
-  switch (limitedBy) {
-  case Limit::fieldWidth:
-    return "; give the field another width";
-  case Limit::ownLength:
-    return "; give the field a width, or --out-length";
-  default:
-    return forOutLength;
-  }
+std::string widerAdvice(Limit limitedBy, const char *forOutLength) {
+  return std::array{
+      forOutLength, "; give the field another width",
+      "; give the field a width, or --out-length"}[static_cast<std::size_t>(limitedBy)];
+}
+
+std::string counted(uint64_t count, std::string_view what) {
+  return fmt::format("{} {}{}", count, what, count == 1 ? "" : "s");
+}
+
+const char *wasOrWere(uint64_t count) { return count == 1 ? "was" : "were"; }
+
+Json jsonOf(const Problem &problem) {
+  constexpr std::array kinds{"invalid bytes", "not in the page", "too long",     "null inside",
+                             "no exact fill", "not reversible",  "short record", "no memory"};
+  Json object = Json::object();
+  object.set("record", problem.record + 1);
+  object.set("byte", problem.byte);
+  object.set("column", problem.column + 1);
+  object.set("hex", problem.found.byte_count == 0 ? Json() : Json(hexOf(problem)));
+  object.set("kind", kinds[static_cast<std::size_t>(problem.kind)]);
+  object.set("code_point",
+             problem.kind == ProblemKind::notInPage ? Json(codePointText(problem)) : Json());
+  return object;
 }
 
 } // namespace
 
-std::string Problem::hex() const {
-  std::string text;
-  for (std::size_t i = 0; i < byteCount; ++i) {
-    text += fmt::format("{}{:02X}", i > 0 ? " " : "", static_cast<unsigned char>(bytes[i]));
-  }
-  return text;
-}
-
-std::string Problem::codePointText() const {
-  return kind == ProblemKind::notInPage ? fmt::format("U+{:04X}", static_cast<uint32_t>(codePoint))
-                                        : "";
-}
-
-std::string_view kindName(ProblemKind kind) {
-  switch (kind) {
-  case ProblemKind::invalidBytes:
-    return "invalid bytes";
-  case ProblemKind::notInPage:
-    return "not in the page";
-  case ProblemKind::tooLong:
-    return "too long";
-  case ProblemKind::nullInside:
-    return "null inside";
-  case ProblemKind::noExactFill:
-    return "no exact fill";
-  case ProblemKind::notReversible:
-    return "not reversible";
-  case ProblemKind::shortRecord:
-    return "short record";
-  default:
-    return "no memory";
-  }
+void Tally::add(const Tally &later) {
+  records += later.records;
+  rejected += later.rejected;
+  replaced += later.replaced;
+  replacedRecords += later.replacedRecords;
+  bytesIn += later.bytesIn;
+  bytesOut += later.bytesOut;
+  first = first ? first : later.first;
+  failure = failure ? failure : later.failure;
 }
 
 std::string placeOf(const Problem &problem, std::string_view unit) {
@@ -96,25 +87,28 @@ std::string placeOf(const Problem &problem, std::string_view unit) {
 }
 
 std::string reasonOf(const Problem &problem) {
+  constexpr std::array limits{"--out-length is", "the width is", "the field has"};
+  const nls2::field_result &found = problem.found;
   switch (problem.kind) {
   case ProblemKind::invalidBytes:
     return fmt::format("the {} {} not valid in code page {}", bytesText(problem),
-                       problem.byteCount == 1 ? "is" : "are", problem.page);
+                       found.byte_count == 1 ? "is" : "are", problem.page);
   case ProblemKind::notInPage:
-    return fmt::format("the character {}{} is not in code page {}", problem.codePointText(),
-                       problem.byteCount > 0 ? " (" + bytesText(problem) + ")" : "", problem.page);
+    return fmt::format("the character {}{} is not in code page {}", codePointText(problem),
+                       found.byte_count > 0 ? " (" + bytesText(problem) + ")" : "", problem.page);
   case ProblemKind::tooLong:
-    return tooLong(problem);
+    return fmt::format("the text takes {} bytes, but {} {}", found.needed,
+                       limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit);
   case ProblemKind::nullInside:
     return "a null (U+0000) is inside the text, where --strip, --fill and --keep-blanks would cut "
            "it";
   case ProblemKind::noExactFill:
-    return fmt::format("filled with blanks it can be {} bytes long, but not {}", problem.needed,
+    return fmt::format("filled with blanks it can be {} bytes long, but not {}", found.needed,
                        problem.limit);
   case ProblemKind::notReversible:
     return notReversible(problem);
   case ProblemKind::shortRecord:
-    return fmt::format("the input ends after {} of {} bytes", problem.needed, problem.limit);
+    return fmt::format("the input ends after {} of {} bytes", found.needed, problem.limit);
   default:
     return "out of memory";
   }
@@ -139,6 +133,34 @@ std::string adviceOn(const Problem &problem) {
   default:
     return "";
   }
+}
+
+std::string summaryOf(const Tally &tally, std::string_view unit) {
+  if (!tally.first) {
+    return "";
+  }
+  const std::string first = placeOf(*tally.first, unit) + ": " + reasonOf(*tally.first);
+  if (tally.rejected > 0) {
+    return fmt::format("{} {} rejected, the first is {}", counted(tally.rejected, unit),
+                       wasOrWere(tally.rejected), first);
+  }
+  return fmt::format("{} in {} {} replaced, the first in {}", counted(tally.replaced, "character"),
+                     counted(tally.replacedRecords, unit), wasOrWere(tally.replaced), first);
+}
+
+std::string reportOf(const Tally &tally, const TranslateOptions &options, double seconds) {
+  Json object = Json::object();
+  object.set("records", tally.records);
+  object.set("rejected", tally.rejected);
+  object.set("replaced", tally.replaced);
+  object.set("bytes_in", tally.bytesIn);
+  object.set("bytes_out", tally.bytesOut);
+  object.set("seconds", seconds);
+  object.set("from", options.from);
+  object.set("to", options.to);
+  const auto &first = tally.first ? tally.first : tally.failure;
+  object.set("first_problem", first ? jsonOf(*first) : Json());
+  return object.text();
 }
 
 } // namespace nls2::tool

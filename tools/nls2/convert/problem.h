@@ -1,9 +1,8 @@
-// What keeps a record from being translated, where it is, and how it is said.
+// What keeps a record from being translated, where it is, and how that and a whole run are reported.
 #pragma once
 
-#include <array>
-#include <cstddef>
-#include <cstdint>
+#include "convert/translate.h"
+
 #include <string>
 #include <string_view>
 
@@ -25,26 +24,30 @@ enum class Limit { outLength, fieldWidth, ownLength };
 
 struct Problem {
   ProblemKind kind = ProblemKind::invalidBytes;
-  uint64_t record = 0;    // before it in the input
-  uint64_t byte = 0;      // the record's offset in the input
-  std::size_t column = 0; // the offset in the record
-  std::size_t field = 0;  // of --fields, from 1; 0 without it
-  int32_t page = 0;       // the one whose rules the text breaks
-  std::array<char, 8> bytes = {};
-  std::size_t byteCount = 0;
-  char32_t codePoint = 0;
-  std::size_t needed = 0; // bytes that it takes, or has
-  std::size_t limit = 0;  // bytes that it may take, or should have
+  uint64_t record = 0;      // before it in the input
+  uint64_t byte = 0;        // the record's offset in the input
+  std::size_t column = 0;   // the offset in the record
+  std::size_t field = 0;    // of --fields, from 1; 0 without it
+  int32_t page = 0;         // the one whose rules the text breaks
+  nls2::field_result found; // the bytes and the character at fault, and the bytes needed
+  std::size_t limit = 0;    // bytes that it may take, or should have
   Limit limitedBy = Limit::outLength;
   int cameBack = -1; // notReversible: the byte in place of the first one; -1: none
-
-  // "41 FF"; empty where no bytes are at fault.
-  std::string hex() const;
-  std::string codePointText() const; // "U+0416"; empty where there is none
 };
 
-// "invalid bytes", as a report has it.
-std::string_view kindName(ProblemKind kind);
+// Counts of a piece of the input, or of all of it.
+struct Tally {
+  uint64_t records = 0; // translated or rejected
+  uint64_t rejected = 0;
+  uint64_t replaced = 0;        // characters
+  uint64_t replacedRecords = 0; // with such characters
+  uint64_t bytesIn = 0;
+  uint64_t bytesOut = 0;
+  std::optional<Problem> first;   // that was replaced or rejected
+  std::optional<Problem> failure; // that ended the run, after all the others
+
+  void add(const Tally &later);
+};
 
 // "record 3 at byte 160, column 5, field 2"; `unit` is "record" or "line".
 std::string placeOf(const Problem &problem, std::string_view unit);
@@ -54,5 +57,11 @@ std::string reasonOf(const Problem &problem);
 
 // What would help, after a semicolon; empty where nothing is known to.
 std::string adviceOn(const Problem &problem);
+
+// What became of the characters and records that were replaced or rejected; empty where none was.
+std::string summaryOf(const Tally &tally, std::string_view unit);
+
+// The report as JSON.
+std::string reportOf(const Tally &tally, const TranslateOptions &options, double seconds);
 
 } // namespace nls2::tool

@@ -3,7 +3,11 @@
 
 #include <chrono>
 #include <cstdint>
+#include <cstdio>
+#include <fmt/core.h>
 #include <optional>
+#include <string>
+#include <unistd.h>
 
 namespace nls2::tool {
 
@@ -11,22 +15,50 @@ class Progress {
 public:
   // Shown where standard error is a terminal and the run lasts longer than a second, unless
   // `wanted` says so or forbids it. `total` are the bytes of the input, where they are known.
-  Progress(std::optional<bool> wanted, std::optional<uint64_t> total);
+  Progress(std::optional<bool> wanted, std::optional<uint64_t> total)
+      : total_(total.value_or(0)), next_(start_ + std::chrono::seconds(wanted == true ? 0 : 1)),
+        isShown_(wanted.value_or(isatty(STDERR_FILENO) == 1)) {}
   ~Progress() { clear(); }
   Progress(const Progress &) = delete;
   Progress &operator=(const Progress &) = delete;
 
-  void update(uint64_t bytes); // of the input, since the beginning
-  void clear();
-  double seconds() const;
+  // `bytes` of the input are done.
+  void update(uint64_t bytes) {
+    const auto now = Clock::now();
+    if (isShown_ && now >= next_) {
+      next_ = now + std::chrono::milliseconds(200);
+      isThere_ = true;
+      std::fprintf(stderr, "%s%s", toLineStart, line(bytes, now - start_).c_str());
+    }
+  }
+  void clear() {
+    if (isThere_) {
+      std::fputs(toLineStart, stderr);
+      isThere_ = false;
+    }
+  }
 
 private:
   using Clock = std::chrono::steady_clock;
+  static constexpr const char *toLineStart = "\r\x1B[K";
 
-  const std::optional<uint64_t> total_;
+  std::string line(uint64_t bytes, std::chrono::duration<double> passed) const {
+    const double rate = passed.count() > 0 ? static_cast<double>(bytes) / passed.count() : 0;
+    const std::string speed = fmt::format("{:.1f} MB/s", rate / 1e6);
+    if (total_ < bytes || total_ == 0) {
+      return fmt::format("{:.1f} MB, {}", static_cast<double>(bytes) / 1e6, speed);
+    }
+    const auto left =
+        static_cast<uint64_t>(rate > 0 ? static_cast<double>(total_ - bytes) / rate : 0);
+    const std::string time = fmt::format("{}:{:02}:{:02}", left / 3600, left / 60 % 60, left % 60);
+    return fmt::format("{}%, {}, {} left", bytes * 100 / total_, speed,
+                       rate > 0 ? time : "unknown");
+  }
+
+  const uint64_t total_; // 0: not known
   const Clock::time_point start_ = Clock::now();
   Clock::time_point next_; // when the line is due
-  bool isShown_;           // at all
+  const bool isShown_;     // at all
   bool isThere_ = false;   // now
 };
 

@@ -1,18 +1,38 @@
 // Records of one length, or lines, read in batches of many.
 #pragma once
 
+#include "codepage/code_page.h"
 #include "convert/byte_buffer.h"
-#include "convert/line_ends.h"
-#include "convert/translate_options.h"
+#include "convert/translate.h"
 #include "io/input_file.h"
 
-#include <cstdint>
-#include <optional>
-#include <string>
+#include <algorithm>
 #include <string_view>
-#include <vector>
 
 namespace nls2::tool {
+
+// One way to write a line's end, and the search for it in a text that grows at its end.
+class EndPattern {
+public:
+  explicit EndPattern(std::string bytes) : bytes_(std::move(bytes)) {}
+
+  std::size_t length() const { return bytes_.size(); }
+  // The first place from `from` on, a whole number of units from the text's beginning; npos where
+  // there is none yet. `from` never goes back.
+  std::size_t next(std::string_view text, std::size_t from);
+  // For a new text, which begins at a line's beginning.
+  void restart();
+
+private:
+  std::string bytes_; // one unit; none where the page does not have the character
+  std::size_t found_ = std::string_view::npos;
+  std::size_t searched_ = 0; // no place before this one
+};
+
+struct LineBounds {
+  std::size_t text = 0; // bytes without the end
+  std::size_t end = 0;  // bytes with it
+};
 
 struct RecordBatch {
   ByteBuffer bytes;
@@ -29,54 +49,48 @@ struct RecordBatch {
   template <typename Use>
   void forEach(Use use) const {
     std::string_view rest = bytes.bytes().substr(begin);
-    if (recordLength == 0) {
-      for (const LineBounds &line : lines) {
-        if (!use(rest.substr(0, line.text), rest.substr(0, line.end))) {
-          return;
-        }
-        rest.remove_prefix(line.end);
-      }
-      return;
-    }
-    while (!rest.empty()) {
-      const std::string_view record = rest.substr(0, recordLength);
-      if (!use(record, record)) {
+    for (std::size_t i = 0; !rest.empty(); ++i) {
+      const std::size_t length = std::min(recordLength, rest.size());
+      const LineBounds bounds = recordLength == 0 ? lines[i] : LineBounds{length, length};
+      if (!use(rest.substr(0, bounds.text), rest.substr(0, bounds.end))) {
         return;
       }
-      rest.remove_prefix(record.size());
+      rest.remove_prefix(bounds.end);
     }
   }
 };
 
 class RecordReader {
 public:
-  // Throws usageError for a code page whose lines cannot be found.
-  RecordReader(InputFile &input, const TranslateOptions &options, int wakeFd);
+  // Throws usageError for a page that has no line feed, or in which a line cannot be read without
+  // the text before it.
+  RecordReader(InputFile &input, const TranslateOptions &options);
 
-  // The next records, as soon as there is one; false at the end of the input. Throws Error.
+  // The next records, as soon as there is one, or lines that were skipped; false at the end of the
+  // input. Throws Error.
   bool read(RecordBatch &batch);
 
 private:
-  void start();
-  bool readRecords(RecordBatch &batch);
-  bool readLines(RecordBatch &batch);
-  std::size_t readMore(RecordBatch &batch, std::size_t most);
+  void readRecords(RecordBatch &batch);
+  void skipRecords();
+  void readLines(RecordBatch &batch);
   void findLines(RecordBatch &batch);
-  void skipLines(RecordBatch &batch);
-  [[noreturn]] void refuseLongLine() const;
+  LineBounds nextLine(std::string_view text);
+  void readMore(RecordBatch &batch, std::size_t most);
+  void carry(RecordBatch &batch, std::size_t from);
 
   InputFile &input_;
-  const int wakeFd_;
   const std::size_t recordLength_;
-  std::optional<LineEnds> ends_; // of lines
+  EndPattern lineFeed_{""};
+  EndPattern nextLine_{""};
+  std::string carriageReturn_;
   uint64_t toSkip_;
-  uint64_t left_;                 // records that may still be read
-  const std::size_t mostRecords_; // in a batch, so that its output stays small too
-  std::string carried_;           // the beginning of a record whose end has not been read
-  std::size_t scanned_ = 0;       // where the next line of the batch begins
+  uint64_t left_;              // records that may still be read
+  const uint64_t mostRecords_; // in a batch, so that its output stays small too
+  std::string carried_;        // the beginning of a record whose end has not been read
+  std::size_t scanned_ = 0;    // where the next line of the batch begins
   uint64_t records_ = 0;
   uint64_t offset_ = 0;
-  bool started_ = false;
   bool ended_ = false;
 };
 

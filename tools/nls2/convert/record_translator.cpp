@@ -6,51 +6,85 @@
 #include "errors.h"
 
 #include <algorithm>
+#include <array>
+#include <new>
+#include <set>
 
 namespace nls2::tool {
 
 namespace {
 
-std::u16string_view textOf(Newline newline) {
-  switch (newline) {
-  case Newline::lf:
-    return u"\n";
-  case Newline::crlf:
-    return u"\r\n";
-  case Newline::nel:
-    return u"\u0085";
+nls2::field_translator makeTranslator(int32_t from, int32_t to, const nls2::field_policy &policy) {
+  std::error_code error;
+  nls2::field_translator made(nls2::code_page(from), nls2::code_page(to), policy, error);
+  if (error) { // the pages have been opened before
+    throw std::bad_alloc();
+  }
+  return made;
+}
+
+std::string digitsOf(std::string_view bytes) {
+  constexpr std::string_view digits = "0123456789ABCDEF";
+  std::string text;
+  text.reserve(2 * bytes.size());
+  for (const char byte : bytes) {
+    text += digits[static_cast<unsigned char>(byte) >> 4];
+    text += digits[byte & 15];
+  }
+  return text;
+}
+
+// Quotes the last `length` bytes, a field in UTF-8, as RFC 4180 does where that is needed.
+void quoteForCsv(ByteBuffer &out, std::size_t length) {
+  const std::string_view field = out.bytes().substr(out.size() - length);
+  if (field.find_first_of(",\"\r\n") == std::string_view::npos) {
+    return;
+  }
+  std::string quoted = "\"";
+  for (const char byte : field) {
+    quoted.append(byte == '"' ? 2 : 1, byte);
+  }
+  out.truncate(out.size() - length);
+  out.append(quoted + '"');
+}
+
+ProblemKind kindOf(nls2::field_problem problem) {
+  switch (problem) {
+  case nls2::field_problem::invalid_bytes:
+    return ProblemKind::invalidBytes;
+  case nls2::field_problem::not_in_page:
+    return ProblemKind::notInPage;
+  case nls2::field_problem::embedded_null:
+    return ProblemKind::nullInside;
+  case nls2::field_problem::no_exact_fill:
+    return ProblemKind::noExactFill;
+  case nls2::field_problem::no_room:
+    return ProblemKind::tooLong;
   default:
-    return u"";
+    return ProblemKind::noMemory;
   }
 }
 
-bool isUtf16Or32(const CodePage &page) {
-  const UConverterType type = ucnv_getType(page.converter());
-  return type == UCNV_UTF16 || type == UCNV_UTF32 || type == UCNV_UTF16_BigEndian ||
-         type == UCNV_UTF16_LittleEndian;
-}
-
 // As it is after a record's text, without a signature. Pages that change their mode for U+0085 have
-// no bytes that always mean it.
-std::string encodedNewline(const CodePage &page, Newline newline) {
+// no bytes that always mean it. Where nothing else is asked for, records are not ended and lines
+// are, unless they are filled.
+std::string encodedNewline(const CodePage &page, const TranslateOptions &options) {
+  constexpr std::array<std::u16string_view, 4> texts{u"", u"\n", u"\r\n", u"\u0085"};
+  static const std::set wide{UCNV_UTF16, UCNV_UTF32, UCNV_UTF16_BigEndian, UCNV_UTF16_LittleEndian};
+  const bool makesLines =
+      options.csv || (options.recordLength == 0 && options.padding != nls2::padding::fill);
+  const Newline newline = options.newline.value_or(makesLines ? Newline::lf : Newline::none);
   std::string bytes;
-  for (const char16_t character : textOf(newline)) {
+  for (const char16_t character : texts[static_cast<std::size_t>(newline)]) {
     const auto encoded = page.encoded(character);
     const bool changesMode = encoded && encoded->signatureLength != 0 && character > 0x7F;
-    if (!encoded || (changesMode && !isUtf16Or32(page))) {
+    if (!encoded || (changesMode && !wide.contains(ucnv_getType(page.converter())))) {
       throw usageError("--newline: code page {} has no U+{:04X}", page.number(),
                        static_cast<unsigned>(character));
     }
     bytes += encoded->bytes;
   }
   return bytes;
-}
-
-// Where nothing else is asked for, records are not ended and lines are, unless they are filled.
-Newline newlineOf(const TranslateOptions &options) {
-  const bool makesLines =
-      options.csv || (options.recordLength == 0 && options.padding != nls2::padding::fill);
-  return options.newline.value_or(makesLines ? Newline::lf : Newline::none);
 }
 
 bool padsWithBlanks(const TranslateOptions &options) {
@@ -61,14 +95,121 @@ bool padsWithBlanks(const TranslateOptions &options) {
 
 } // namespace
 
-RecordTranslator::RecordTranslator(const TranslateOptions &options)
-    : options_(&options), separator_(options.csv ? "," : "") {
+OutputField::OutputField(const FieldSpec &spec, std::size_t number, const TranslateOptions &options)
+    : spec_(spec), number_(number), verifies_(options.verify && spec.kind == FieldSpec::Kind::text),
+      csv_(options.csv) {
+  nls2::field_policy policy;
+  policy.bad = options.onError == OnError::replace ? nls2::on_bad::replace : nls2::on_bad::stop;
+  if (spec.width != 0) {
+    policy.padding = nls2::padding::fill;
+    policy.width = spec.width;
+    limitedBy_ = Limit::fieldWidth;
+  } else if (spec.kind == FieldSpec::Kind::text) {
+    policy.padding = csv_ ? nls2::padding::strip : options.padding;
+    policy.width = options.outLength;
+    if (policy.padding == nls2::padding::fill && policy.width == 0) {
+      policy.width = spec.length();
+      limitedBy_ = Limit::ownLength;
+    }
+  }
+  if (spec.kind != FieldSpec::Kind::raw) {
+    const int32_t from = spec.kind == FieldSpec::Kind::hex ? utf8Page : spec.from;
+    forward_ = makeTranslator(from, options.to, policy);
+  }
+}
+
+std::optional<Problem> OutputField::translate(std::string_view record, ByteBuffer &out,
+                                              std::size_t &replaced) {
+  std::string_view field = number_ == 0 ? record : record.substr(spec_.begin, spec_.length());
+  if (spec_.kind == FieldSpec::Kind::raw) {
+    out.append(field);
+    return {};
+  }
+  if (spec_.kind == FieldSpec::Kind::hex) {
+    field = digits_ = digitsOf(field);
+  }
+  const std::span<char> room = out.room(forward_->max_size(field.size()));
+  const nls2::field_result result = forward_->translate(field, room);
+  if (!result) {
+    return describe(result);
+  }
+  if (verifies_ && result.replaced == 0) {
+    if (auto problem = verify(field, {room.data(), result.written})) {
+      return problem;
+    }
+  }
+  replaced += result.replaced;
+  out.commit(result.written);
+  if (csv_) {
+    quoteForCsv(out, result.written);
+  }
+  return {};
+}
+
+Problem OutputField::newProblem(ProblemKind kind) const {
+  Problem problem;
+  problem.kind = kind;
+  problem.column = spec_.begin;
+  problem.field = number_;
+  problem.page = forward_->to().number();
+  problem.limitedBy = limitedBy_;
+  problem.limit = forward_->policy().width;
+  return problem;
+}
+
+Problem OutputField::describe(const nls2::field_result &failed) const {
+  Problem problem = newProblem(kindOf(failed.problem));
+  problem.found = failed;
+  if (problem.kind == ProblemKind::invalidBytes) {
+    problem.page = spec_.from;
+  }
+  if (spec_.kind == FieldSpec::Kind::text) {
+    problem.column += failed.offset;
+  } else { // the digits of a hex field are not in the record
+    problem.found.byte_count = 0;
+  }
+  return problem;
+}
+
+// A padded field comes back padded to its own length.
+std::optional<Problem> OutputField::verify(std::string_view field, std::string_view translated) {
+  if (field.empty()) {
+    return {};
+  }
+  nls2::field_policy policy;
+  if (forward_->policy().padding != nls2::padding::as_is) {
+    policy.padding = nls2::padding::fill;
+    policy.width = field.size();
+  }
+  if (!back_ || back_->policy().width != policy.width) {
+    back_ = makeTranslator(forward_->to().number(), spec_.from, policy);
+  }
+  cameBack_.clear();
+  const bool comesBack = static_cast<bool>(back_->translate(translated, cameBack_));
+  if (comesBack && cameBack_ == field) {
+    return {};
+  }
+  Problem problem = newProblem(ProblemKind::notReversible);
+  if (comesBack) {
+    const auto [wrong, back] =
+        std::mismatch(field.begin(), field.end(), cameBack_.cbegin(), cameBack_.cend());
+    problem.column += static_cast<std::size_t>(wrong - field.begin());
+    if (wrong != field.end()) {
+      problem.found.bytes[0] = *wrong;
+      problem.found.byte_count = 1;
+      problem.cameBack = back != cameBack_.cend() ? static_cast<unsigned char>(*back) : -1;
+    }
+  }
+  return problem;
+}
+
+RecordTranslator::RecordTranslator(const TranslateOptions &options) : options_(&options) {
   const CodePage from(options.from, "--from");
   const CodePage to(options.to, "--to");
   if (padsWithBlanks(options) && !to.encoded(u' ')) {
     throw usageError("code page {} has no blank to pad with", options.to);
   }
-  lineEnd_ = encodedNewline(to, newlineOf(options));
+  lineEnd_ = encodedNewline(to, options);
   if (options.fields.empty()) {
     FieldSpec whole;
     whole.from = options.from;
@@ -83,11 +224,11 @@ RecordTranslator::RecordTranslator(const TranslateOptions &options)
 std::optional<Problem> RecordTranslator::translate(std::string_view record, ByteBuffer &out,
                                                    std::size_t &replaced) {
   const std::size_t before = out.size();
-  for (std::size_t i = 0; i < fields_.size(); ++i) {
-    if (i > 0) {
-      out.append(separator_);
+  for (OutputField &field : fields_) {
+    if (options_->csv && &field != fields_.data()) {
+      out.append(",");
     }
-    if (auto problem = fields_[i].translate(record, out, replaced)) {
+    if (auto problem = field.translate(record, out, replaced)) {
       out.truncate(before);
       return problem;
     }

@@ -1,15 +1,43 @@
 // One record from one code page to another, shaped as the options say.
 #pragma once
 
-#include "convert/output_field.h"
+#include "convert/byte_buffer.h"
+#include "convert/problem.h"
+#include "nls2/field_translator.hpp"
 
-#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
 
 namespace nls2::tool {
+
+// One field of the output.
+class OutputField {
+public:
+  // `number` counts the fields of --fields from 1; 0 is the whole record, whose spec has its code
+  // page only.
+  OutputField(const FieldSpec &spec, std::size_t number, const TranslateOptions &options);
+
+  // Appends the field, and to `replaced` the characters that it lost. On failure the problem says
+  // where in the record.
+  std::optional<Problem> translate(std::string_view record, ByteBuffer &out, std::size_t &replaced);
+
+private:
+  Problem describe(const nls2::field_result &failed) const;
+  std::optional<Problem> verify(std::string_view field, std::string_view translated);
+  Problem newProblem(ProblemKind kind) const;
+
+  FieldSpec spec_;
+  std::size_t number_;
+  bool verifies_;
+  bool csv_;
+  Limit limitedBy_ = Limit::outLength;
+  std::optional<nls2::field_translator> forward_; // none for raw bytes
+  std::optional<nls2::field_translator> back_;
+  std::string digits_;
+  std::string cameBack_;
+};
 
 // Keeps its converters open: every worker has a copy.
 class RecordTranslator {
@@ -27,7 +55,6 @@ public:
 private:
   const TranslateOptions *options_;
   std::vector<OutputField> fields_;
-  std::string separator_;
   std::string lineEnd_;
 };
 

@@ -12,34 +12,35 @@
 #include <limits>
 #include <memory>
 #include <poll.h>
+#include <sys/eventfd.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 namespace nls2::tool {
 
-InputFile::InputFile(const std::string &path) : name_(printable(path)) {
-  if (path == "-") {
-    name_ = "standard input";
-    fd_ = STDIN_FILENO;
-    return;
-  }
-  fd_ = open(path.c_str(), O_RDONLY | O_CLOEXEC);
-  if (fd_ < 0) {
+InputFile::InputFile(const std::string &path)
+    : name_(path == "-" ? "standard input" : printable(path)),
+      fd_(path == "-" ? STDIN_FILENO : open(path.c_str(), O_RDONLY | O_CLOEXEC)),
+      wakeFd_(fd_ < 0 ? -1 : eventfd(0, EFD_CLOEXEC)) {
+  if (wakeFd_ < 0) {
     fail();
   }
 }
 
 InputFile::~InputFile() {
-  if (fd_ >= 0 && fd_ != STDIN_FILENO) {
+  close(wakeFd_);
+  if (fd_ != STDIN_FILENO) {
     close(fd_);
   }
 }
 
+void InputFile::interrupt() const { eventfd_write(wakeFd_, 1); }
+
 void InputFile::fail() const { throw failure("cannot read {}: {}", name_, std::strerror(errno)); }
 
-std::size_t InputFile::read(char *buffer, std::size_t length, int wakeFd) {
+std::size_t InputFile::read(char *buffer, std::size_t length) {
   for (;;) {
-    std::array<pollfd, 2> watched{{{fd_, POLLIN, 0}, {wakeFd, POLLIN, 0}}};
+    std::array<pollfd, 2> watched{{{fd_, POLLIN, 0}, {wakeFd_, POLLIN, 0}}};
     if (poll(watched.data(), watched.size(), -1) < 0 && errno != EINTR) {
       fail();
     }
@@ -57,7 +58,7 @@ std::size_t InputFile::read(char *buffer, std::size_t length, int wakeFd) {
 }
 
 // Devices such as terminals "seek" without doing so.
-void InputFile::skip(uint64_t bytes, int wakeFd) {
+void InputFile::skip(uint64_t bytes) {
   constexpr uint64_t farthest = std::numeric_limits<off_t>::max();
   if (const auto left = bytesLeft()) {
     if (lseek(fd_, static_cast<off_t>(std::min({bytes, *left, farthest})), SEEK_CUR) < 0) {
@@ -68,7 +69,7 @@ void InputFile::skip(uint64_t bytes, int wakeFd) {
   constexpr std::size_t chunk = std::size_t{64} * 1024;
   const auto dropped = std::make_unique_for_overwrite<char[]>(chunk);
   while (bytes > 0) {
-    const std::size_t got = read(dropped.get(), std::min<uint64_t>(bytes, chunk), wakeFd);
+    const std::size_t got = read(dropped.get(), std::min<uint64_t>(bytes, chunk));
     if (got == 0) {
       return;
     }

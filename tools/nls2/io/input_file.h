@@ -16,12 +16,13 @@ public:
   InputFile(const InputFile &) = delete;
   InputFile &operator=(const InputFile &) = delete;
 
-  // Up to `length` bytes, as many as are there at once; 0 at the end, and when `wakeFd` becomes
-  // readable before any are. Throws Error.
-  std::size_t read(char *buffer, std::size_t length, int wakeFd = -1);
+  // Up to `length` bytes, as many as are there at once; 0 at the end, and where it would wait for
+  // them after interrupt(). Throws Error.
+  std::size_t read(char *buffer, std::size_t length);
+  void interrupt() const;
   // Leaves out the next bytes, by seeking where the file can; fewer where it ends before. Throws
   // Error.
-  void skip(uint64_t bytes, int wakeFd = -1);
+  void skip(uint64_t bytes);
   // The bytes from here to the end, where that is known.
   std::optional<uint64_t> bytesLeft() const;
 
@@ -32,7 +33,8 @@ private:
   [[noreturn]] void fail() const;
 
   std::string name_;
-  int fd_ = -1;
+  const int fd_;
+  const int wakeFd_; // becomes readable for good
 };
 
 } // namespace nls2::tool

@@ -2,19 +2,14 @@
 
 #include "io/output_file.h"
 
-#include "errors.h"
-#include "io/file_attributes.h"
 #include "memory.h"
+#include "options.h"
 
-#include <algorithm>
 #include <cerrno>
-#include <charconv>
-#include <climits>
 #include <csignal>
-#include <cstdlib>
 #include <cstring>
 #include <fcntl.h>
-#include <optional>
+#include <filesystem>
 #include <poll.h>
 #include <unistd.h>
 
@@ -22,55 +17,22 @@ namespace nls2::tool {
 
 namespace {
 
+namespace fs = std::filesystem;
+
 constexpr std::size_t mostKept = std::size_t{64} * 1024;
-
-std::string resolved(const std::string &path) {
-  const std::unique_ptr<char, decltype(&std::free)> real(realpath(path.c_str(), nullptr),
-                                                         &std::free);
-  return real ? real.get() : "";
-}
-
-// The file that a path leads to, through symbolic links: a link stays a link when its file is
-// replaced.
-std::string realPathOf(const std::string &path) {
-  std::string real = resolved(path);
-  if (real.empty()) {
-    throw failure("cannot write {}: {}", printable(path), std::strerror(errno));
-  }
-  return real;
-}
-
-std::optional<int> numberIn(const std::string &text) {
-  int number = -1;
-  const char *end = text.data() + text.size();
-  const auto [stop, error] = std::from_chars(text.data(), end, number);
-  return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
-}
-
-// Where a symbolic link leads; empty for everything else.
-std::string targetOf(const std::string &path) {
-  std::string target(PATH_MAX, '\0');
-  const ssize_t length = readlink(path.c_str(), target.data(), target.size());
-  target.resize(static_cast<std::size_t>(std::max<ssize_t>(length, 0)));
-  return target;
-}
 
 // The number in /proc/self/fd/NUMBER, to which /dev/stdout, /dev/fd/NUMBER and links of users lead.
 // What lies behind that number is not looked at.
-std::optional<int> descriptorOf(std::string path) {
-  const std::string ours = "/proc/" + std::to_string(getpid()) + "/";
-  for (int links = 0; links < 40; ++links) {
-    const std::size_t name = path.rfind('/') + 1; // 0 without a slash
-    const std::string directory = name == 0 ? "./" : path.substr(0, name);
-    const std::string real = resolved(directory);
+std::optional<int> descriptorOf(fs::path path) {
+  const std::string ours = fmt::format("/proc/{}/", getpid());
+  std::error_code error;
+  for (int links = 0; links < 40 && !error; ++links) {
+    const fs::path directory = path.has_parent_path() ? path.parent_path() : ".";
+    const std::string real = fs::canonical(directory, error);
     if (real.starts_with(ours) && real.ends_with("/fd")) {
-      return numberIn(path.substr(name));
+      return decimalNumber<int>(path.filename().native());
     }
-    const std::string target = targetOf(path);
-    if (target.empty()) {
-      return {};
-    }
-    path = target.starts_with("/") ? target : directory + target;
+    path = directory / fs::read_symlink(path, error);
   }
   return {};
 }
@@ -78,39 +40,38 @@ std::optional<int> descriptorOf(std::string path) {
 // In a directory such as /tmp only the owner of a file, or of the directory, may replace it.
 bool isOthersInStickyDirectory(const std::string &path, const struct stat &existing) {
   struct stat directory = {};
-  const std::string parent = path.substr(0, path.rfind('/') + 1);
-  return stat(parent.c_str(), &directory) == 0 && (directory.st_mode & S_ISVTX) != 0 &&
-         geteuid() != 0 && geteuid() != existing.st_uid && geteuid() != directory.st_uid;
+  return stat(fs::path(path).parent_path().c_str(), &directory) == 0 &&
+         (directory.st_mode & S_ISVTX) != 0 && geteuid() != 0 && geteuid() != existing.st_uid &&
+         geteuid() != directory.st_uid;
 }
 
 } // namespace
 
-OutputFile::OutputFile(const std::string &path) : name_(printable(path)) {
+OutputFile::OutputFile(const std::string &path)
+    : name_(path == "-" ? "standard output" : printable(path)) {
+  struct stat existing = {};
   if (path == "-") {
-    name_ = "standard output";
     fd_ = STDOUT_FILENO;
-    return;
-  }
-  if (const auto number = descriptorOf(path)) {
+  } else if (const auto number = descriptorOf(path)) {
     fd_ = fcntl(*number, F_DUPFD_CLOEXEC, 0); // the same open file, its offset included
-    if (fd_ < 0) {
-      fail();
-    }
-    return;
+  } else if (stat(path.c_str(), &existing) != 0) {
+    makeFile(path);
+  } else if (S_ISREG(existing.st_mode)) {
+    replaceFile(path, existing);
+  } else {
+    fd_ = open(path.c_str(), O_WRONLY | O_CLOEXEC);
   }
-  open(path);
+  if (fd_ < 0) {
+    fail();
+  }
 }
 
-void OutputFile::open(const std::string &path) {
-  struct stat existing = {};
-  if (stat(path.c_str(), &existing) == 0) {
-    S_ISREG(existing.st_mode) ? replaceFile(path, existing) : openDevice(path);
-    return;
-  }
+void OutputFile::makeFile(const std::string &path) {
+  struct stat link = {};
   if (errno != ENOENT && errno != ENOTDIR) {
     fail();
   }
-  if (lstat(path.c_str(), &existing) == 0) {
+  if (lstat(path.c_str(), &link) == 0) {
     throw failure("cannot write {}: it is a symbolic link that leads nowhere", name_);
   }
   replacedPath_ = path;
@@ -118,26 +79,21 @@ void OutputFile::open(const std::string &path) {
   fd_ = temporary_->fd();
 }
 
-void OutputFile::openDevice(const std::string &path) {
-  fd_ = ::open(path.c_str(), O_WRONLY | O_CLOEXEC);
-  if (fd_ < 0) {
-    fail();
-  }
-}
-
-// Whatever would keep the file from being replaced in the end is found now.
+// Whatever would keep the file from being replaced in the end is found now. A symbolic link stays
+// one when its file is replaced.
 void OutputFile::replaceFile(const std::string &path, const struct stat &existing) {
-  if (faccessat(AT_FDCWD, path.c_str(), W_OK, AT_EACCESS) != 0) {
+  std::error_code error;
+  replacedPath_ = fs::canonical(path, error);
+  if (error || faccessat(AT_FDCWD, path.c_str(), W_OK, AT_EACCESS) != 0) {
     fail();
   }
-  replacedPath_ = realPathOf(path);
   if (isOthersInStickyDirectory(replacedPath_, existing)) {
     throw failure("cannot write {}: it is another user's, in a directory with the sticky bit",
                   name_);
   }
   temporary_ = std::make_unique<TemporaryFile>(replacedPath_, name_, 0600);
   fd_ = temporary_->fd();
-  copyAttributes(replacedPath_, existing, fd_);
+  temporary_->copyAttributes(existing);
 }
 
 OutputFile::~OutputFile() {

@@ -35,8 +35,7 @@ public:
   const std::string &name() const { return name_; } // for messages
 
 private:
-  void open(const std::string &path);
-  void openDevice(const std::string &path);
+  void makeFile(const std::string &path);
   void replaceFile(const std::string &path, const struct stat &existing);
   [[noreturn]] void fail() const;
 

@@ -4,12 +4,16 @@
 
 #include "errors.h"
 
+#include <algorithm>
 #include <array>
 #include <cerrno>
 #include <csignal>
 #include <cstdio>
 #include <cstring>
 #include <fcntl.h>
+#include <filesystem>
+#include <linux/limits.h>
+#include <sys/xattr.h>
 #include <unistd.h>
 #include <utility>
 
@@ -22,27 +26,10 @@ constexpr std::array endingSignals{SIGHUP,    SIGINT,  SIGQUIT, SIGTERM,  SIGALR
                                    SIGUSR1,   SIGUSR2, SIGXCPU, SIGPIPE,  SIGPOLL,
                                    SIGVTALRM, SIGPROF, SIGPWR,  SIGSTKFLT};
 
-// The files that a signal handler has to remove. The list changes only while the signals are held
-// back, and while no other thread of the process could get them in this one's place.
-TemporaryFile *volatile firstNamed = nullptr;
-
-} // namespace
-
-void removeTemporaryFiles() {
-  for (TemporaryFile *file = firstNamed; file != nullptr; file = file->next_) {
-    if (file->toRemove_ != nullptr) {
-      unlink(file->toRemove_);
-    }
-  }
-}
-
-namespace {
-
-extern "C" void removeAndDie(int signal) {
-  removeTemporaryFiles();
-  std::signal(signal, SIG_DFL);
-  raise(signal); // delivered on return from the handler
-}
+// The names that a signal handler has to remove, with room for more than a command ever has. They
+// change only while the signals are held back, and while no other thread of the process could get
+// them in this one's place.
+std::array<const char *volatile, 8> namesToRemove{};
 
 // Signals that the caller had ignored, as nohup does, stay ignored.
 void catchEndingSignals() {
@@ -50,7 +37,7 @@ void catchEndingSignals() {
     struct sigaction action = {};
     sigaction(signal, nullptr, &action);
     if (action.sa_handler == SIG_DFL) {
-      action.sa_handler = removeAndDie;
+      action.sa_handler = endBySignal;
       sigaction(signal, &action, nullptr);
     }
   }
@@ -60,10 +47,7 @@ class SignalsHeldBack {
 public:
   SignalsHeldBack() {
     sigset_t set;
-    sigemptyset(&set);
-    for (const int signal : endingSignals) {
-      sigaddset(&set, signal);
-    }
+    sigfillset(&set);
     pthread_sigmask(SIG_BLOCK, &set, &before_);
   }
   ~SignalsHeldBack() { pthread_sigmask(SIG_SETMASK, &before_, nullptr); }
@@ -75,32 +59,33 @@ private:
 };
 
 std::string directoryOf(const std::string &path) {
-  const std::size_t slash = path.rfind('/');
-  return slash == std::string::npos ? "." : path.substr(0, slash + 1);
+  const auto parent = std::filesystem::path(path).parent_path();
+  return parent.empty() ? "." : parent.string();
 }
 
 std::string ownPath(int fd) { return fmt::format("/proc/self/fd/{}", fd); }
 
-// Calls `make` with names beside the target until one is free.
-template <typename Make>
-std::string takeFreeName(const std::string &target, const std::string &shownName, Make make) {
-  for (int attempt = 0; attempt < 1000; ++attempt) {
-    std::string name = fmt::format("{}/.nls2-{}-{}.tmp", directoryOf(target), getpid(), attempt);
-    if (make(name.c_str()) >= 0) {
-      return name;
-    }
-    if (errno != EEXIST) {
-      break;
-    }
-  }
-  throw failure("cannot write {}: no new file in its directory: {}", shownName,
-                std::strerror(errno));
+// No attribute, and no list of their names, is longer; empty where it cannot be read.
+template <typename Get>
+std::string attributeBytes(Get get) {
+  std::string bytes(XATTR_LIST_MAX, '\0');
+  bytes.resize(static_cast<std::size_t>(std::max<ssize_t>(get(bytes.data(), bytes.size()), 0)));
+  return bytes;
+}
+
+std::string valueOf(const std::string &path, const char *name) {
+  return attributeBytes(
+      [&](char *buffer, std::size_t size) { return getxattr(path.c_str(), name, buffer, size); });
 }
 
 } // namespace
 
 void endBySignal(int signal) {
-  removeTemporaryFiles();
+  for (const char *name : namesToRemove) {
+    if (name != nullptr) {
+      unlink(name);
+    }
+  }
   std::signal(signal, SIG_DFL);
   sigset_t set;
   sigemptyset(&set);
@@ -110,6 +95,7 @@ void endBySignal(int signal) {
   _exit(128 + signal);
 }
 
+// File systems without unnamed files, and systems without /proc, get a name at once.
 TemporaryFile::TemporaryFile(std::string target, std::string name, mode_t mode)
     : target_(std::move(target)), shownName_(std::move(name)) {
   catchEndingSignals();
@@ -120,14 +106,16 @@ TemporaryFile::TemporaryFile(std::string target, std::string name, mode_t mode)
   if (fd_ >= 0) {
     close(fd_);
   }
-  openNamed(mode); // file systems without unnamed files, and systems without /proc
+  takeFreeName([&](const char *free) {
+    return fd_ = open(free, O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, mode);
+  });
 }
 
 TemporaryFile::~TemporaryFile() {
   const SignalsHeldBack held;
   if (!name_.empty()) {
-    leaveList();
     unlink(name_.c_str());
+    giveUpName();
   }
   if (fd_ >= 0) {
     close(fd_);
@@ -138,58 +126,79 @@ void TemporaryFile::fail() const {
   throw failure("cannot write {}: {}", shownName_, std::strerror(errno));
 }
 
-void TemporaryFile::enlist() {
-  toRemove_ = name_.c_str();
-  next_ = firstNamed;
-  firstNamed = this;
-}
-
-void TemporaryFile::leaveList() {
-  toRemove_ = nullptr;
-  TemporaryFile *volatile *place = &firstNamed;
-  while (*place != this) {
-    place = &(*place)->next_;
-  }
-  *place = next_;
-}
-
-void TemporaryFile::openNamed(mode_t mode) {
+// Calls `make` with names beside the target until one is free.
+template <typename Make>
+void TemporaryFile::takeFreeName(Make make) {
   const SignalsHeldBack held;
-  name_ = takeFreeName(target_, shownName_, [&](const char *name) {
-    return fd_ = open(name, O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, mode);
-  });
-  enlist();
+  int made = -1;
+  for (int attempt = 0; made < 0 && attempt < 1000; ++attempt) {
+    name_ = fmt::format("{}/.nls2-{}-{}.tmp", directoryOf(target_), getpid(), attempt);
+    made = make(name_.c_str());
+    if (made < 0 && errno != EEXIST) {
+      break;
+    }
+  }
+  if (made < 0) {
+    name_.clear();
+    throw failure("cannot write {}: no new file in its directory: {}", shownName_,
+                  std::strerror(errno));
+  }
+  *std::find(namesToRemove.begin(), namesToRemove.end(), nullptr) = name_.c_str();
 }
 
-// An unnamed file can take a free name only; the step from there to the target is a rename.
-void TemporaryFile::giveTemporaryName() {
-  name_ = takeFreeName(target_, shownName_, [&](const char *name) {
-    return linkat(AT_FDCWD, ownPath(fd_).c_str(), AT_FDCWD, name, AT_SYMLINK_FOLLOW);
-  });
-  enlist();
+void TemporaryFile::giveUpName() {
+  for (const char *volatile &name : namesToRemove) {
+    name = name == name_.c_str() ? nullptr : name;
+  }
+  name_.clear();
 }
 
-// A file system may report only at close() that bytes were lost: before the name is taken.
+// The owner first, since a change of owner takes mode bits away. Only the superuser may give a file
+// away; its group may still be one of the caller's.
+//
+// Where an access list is, the mode's group bits are its mask, which may allow more than the list
+// allows the group. A file that cannot have the list is therefore the owner's alone. A list that
+// the directory gave to the new file goes where the old one had none.
+//
+// Capabilities are for the program that the old file was. Others that cannot be set are left out.
+void TemporaryFile::copyAttributes(const struct stat &target) {
+  constexpr std::string_view accessList = "system.posix_acl_access";
+  if (fchown(fd_, target.st_uid, target.st_gid) != 0 &&
+      fchown(fd_, static_cast<uid_t>(-1), target.st_gid) != 0 && errno != EPERM) {
+    throw failure("cannot keep the file's owner: {}", std::strerror(errno));
+  }
+  fremovexattr(fd_, accessList.data());
+  const bool hasList = !valueOf(target_, accessList.data()).empty();
+  if (fchmod(fd_, target.st_mode & (hasList ? 0700 : 0777)) != 0) {
+    throw failure("cannot keep the file's permissions: {}", std::strerror(errno));
+  }
+  const std::string names = attributeBytes(
+      [&](char *buffer, std::size_t size) { return listxattr(target_.c_str(), buffer, size); });
+  for (const char *name = names.c_str(); *name != '\0'; name += std::strlen(name) + 1) {
+    if (std::string_view(name) != "security.capability") {
+      const std::string value = valueOf(target_, name);
+      static_cast<void>(fsetxattr(fd_, name, value.data(), value.size(), 0));
+    }
+  }
+}
+
+// An unnamed file can take a free name only; the step from there to the target is a rename. A file
+// system may report only at close() that bytes were lost: before the name is taken.
 void TemporaryFile::publish(bool sync) {
   const SignalsHeldBack held;
   if (name_.empty()) {
-    giveTemporaryName();
+    takeFreeName([&](const char *free) {
+      return linkat(AT_FDCWD, ownPath(fd_).c_str(), AT_FDCWD, free, AT_SYMLINK_FOLLOW);
+    });
   }
   if ((sync && fsync(fd_) != 0) || close(std::exchange(fd_, -1)) != 0 ||
       std::rename(name_.c_str(), target_.c_str()) != 0) {
     fail();
   }
-  leaveList();
-  name_.clear();
+  giveUpName();
   if (sync) {
-    const int directory = open(directoryOf(target_).c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
-    const bool failed = directory < 0 || fsync(directory) != 0;
-    const int cause = errno;
-    if (directory >= 0) {
-      close(directory);
-    }
-    if (failed) {
-      errno = cause;
+    fd_ = open(directoryOf(target_).c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    if (fd_ < 0 || fsync(fd_) != 0) {
       fail();
     }
   }

@@ -2,7 +2,7 @@
 #pragma once
 
 #include <string>
-#include <sys/types.h>
+#include <sys/stat.h>
 
 namespace nls2::tool {
 
@@ -17,28 +17,27 @@ public:
   TemporaryFile &operator=(const TemporaryFile &) = delete;
 
   int fd() const { return fd_; }
+  // Gives it owner, mode, access list and extended attributes of the target, as far as that is
+  // allowed. It is never open to more users than the target. Throws Error.
+  void copyAttributes(const struct stat &target);
   // Closes it and gives it the name, in place of the file that has it now; `sync` also waits for
   // the disk. Throws Error.
   void publish(bool sync);
 
 private:
-  friend void removeTemporaryFiles();
-
-  void openNamed(mode_t mode);
-  void giveTemporaryName();
-  void enlist();
-  void leaveList();
+  template <typename Make>
+  void takeFreeName(Make make);
+  void giveUpName();
   [[noreturn]] void fail() const;
 
   const std::string target_;
   const std::string shownName_;
-  std::string name_;                        // the temporary name, while there is one
-  const char *volatile toRemove_ = nullptr; // the same, for a signal handler
-  TemporaryFile *volatile next_ = nullptr;  // in the list of those that have a name
+  std::string name_; // the temporary name, while there is one
   int fd_ = -1;
 };
 
-// Ends the process as this signal does when nobody handles it; temporary files are removed.
+// Ends the process as this signal does when nobody handles it; temporary files are removed. A signal
+// handler may call it.
 [[noreturn]] void endBySignal(int signal);
 
 } // namespace nls2::tool

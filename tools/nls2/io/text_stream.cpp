@@ -48,7 +48,7 @@ std::string TextStream::read() {
   std::array<char, chunkBytes> bytes;
   std::string text;
   while (text.empty() && !ended_) {
-    const std::size_t length = input_.read(bytes.data(), bytes.size(), -1);
+    const std::size_t length = input_.read(bytes.data(), bytes.size());
     ended_ = length == 0;
     decode(bytes.data(), length);
     text = takeText();

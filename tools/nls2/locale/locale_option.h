@@ -19,7 +19,8 @@ struct LocaleOptions {
 // " (did you mean de_DE?)" for a name that is not in the table.
 std::string localesNear(const std::string &name);
 
-std::vector<Option> localeOptions(LocaleOptions &options);
+// The two options, and after them a command's own.
+std::vector<Option> localeOptions(LocaleOptions &options, const std::vector<Option> &own);
 
 // The locale whose order of texts counts: of --locale, or of the environment (LC_ALL, LC_COLLATE,
 // LANG), which may also be another locale of a language that localeMap holds. Throws usageError

@@ -1,7 +1,6 @@
 // What `nls2 translate` is asked to do.
 #pragma once
 
-#include "convert/field_list.h"
 #include "nls2/field_types.hpp"
 
 #include <cstdint>
@@ -14,6 +13,19 @@ namespace nls2::tool {
 
 enum class OnError { stop, replace, reject };
 enum class Newline { none, lf, crlf, nel };
+
+// Which bytes of a record become a field of the output.
+struct FieldSpec {
+  enum class Kind { text, raw, hex };
+
+  std::size_t begin = 0; // the first byte in the record, from 0
+  std::size_t end = 0;   // after the last one
+  Kind kind = Kind::text;
+  int32_t from = 0;      // the code page of a text
+  std::size_t width = 0; // bytes in the output; 0: as it comes
+
+  std::size_t length() const { return end - begin; }
+};
 
 struct TranslateOptions {
   int32_t from = 0;
@@ -35,6 +47,15 @@ struct TranslateOptions {
   std::string output = "-";
   std::string rejects; // empty: none
   std::string report;  // empty: none
+
+  const char *unit() const { return recordLength == 0 ? "line" : "record"; }
 };
+
+// START-END[=KIND][:WIDTH],... for records as the options have them. Throws usageError, which quotes
+// the piece that is wrong.
+std::vector<FieldSpec> parseFields(std::string_view list, const TranslateOptions &options);
+
+// The exit code. Throws Error.
+int translateFile(const TranslateOptions &options);
 
 } // namespace nls2::tool

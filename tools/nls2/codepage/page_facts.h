@@ -1,5 +1,7 @@
-// What the library and ICU make of one code page.
+// What the library and ICU make of code pages, as text and as JSON.
 #pragma once
+
+#include "json.h"
 
 #include <cstdint>
 #include <optional>
@@ -28,12 +30,21 @@ struct NameFacts {
 struct FoundPages {
   std::vector<PageFacts> numbers; // that the name stands for, or the number given
   std::vector<NameFacts> names;   // the name given, or those that people write for the number
-  bool tablesDiffer = false;      // they open different tables of ICU's
+  bool tablesDiffer() const;      // they open different tables of ICU's
 };
 
 PageFacts describePage(int32_t number);
 
 // Throws Error where neither the library nor ICU knows what was asked for.
 FoundPages lookUpPage(const std::string &asked);
+
+std::string asText(const PageFacts &facts); // lines, each ended by a newline
+std::string asText(const FoundPages &found);
+Json asJson(const PageFacts &facts);
+Json asJson(const FoundPages &found);
+
+// The library's tables: the numbers with names, and the Windows names.
+std::string allPagesAsText();
+Json allPagesAsJson();
 
 } // namespace nls2::tool
