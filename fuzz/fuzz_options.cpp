@@ -2,7 +2,7 @@
 
 #include "checks.h"
 #include "commands.h"
-#include "convert/field_list.h"
+#include "convert/translate.h"
 
 #include <getopt.h>
 #include <vector>
@@ -13,15 +13,18 @@ using fuzz::check;
 using namespace nls2::tool;
 
 void fieldList(FuzzedDataProvider &input) {
-  const auto length = input.ConsumeIntegralInRange<size_t>(1, 200);
-  const bool csv = input.ConsumeBool();
+  TranslateOptions options;
+  options.from = 37;
+  options.recordLength = input.ConsumeIntegralInRange<size_t>(1, 200);
+  options.csv = input.ConsumeBool();
   const std::string list = input.ConsumeRemainingBytesAsString();
   try {
-    const std::vector<FieldSpec> fields = parseFields(list, length, 37, csv);
+    const std::vector<FieldSpec> fields = parseFields(list, options);
     check(!fields.empty(), "a list that parses has a field");
     for (const FieldSpec &field : fields) {
-      check(field.begin < field.end && field.end <= length, "a field lies in the record");
-      check(!csv || field.kind != FieldSpec::Kind::raw, "no raw bytes in CSV");
+      check(field.begin < field.end && field.end <= options.recordLength,
+            "a field lies in the record");
+      check(!options.csv || field.kind != FieldSpec::Kind::raw, "no raw bytes in CSV");
     }
   } catch (const Error &refused) {
     check(refused.code() == exitUsage && refused.what()[0] != '\0', "a usage error with a message");

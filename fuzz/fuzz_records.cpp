@@ -4,7 +4,7 @@
 #include "checks.h"
 #include "convert/record_reader.h"
 #include "errors.h"
-#include "text/line_reader.h"
+#include "text/lines.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
@@ -33,7 +33,7 @@ private:
 
 void checkBatches(const TranslateOptions &options, const std::string &bytes, const File &file) {
   InputFile input(file.path());
-  RecordReader reader(input, options, -1);
+  RecordReader reader(input, options);
   std::string read;
   size_t expectedBefore = 0;
   for (;;) {
@@ -56,15 +56,15 @@ void checkBatches(const TranslateOptions &options, const std::string &bytes, con
   check(read == bytes, "all is read, once");
 }
 
-void checkLines(const LineFormat &format, const std::string &bytes, const File &file) {
-  LineReader reader(file.path(), format);
+void checkLines(size_t recordLength, int32_t page, const std::string &bytes, const File &file) {
+  const std::string terminator = recordLength == 0 ? lineTerminator(page) : "";
+  LineReader reader(file.path(), terminator, recordLength);
   std::string read;
-  std::string_view line;
-  while (reader.next(line)) {
-    check(format.recordLength == 0 || line.size() == format.recordLength, "a whole record");
-    read.append(line).append(format.terminator);
+  while (const auto line = reader.next()) {
+    check(recordLength == 0 || line->size() == recordLength, "a whole record");
+    read.append(*line).append(terminator);
   }
-  check(read == bytes || read == bytes + format.terminator, "all lines are read, once");
+  check(read == bytes || read == bytes + terminator, "all lines are read, once");
 }
 
 } // namespace
@@ -82,12 +82,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
     check(refused.code() != 0, "an error with a code");
   }
   try {
-    LineFormat format;
-    if (options.recordLength == 0) {
-      format.terminator = lineTerminator(options.from);
-    }
-    format.recordLength = options.recordLength;
-    checkLines(format, bytes, file);
+    checkLines(options.recordLength, options.from, bytes, file);
   } catch (const Error &refused) {
     check(refused.code() != 0, "an error with a code");
   }
