@@ -263,7 +263,7 @@ TEST(FieldTranslator, MakersReportWhatDoesNotOpen) {
   EXPECT_THROW(field_translator(code_page(57364), code_page(1208)), nls2::error);
 }
 
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) && !defined(FOREIGN_HEAP)
 TEST(FieldTranslator, AllocatesNothingAfterItIsMade) {
   const std::string field(1000, '\x40');
   std::vector<char> out(4000);
@@ -284,7 +284,7 @@ TEST(FieldTranslator, AllocatesNothingAfterItIsMade) {
 
 } // namespace
 
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) && !defined(FOREIGN_HEAP)
 // NOLINTNEXTLINE(bugprone-reserved-identifier,readability-identifier-naming)
 extern "C" void *__libc_malloc(std::size_t size) noexcept;
 

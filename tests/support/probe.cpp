@@ -152,7 +152,7 @@ extern "C" const char *ucnv_getDefaultName() {
   return support::textOrNull(name);
 }
 
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) && !defined(FOREIGN_HEAP)
 #define HEAP extern "C" __attribute__((visibility("default")))
 // Under their other names: dlsym may allocate itself.
 // NOLINTBEGIN(bugprone-reserved-identifier,readability-identifier-naming)

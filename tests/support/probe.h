@@ -11,8 +11,8 @@
 
 namespace support {
 
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
-constexpr bool heapIsOurs = false; // a sanitizer brings its own heap, which stays in place
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__) || defined(FOREIGN_HEAP)
+constexpr bool heapIsOurs = false; // a sanitizer or Valgrind brings its own
 #else
 constexpr bool heapIsOurs = true;
 #endif

@@ -202,8 +202,8 @@ private:
       return;
     }
     result = field_examiner(from(), to(), field).examine(text, room);
-    if (result) { // cannot be: the same units failed before
-      result = failed_field(field_problem::no_memory);
+    if (result) { // SCSU may take a byte less when it is measured whole
+      result = failed_field(field_problem::no_room, room + 1);
     }
   }
 

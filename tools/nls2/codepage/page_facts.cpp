@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <new>
 #include <set>
 
 namespace nls2::tool {
@@ -95,6 +96,9 @@ PageFacts describePage(int32_t number) {
   facts.converter = converterOf(number);
   int32_t twoNull = 0;
   const nls2::converter converter(NLS2_MapCodepageIdToName(number, &twoNull, &facts.status));
+  if (facts.status == U_MEMORY_ALLOCATION_ERROR) {
+    throw std::bad_alloc(); // a page that would open must not be called one that does not
+  }
   facts.hasTwoNulls = twoNull != 0;
   facts.opens = static_cast<bool>(converter);
   facts.ccsid = facts.converter ? ccsidOf(*facts.converter) : std::nullopt;

@@ -11,7 +11,6 @@
 #include <exception>
 #include <mutex>
 #include <optional>
-#include <system_error>
 #include <thread>
 #include <vector>
 
@@ -40,7 +39,7 @@ public:
       while (threads.size() < workers_) {
         threads.emplace_back([this] { readAndWork(); });
       }
-    } catch (const std::system_error &) { // fewer than wanted will do
+    } catch (const std::exception &) { // fewer threads than wanted will do, and none too
     }
     threads.empty() ? runAlone() : writeAll();
   }

@@ -1,4 +1,4 @@
-// What keeps a record from being translated, where it is, and how that and a whole run are reported.
+// What keeps a record from being translated, and how that and a whole run are reported.
 #pragma once
 
 #include "convert/translate.h"

@@ -50,12 +50,12 @@ struct RecordBatch {
   void forEach(Use use) const {
     std::string_view rest = bytes.bytes().substr(begin);
     for (std::size_t i = 0; !rest.empty(); ++i) {
-      const std::size_t length = std::min(recordLength, rest.size());
-      const LineBounds bounds = recordLength == 0 ? lines[i] : LineBounds{length, length};
-      if (!use(rest.substr(0, bounds.text), rest.substr(0, bounds.end))) {
+      const std::string_view whole =
+          rest.substr(0, recordLength != 0 ? recordLength : lines[i].end);
+      if (!use(recordLength != 0 ? whole : rest.substr(0, lines[i].text), whole)) {
         return;
       }
-      rest.remove_prefix(bounds.end);
+      rest.remove_prefix(whole.size());
     }
   }
 };

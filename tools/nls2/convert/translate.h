@@ -51,8 +51,8 @@ struct TranslateOptions {
   const char *unit() const { return recordLength == 0 ? "line" : "record"; }
 };
 
-// START-END[=KIND][:WIDTH],... for records as the options have them. Throws usageError, which quotes
-// the piece that is wrong.
+// START-END[=KIND][:WIDTH],... for records as the options have them. Throws usageError, which
+// quotes the piece that is wrong.
 std::vector<FieldSpec> parseFields(std::string_view list, const TranslateOptions &options);
 
 // The exit code. Throws Error.

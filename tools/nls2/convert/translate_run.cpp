@@ -53,6 +53,14 @@ std::optional<uint64_t> bytesToRead(const InputFile &input, const TranslateOptio
   return std::min(records - skipped, options.count) * options.recordLength;
 }
 
+std::optional<Problem> shortRecord(std::size_t length, std::size_t wanted) {
+  Problem problem;
+  problem.kind = ProblemKind::shortRecord;
+  problem.found.needed = length;
+  problem.limit = wanted;
+  return problem;
+}
+
 // The steps of the pipeline, and the files; those that are not wanted are null.
 class TranslateRun {
 public:
@@ -131,15 +139,9 @@ void TranslateRun::work(RecordTranslator &worker, Piece &piece) const {
 bool TranslateRun::translate(RecordTranslator &worker, std::string_view record,
                              std::string_view whole, Piece &piece) const {
   std::size_t replaced = 0;
-  std::optional<Problem> problem;
-  if (record.size() < options_.recordLength) {
-    problem.emplace();
-    problem->kind = ProblemKind::shortRecord;
-    problem->found.needed = record.size();
-    problem->limit = options_.recordLength;
-  } else {
-    problem = worker.translate(record, piece.output, replaced);
-  }
+  const auto problem = record.size() < options_.recordLength
+                           ? shortRecord(record.size(), options_.recordLength)
+                           : worker.translate(record, piece.output, replaced);
   if (problem && !refuse(*problem, whole, piece)) {
     return false;
   }

@@ -36,8 +36,8 @@ private:
   int fd_ = -1;
 };
 
-// Ends the process as this signal does when nobody handles it; temporary files are removed. A signal
-// handler may call it.
+// Ends the process as this signal does when nobody handles it; temporary files are removed. Safe in
+// a signal handler.
 [[noreturn]] void endBySignal(int signal);
 
 } // namespace nls2::tool

@@ -1,0 +1,132 @@
+// Eight threads call every function, on one shared object and on objects of their own, while others
+// make, validate and release objects: stress SECONDS [cancel]
+//
+// With "cancel" the threads are cancelled at random, as pthread_cancel does it by default, and new
+// ones take their places. The program is meant for the thread sanitizer.
+
+#include "calls.h"
+
+#include <array>
+#include <atomic>
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+#include <pthread.h>
+#include <random>
+#include <vector>
+
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+constexpr uint32_t german = 0x01140002;
+constexpr int threadCount = 8;
+
+std::atomic<bool> stop{false};
+std::atomic<long> callsMade{0};
+std::atomic<long> wrong{0};
+NLS2_Locale *shared = nullptr;
+std::vector<proof::Outcome> expected;
+
+NLS2_Locale *make() {
+  int32_t status = 0;
+  return NLS2_GetLocale(german, 819, 0, &status);
+}
+
+void expect(bool holds, const char *what) {
+  if (!holds && wrong++ == 0) {
+    std::fprintf(stderr, "stress: does not hold: %s\n", what);
+  }
+}
+
+// Every function, with the outcome that it had when it was alone.
+void callAll(const NLS2_Locale *in) {
+  for (size_t i = 0; i < proof::calls().size(); ++i) {
+    const proof::Call &call = proof::calls()[i];
+    expect(call.make(in) == expected[i], call.function);
+    ++callsMade;
+  }
+}
+
+// Makes objects and gives them back in another order, asking about them in between.
+void churn() {
+  std::array<NLS2_Locale *, 5> objects = {};
+  for (NLS2_Locale *&object : objects) {
+    object = make();
+  }
+  for (const size_t i : {2, 0, 4, 1, 3}) {
+    expect(NLS2_ValidateLocale(objects[i]) == 0, "a live object is valid");
+    expect(NLS2_ValidateLocale(shared) == 0, "the shared object is valid");
+    expect(NLS2_ReleaseLocale(objects[i]) == 0, "a live object is released");
+    NLS2_ValidateLocale(objects[i]);
+    callsMade += 4;
+  }
+}
+
+extern "C" void removeFileOf(void * /*unused*/) { proof::removeFiles(); }
+
+extern "C" void *work(void *argument) {
+  const bool owner = argument != nullptr;
+  proof::prepareFiles();
+  pthread_cleanup_push(removeFileOf, nullptr);
+  while (!stop) {
+    if (owner) {
+      churn();
+      NLS2_Locale *own = make();
+      callAll(own);
+      NLS2_ReleaseLocale(own);
+    } else {
+      callAll(shared);
+    }
+    pthread_testcancel();
+  }
+  pthread_cleanup_pop(1);
+  return nullptr;
+}
+
+pthread_t start(int number) {
+  pthread_t thread;
+  if (pthread_create(&thread, nullptr, work, number % 2 == 0 ? shared : nullptr) != 0) {
+    std::perror("stress: pthread_create");
+    std::exit(1);
+  }
+  return thread;
+}
+
+} // namespace
+
+int main(int argc, char **argv) {
+  const auto end = Clock::now() + std::chrono::seconds(argc > 1 ? std::atoi(argv[1]) : 10);
+  const bool cancelling = argc > 2 && std::strcmp(argv[2], "cancel") == 0;
+  shared = make();
+  proof::prepareFiles();
+  for (const proof::Call &call : proof::calls()) {
+    expected.push_back(call.make(shared));
+  }
+  std::array<pthread_t, threadCount> threads = {};
+  for (int i = 0; i < threadCount; ++i) {
+    threads[static_cast<size_t>(i)] = start(i);
+  }
+  std::mt19937 random(1);
+  long cancelled = 0;
+  while (Clock::now() < end) {
+    const timespec pause = {0, 20'000'000};
+    nanosleep(&pause, nullptr);
+    if (cancelling) {
+      const size_t i = random() % threadCount;
+      pthread_cancel(threads[i]);
+      pthread_join(threads[i], nullptr);
+      threads[i] = start(static_cast<int>(i));
+      ++cancelled;
+    }
+  }
+  stop = true;
+  for (const pthread_t thread : threads) {
+    pthread_join(thread, nullptr);
+  }
+  proof::removeFiles();
+  std::printf("stress: %ld calls in %d threads, %ld threads cancelled, %ld wrong\n",
+              callsMade.load(), threadCount, cancelled, wrong.load());
+  return wrong == 0 && callsMade > 0 ? 0 : 1;
+}
