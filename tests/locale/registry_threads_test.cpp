@@ -83,31 +83,6 @@ TEST(Registry, OwnersAndValidatorsDoNotDisturbEachOther) {
   }
 }
 
-TEST(Registry, OneObjectReleasedByTwoThreadsIsReleasedOnce) {
-  NLS2_Locale *const before = make();
-  for (int round = 0; round < 200; ++round) {
-    NLS2_Locale *const shared = make();
-    NLS2_Locale *const after = make();
-    std::atomic<int> ready{0};
-    int32_t results[2];
-    const auto release = [&](int32_t &result) {
-      for (++ready; ready < 2;) {
-      }
-      result = NLS2_ReleaseLocale(shared);
-    };
-    std::thread other([&] { release(results[1]); });
-    release(results[0]);
-    other.join();
-    for (const int32_t result : results) {
-      ASSERT_TRUE(result == 0 || result == NLS2_ERR_INVALID_PARAMETER) << result;
-    }
-    ASSERT_TRUE(results[0] == 0 || results[1] == 0);
-    ASSERT_EQ(before->pNext, after);
-    ASSERT_EQ(NLS2_ReleaseLocale(after), 0) << "the lock is free";
-  }
-  EXPECT_EQ(NLS2_ReleaseLocale(before), 0);
-}
-
 // Only what the library promises: the validating threads hold no lock of the library's or of ICU's.
 bool worksInChild() {
   alarm(60); // a child that hangs is a failure

@@ -46,15 +46,6 @@ TEST(Tables, LocalesAreTheTableWithoutTerminator) {
   EXPECT_EQ(answer("locales --json"), json + "]\n");
 }
 
-TEST(Tables, CodepagesBeginWithTheWindowsNamesAsJson) {
-  std::string json = "{\n  \"windowsNames\": [\n";
-  for (int i = 0; i < NLS2_CCSID_MAP_RECORDS - 1; ++i) {
-    json += line("    {\n      \"name\": \"%s\",\n      \"codepage\": %u\n    }%s\n",
-                 ccsidMap[i].name, ccsidMap[i].ccsid, i + 2 < NLS2_CCSID_MAP_RECORDS ? "," : "");
-  }
-  EXPECT_EQ(answer("codepages --json").substr(0, json.size()), json);
-}
-
 TEST(Tables, VersionIsTheLibrarysStamp) {
   for (const char *line : {"--version", "sort --version", "sort a --version"}) {
     EXPECT_EQ(answer(line), std::string(NLS2_BuildStamp()) + "\n");

@@ -30,10 +30,11 @@ std::string codePointText(const Problem &problem) {
 std::string notReversible(const Problem &problem) {
   const std::string what = problem.found.byte_count == 0 ? "it" : "the " + bytesText(problem);
   if (problem.cameBack < 0) {
-    return fmt::format("{} does not come back from code page {}", what, problem.page);
+    return fmt::format("not reversible: {} does not come back from code page {}", what,
+                       problem.page);
   }
-  return fmt::format("{} comes back from code page {} as {:02X}", what, problem.page,
-                     problem.cameBack);
+  return fmt::format("not reversible: {} comes back from code page {} as {:02X}", what,
+                     problem.page, problem.cameBack);
 }
 
 std::string widerAdvice(Limit limitedBy, const char *forOutLength) {
