@@ -142,7 +142,7 @@ std::string answer(const Way &way, std::size_t size) {
 // The contenders must say the same before they are timed.
 bool answersAgree() {
   for (const Way &way : ways) {
-    for (const std::size_t size : {10, 80, 1000}) {
+    for (const std::size_t size : {10U, 80U, 1000U}) {
       const std::string expected = answer<Field>(way, size);
       if (expected.empty() || answer<Icu>(way, size) != expected ||
           answer<Iconv>(way, size) != expected) {
@@ -157,7 +157,7 @@ bool answersAgree() {
 template <class Contender>
 void add(const char *contender) {
   for (const Way &way : ways) {
-    for (const std::size_t size : {10, 80, 1000}) {
+    for (const std::size_t size : {10U, 80U, 1000U}) {
       const std::string name = std::string(way.name) + "/" + contender + "/" + std::to_string(size);
       benchmark::RegisterBenchmark(name.c_str(), [&way, size](benchmark::State &state) {
         run<Contender>(state, way, size);
