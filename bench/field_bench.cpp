@@ -178,7 +178,7 @@ void *operator new(std::size_t size) {
 void operator delete(void *block) noexcept { std::free(block); }
 void operator delete(void *block, std::size_t /*size*/) noexcept { std::free(block); }
 
-int main(int argc, char **argv) {
+static int runAll(int argc, char **argv) {
   if (!answersAgree()) {
     return 1;
   }
@@ -189,3 +189,6 @@ int main(int argc, char **argv) {
   benchmark::RunSpecifiedBenchmarks();
   return 0;
 }
+
+// NOLINTNEXTLINE(bugprone-exception-escape): an exception ends the program, which is right
+int main(int argc, char **argv) { return runAll(argc, argv); }

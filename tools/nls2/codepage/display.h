@@ -34,7 +34,7 @@ inline Display displayOf(std::u16string_view text) {
   for (std::size_t i = 0; i < text.size();) {
     UChar32 character = 0;
     U16_NEXT(text.data(), i, text.size(), character);
-    const UChar32 shown = prints(character) ? character : U'.';
+    const UChar32 shown = prints(character) ? character : UChar32{'.'};
     icu::UnicodeString(shown).toUTF8String(display.text);
     display.columns += columnsOf(shown);
   }

@@ -111,7 +111,7 @@ Take number(const char *option, uint64_t &number, uint64_t least, uint64_t most)
 
 // One of the words of `kinds`, whose numbers are those of the enumerators.
 template <typename Kind, typename Target>
-Take word(const char *option, Target &target, std::vector<const char *> kinds) {
+Take word(const char *option, Target &target, const std::vector<const char *> &kinds) {
   return [=, &target](const std::string &text) {
     const auto found = std::find(kinds.begin(), kinds.end(), text);
     if (found == kinds.end()) {

@@ -110,7 +110,7 @@ std::string localeOfLanguage(const std::string &name) {
 std::string parseLocale(const std::string &text) {
   const std::optional<uint32_t> id = wholeNumber(text);
   const LocaleMapEntry *entry = id ? find_record(language_id(*id)) : nullptr;
-  const std::string known = entry != nullptr ? entry->localeName : knownLocale(text);
+  std::string known = entry != nullptr ? entry->localeName : knownLocale(text);
   if (known.empty()) {
     throw usageError("--locale: \"{}\" is not a known locale{}; `nls2 locales` lists names and "
                      "language ids",
