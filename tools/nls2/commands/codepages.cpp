@@ -99,7 +99,7 @@ std::string asText(const ByteChart &chart) {
   for (std::size_t row = 0; row < 16; ++row) {
     std::string line = fmt::format("{:X} ", row);
     for (std::size_t column = 0; column < 16; ++column) {
-      line += " " + cellOf(chart.bytes[16 * row + column]);
+      line.append(1, ' ').append(cellOf(chart.bytes[16 * row + column]));
     }
     text += line.substr(0, line.find_last_not_of(' ') + 1) + "\n";
   }

@@ -121,7 +121,7 @@ std::string answer(const Arguments &arguments) {
   }
   std::string text = asText(found.records);
   for (const int32_t page : pages) {
-    text += "\n" + asText(describePage(page));
+    text.append(1, '\n').append(asText(describePage(page)));
   }
   return text;
 }
