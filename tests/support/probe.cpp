@@ -30,7 +30,7 @@ std::atomic<int> converters{0};
 std::vector<const void *> opened;
 std::atomic<void *> blocks[16];
 
-bool replace(void *block, void *by) {
+[[maybe_unused]] bool replace(void *block, void *by) {
   return std::any_of(std::begin(blocks), std::end(blocks), [=](std::atomic<void *> &slot) {
     void *expected = block;
     return slot.compare_exchange_strong(expected, by);
