@@ -2,9 +2,8 @@
 // where it must be.
 
 #include "checks.h"
-#include "convert/record_reader.h"
 #include "errors.h"
-#include "text/lines.h"
+#include "text/record_reader.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
@@ -31,58 +30,54 @@ private:
   int fd_;
 };
 
-void checkBatches(const TranslateOptions &options, const std::string &bytes, const File &file) {
+void checkBatches(const RecordShape &shape, const std::string &bytes, const File &file) {
   InputFile input(file.path());
-  RecordReader reader(input, options);
+  RecordReader reader(input, shape);
+  RecordBatch batch;
   std::string read;
-  size_t expectedBefore = 0;
-  for (;;) {
-    RecordBatch batch;
-    if (!reader.read(batch)) {
-      break;
-    }
-    check(batch.offset == read.size(), "a batch knows where it begins");
-    check(batch.recordsBefore == expectedBefore, "and how many records were before");
-    batch.forEach([&](std::string_view record, std::string_view whole) {
-      check(whole.starts_with(record), "a line begins with its text");
-      check(options.recordLength == 0 || record.size() == options.recordLength ||
-                read.size() + whole.size() == bytes.size(),
+  uint64_t records = 0;
+  while (reader.read(batch)) {
+    while (const auto record = batch.next()) {
+      check(record->offset == read.size() && record->number == ++records, "it knows its place");
+      check(record->whole.starts_with(record->text), "a line begins with its text");
+      check(shape.length == 0 || record->text.size() == shape.length ||
+                read.size() + record->whole.size() == bytes.size(),
             "only the last record is short");
-      read += whole;
-      ++expectedBefore;
-      return true;
-    });
+      read += record->whole;
+    }
   }
   check(read == bytes, "all is read, once");
 }
 
-void checkLines(size_t recordLength, int32_t page, const std::string &bytes, const File &file) {
-  const std::string terminator = recordLength == 0 ? lineTerminator(page) : "";
-  LineReader reader(file.path(), terminator, recordLength);
+void checkFile(const RecordShape &shape, const std::string &bytes, const File &file) {
+  const std::string terminator =
+      shape.length == 0 ? lineFeedOf(CodePage(shape.page, ""), !shape.isText) : "";
+  RecordFile records(file.path(), shape);
   std::string read;
-  while (const auto line = reader.next()) {
-    check(recordLength == 0 || line->size() == recordLength, "a whole record");
-    read.append(*line).append(terminator);
+  while (const auto record = records.next()) {
+    check(shape.length == 0 || record->text.size() == shape.length, "a whole record");
+    read.append(record->text).append(terminator);
   }
-  check(read == bytes || read == bytes + terminator, "all lines are read, once");
+  check(shape.isText || read == bytes || read == bytes + terminator, "all lines are read, once");
 }
 
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   FuzzedDataProvider input(data, size);
-  TranslateOptions options;
-  options.from = fuzz::page(input).number;
-  options.recordLength = input.ConsumeIntegralInRange<size_t>(0, 40);
+  RecordShape shape;
+  shape.page = fuzz::page(input).number;
+  shape.length = input.ConsumeIntegralInRange<size_t>(0, 40);
+  shape.isText = input.ConsumeBool();
   const std::string bytes = input.ConsumeRemainingBytesAsString();
   const File file(bytes);
   try {
-    checkBatches(options, bytes, file);
+    checkBatches(shape, bytes, file);
   } catch (const Error &refused) {
     check(refused.code() != 0, "an error with a code");
   }
   try {
-    checkLines(options.recordLength, options.from, bytes, file);
+    checkFile(shape, bytes, file);
   } catch (const Error &refused) {
     check(refused.code() != 0, "an error with a code");
   }

@@ -40,6 +40,12 @@ Error usageError(fmt::format_string<Arguments...> format, Arguments &&...argumen
   return {exitUsage, fmt::format(format, std::forward<Arguments>(arguments)...)};
 }
 
+// A text that cannot be used. The message goes after the text's place: ", column 3: ..." or ": ...".
+class TextFault : public Error {
+public:
+  explicit TextFault(const std::string &text) : Error(exitFailed, text) {}
+};
+
 // Why a piece of the input cannot be used; nothing where it can.
 using Refusal = std::optional<std::string>;
 

@@ -4,7 +4,8 @@
 #include "io/output_file.h"
 #include "locale/locale_option.h"
 #include "memory.h"
-#include "text/lines.h"
+#include "text/decoder.h"
+#include "text/record_reader.h"
 
 #include <memory>
 
@@ -99,6 +100,8 @@ public:
                           static_cast<int32_t>(pattern_.size())) != nullptr;
   }
 
+  std::string lineFeed() const { return lineFeedOf(decoder_.page(), true); }
+
   // UTF-8 as the lines' code page has it.
   std::string encode(const std::string &utf8) const {
     const bool isSame = utf8.empty() || decoder_.isUtf8();
@@ -136,8 +139,7 @@ private:
 class FindRun {
 public:
   explicit FindRun(const Arguments &arguments)
-      : arguments_(arguments), search_(arguments),
-        terminator_(lineTerminator(arguments.locale.codepage)) {}
+      : arguments_(arguments), search_(arguments), terminator_(search_.lineFeed()) {}
 
   int run() {
     for (const std::string &path : inputsOf(arguments_.inputs)) {
@@ -152,39 +154,34 @@ private:
   void searchFile(const std::string &path) {
     const std::string name = (path == "-" ? "standard input" : path) + ":";
     const std::string prefix = arguments_.inputs.size() > 1 ? name : "";
-    std::optional<LineReader> reader;
-    for (;;) {
-      std::optional<std::string_view> line;
-      try {
-        line = nextMatch(reader ? *reader : reader.emplace(path, terminator_));
-      } catch (const Error &error) {
-        requireMemory(); // without it the text may be valid
-        output_.flush();
-        complain(error.what());
-        failed_ = true;
-      }
-      if (!line) {
-        return;
-      }
+    std::optional<RecordFile> file;
+    while (const auto line = nextMatch(path, file)) {
       found_ = true;
-      output_.put(search_.encode(
-          arguments_.lineNumbers ? fmt::format("{}{}:", prefix, reader->number()) : prefix));
-      output_.put(*line);
+      output_.put(search_.encode(arguments_.lineNumbers ? fmt::format("{}{}:", prefix, line->number)
+                                                        : prefix));
+      output_.put(line->text);
       output_.put(terminator_);
     }
   }
 
-  std::optional<std::string_view> nextMatch(LineReader &reader) {
-    while (const auto line = reader.next()) {
-      try {
-        if (search_.isIn(*line)) {
-          return line;
-        }
-      } catch (const TextFault &fault) {
-        reader.fail(fault.what());
+  std::optional<Record> nextMatch(const std::string &path, std::optional<RecordFile> &file) {
+    const auto isMatch = [&](std::string_view text) { return search_.isIn(text); };
+    try {
+      if (!file) {
+        file.emplace(path, RecordShape{.page = arguments_.locale.codepage, .isText = false});
       }
+      auto line = file->next();
+      while (line && !file->apply(*line, isMatch)) {
+        line = file->next();
+      }
+      return line;
+    } catch (const Error &error) {
+      requireMemory(); // without it the text may be valid
+      output_.flush();
+      complain(error.what());
+      failed_ = true;
+      return {};
     }
-    return {};
   }
 
   const Arguments &arguments_;

@@ -4,7 +4,8 @@
 #include "io/output_file.h"
 #include "io/print.h"
 #include "locale/locale_option.h"
-#include "text/lines.h"
+#include "text/decoder.h"
+#include "text/record_reader.h"
 
 #include <cstring>
 #include <endian.h>
@@ -74,6 +75,8 @@ public:
     return {key_.data(), static_cast<std::size_t>(length)};
   }
 
+  std::string lineFeed() const { return lineFeedOf(decoder_.page(), true); }
+
 private:
   Decoder decoder_;
   const bool ignoreTrailing_;
@@ -119,23 +122,18 @@ private:
   std::vector<KeyedLine> lines_;
 };
 
-void readLines(LineReader &&reader, LineOrder &order, Lines &lines) {
-  while (const auto line = reader.next()) {
-    try {
-      lines.add(*line, order.keyOf(*line));
-    } catch (const TextFault &fault) {
-      reader.fail(fault.what());
-    }
-  }
-}
-
 int sortFiles(const Arguments &arguments) {
   LineOrder order(arguments);
-  const std::string terminator =
-      arguments.recordLength == 0 ? lineTerminator(arguments.locale.codepage) : "";
+  const auto keyOf = [&](std::string_view text) { return order.keyOf(text); };
+  const std::string terminator = arguments.recordLength == 0 ? order.lineFeed() : "";
   Lines lines;
   for (const std::string &path : inputsOf(arguments.inputs)) {
-    readLines(LineReader(path, terminator, arguments.recordLength), order, lines);
+    RecordFile file(
+        path,
+        {.length = arguments.recordLength, .page = arguments.locale.codepage, .isText = false});
+    while (const auto line = file.next()) {
+      lines.add(line->text, file.apply(*line, keyOf));
+    }
   }
   OutputFile output(arguments.output);
   for (const KeyedLine &each : lines.sorted()) {
@@ -172,8 +170,8 @@ Option ignoreTrailing(Arguments &arguments) {
 Command sortCommand() {
   const auto arguments = std::make_shared<Arguments>();
   const auto takeLength = [arguments](const std::string &text) {
-    arguments->recordLength = static_cast<std::size_t>(
-        parseNumber("--record-length", text, 1, int32_t{Decoder::mostBytes}));
+    arguments->recordLength =
+        static_cast<std::size_t>(parseNumber("--record-length", text, 1, 1 << 30));
   };
   return {.operands = {{"FILE", "files to read; standard input if - or not given",
                         into(arguments->inputs), 0, Operand::anyNumber}},

@@ -1,4 +1,4 @@
-// Reading, working and writing at the same time, with the results in the order of the input.
+// The pieces of an input in several threads, with the results in the order of the input.
 //
 // Why not tbb::parallel_pipeline: here everything before a failure is written before the failure
 // comes out, a read that waits for input can be ended, the pieces in flight are limited by their
@@ -18,149 +18,109 @@ namespace nls2::tool {
 
 // `Steps` has these members, and `Piece` a weight(), its bytes after it was read:
 //   bool read(Piece &)     in turn; false at the end
-//   Worker worker()        one for each thread that works
+//   Worker worker()        one for each thread
 //   void work(Worker &, Piece &)   several at a time
-//   void write(Piece &)    in turn, in the thread that calls run()
+//   void write(Piece &)    in turn, in the order of the reads
 //   void interrupt()       ends a read() that waits for input
 template <typename Piece, typename Steps>
 class Pipeline {
 public:
-  explicit Pipeline(Steps &steps)
-      : steps_(steps), workers_(std::clamp(std::thread::hardware_concurrency(), 1U, mostWorkers)),
-        slots_(workers_ + 4) {}
+  explicit Pipeline(Steps &steps) : steps_(steps) {}
 
-  // Returns when all is written. An exception of a step ends the run when the pieces before have
-  // been written, and comes out here.
+  // Returns when all is written. The first exception of a step ends the run when the pieces before
+  // have been written, and comes out here.
   void run() {
-    std::vector<std::jthread> threads; // ended last
-    const Ending ending{*this};
+    const unsigned workers = std::clamp(std::thread::hardware_concurrency(), 1U, mostWorkers);
+    std::vector<std::jthread> threads;
     try {
-      threads.reserve(workers_);
-      while (threads.size() < workers_) {
-        threads.emplace_back([this] { readAndWork(); });
+      while (threads.size() < workers) {
+        threads.emplace_back([this] { takePieces(); });
       }
     } catch (const std::exception &) { // fewer threads than wanted will do, and none too
     }
-    threads.empty() ? runAlone() : writeAll();
+    takePieces();
+    threads.clear(); // when they have ended
+    if (error_) {
+      std::rethrow_exception(error_);
+    }
   }
 
 private:
   static constexpr unsigned mostWorkers = 8;
   static constexpr std::size_t mostWeight = std::size_t{8} << 20;
 
-  struct Slot {
+  // One piece after the other, through all of its steps.
+  void takePieces() {
     Piece piece;
-    bool done = false;
-    std::exception_ptr error;
-  };
-
-  struct Ending {
-    Pipeline &pipeline;
-
-    ~Ending() {
-      const std::lock_guard lock(pipeline.mutex_);
-      pipeline.ended_ = true;
-      pipeline.changed_.notify_all();
-      pipeline.steps_.interrupt();
-    }
-  };
-
-  void runAlone() {
-    auto worker = steps_.worker();
-    Piece &piece = slots_.front().piece;
-    while (steps_.read(piece)) {
-      steps_.work(worker, piece);
-      steps_.write(piece);
-    }
-  }
-
-  Slot &slot(std::size_t piece) { return slots_[piece % slots_.size()]; }
-
-  void readAndWork() {
     std::optional<decltype(steps_.worker())> worker;
-    while (Slot *next = readNext()) {
-      try {
-        if (!worker) {
-          worker.emplace(steps_.worker());
-        }
-        if (!next->error) {
-          steps_.work(*worker, next->piece);
-        }
-      } catch (...) {
-        next->error = std::current_exception();
-      }
-      const std::lock_guard lock(mutex_);
-      next->done = true;
-      changed_.notify_all();
+    std::exception_ptr error;
+    while (const auto number = readNext(piece, error)) {
+      attempt(error,
+              [&] { steps_.work(worker ? *worker : worker.emplace(steps_.worker()), piece); });
+      writeInTurn(*number, piece, error);
     }
   }
 
-  // Null at the end. A failed read takes a slot too, so that it comes out after the pieces before
-  // it.
-  Slot *readNext() {
-    const std::lock_guard turn(reading_);
-    if (!mayRead()) {
-      return nullptr;
-    }
-    Slot &next = slot(read_); // read_ is changed in turn only
-    bool more = false;
+  template <typename Step>
+  static void attempt(std::exception_ptr &error, Step step) {
     try {
-      more = steps_.read(next.piece);
+      if (!error) {
+        step();
+      }
     } catch (...) {
-      next.error = std::current_exception();
+      error = std::current_exception();
     }
-    const std::lock_guard lock(mutex_);
-    ended_ = ended_ || !more;
-    if (!more && !next.error) {
-      changed_.notify_all();
-      return nullptr;
-    }
-    ++read_;
-    weight_ += next.piece.weight();
-    return &next;
   }
 
-  bool mayRead() {
+  // The number of the piece; nothing at the end. A read that fails has a number too, so that its
+  // failure comes out after the pieces before it.
+  std::optional<std::size_t> readNext(Piece &piece, std::exception_ptr &error) {
+    const std::lock_guard turn(reading_);
     std::unique_lock lock(mutex_);
-    changed_.wait(lock, [&] {
-      return ended_ || read_ == written_ ||
-             (read_ - written_ < slots_.size() && weight_ < mostWeight);
-    });
-    return !ended_;
+    changed_.wait(lock, [&] { return ended_ || read_ == written_ || weight_ < mostWeight; });
+    if (ended_) {
+      return {};
+    }
+    lock.unlock();
+    bool more = false;
+    attempt(error, [&] { more = steps_.read(piece); });
+    lock.lock();
+    ended_ = ended_ || !more;
+    if (!more && !error) {
+      return {};
+    }
+    weight_ += piece.weight();
+    return read_++;
   }
 
-  void writeAll() {
-    for (;;) {
-      std::unique_lock lock(mutex_);
-      Slot &next = slot(written_);
-      changed_.wait(lock, [&] { return next.done || (ended_ && written_ == read_); });
-      if (!next.done) {
-        return;
-      }
+  // After the first failure no piece is written.
+  void writeInTurn(std::size_t number, Piece &piece, std::exception_ptr &error) {
+    std::unique_lock lock(mutex_);
+    changed_.wait(lock, [&] { return written_ == number; });
+    if (!error_) {
       lock.unlock();
-      if (next.error) {
-        std::rethrow_exception(next.error);
-      }
-      const std::size_t weight = next.piece.weight();
-      steps_.write(next.piece); // written_ is changed by this thread only
+      attempt(error, [&] { steps_.write(piece); });
       lock.lock();
-      next.done = false;
-      weight_ -= weight;
-      ++written_;
-      changed_.notify_all();
+      error_ = error;
     }
+    ++written_;
+    weight_ -= piece.weight();
+    if (error_ && !ended_) {
+      ended_ = true;
+      steps_.interrupt();
+    }
+    changed_.notify_all();
   }
 
   Steps &steps_;
-  const unsigned workers_;
-  std::vector<Slot> slots_;
   std::mutex reading_; // held by the thread whose turn it is to read
-  std::mutex mutex_;   // guards everything below, and `done` and `error` of the slots
+  std::mutex mutex_;   // guards everything below
   std::condition_variable changed_;
   std::size_t weight_ = 0;  // of the pieces in flight
   std::size_t read_ = 0;    // pieces, since the beginning
   std::size_t written_ = 0; // of these
-  bool ended_ = false;      // no further piece will be read
+  std::exception_ptr error_;
+  bool ended_ = false; // no further piece will be read
 };
 
 } // namespace nls2::tool

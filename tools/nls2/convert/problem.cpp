@@ -27,20 +27,11 @@ std::string codePointText(const Problem &problem) {
   return fmt::format("U+{:04X}", static_cast<uint32_t>(problem.found.code_point));
 }
 
-std::string notReversible(const Problem &problem) {
-  const std::string what = problem.found.byte_count == 0 ? "it" : "the " + bytesText(problem);
-  if (problem.cameBack < 0) {
-    return fmt::format("not reversible: {} does not come back from code page {}", what,
-                       problem.page);
-  }
-  return fmt::format("not reversible: {} comes back from code page {} as {:02X}", what,
-                     problem.page, problem.cameBack);
-}
-
-std::string widerAdvice(Limit limitedBy, const char *forOutLength) {
-  return std::array{
-      forOutLength, "; give the field another width",
-      "; give the field a width, or --out-length"}[static_cast<std::size_t>(limitedBy)];
+// Of a text that does not fit, by what limits it.
+std::string widthAdvice(Limit limitedBy, const char *ofOutLength) {
+  return limitedBy == Limit::outLength    ? ofOutLength
+         : limitedBy == Limit::fieldWidth ? "; give the field another width"
+                                          : "; give the field a width, or --out-length";
 }
 
 std::string counted(uint64_t count, std::string_view what) {
@@ -50,17 +41,16 @@ std::string counted(uint64_t count, std::string_view what) {
 const char *wasOrWere(uint64_t count) { return count == 1 ? "was" : "were"; }
 
 Json jsonOf(const Problem &problem) {
-  constexpr std::array kinds{"invalid bytes", "not in the page", "too long",     "null inside",
-                             "no exact fill", "not reversible",  "short record", "no memory"};
-  Json object = Json::object();
-  object.set("record", problem.record + 1);
-  object.set("byte", problem.byte);
-  object.set("column", problem.column + 1);
-  object.set("hex", problem.found.byte_count == 0 ? Json() : Json(hexOf(problem)));
-  object.set("kind", kinds[static_cast<std::size_t>(problem.kind)]);
-  object.set("code_point",
-             problem.kind == ProblemKind::notInPage ? Json(codePointText(problem)) : Json());
-  return object;
+  constexpr std::array kinds{"none",           "invalid bytes", "not in the page", "too long",
+                             "null inside",    "no exact fill", "no memory",       "too long",
+                             "not reversible", "short record"};
+  const bool hasCharacter = problem.kind == ProblemKind::notInPage;
+  return Json::object({{"record", problem.record},
+                       {"byte", problem.byte},
+                       {"column", problem.column + 1},
+                       {"hex", problem.found.byte_count == 0 ? Json() : Json(hexOf(problem))},
+                       {"kind", kinds[static_cast<std::size_t>(problem.kind)]},
+                       {"code_point", hasCharacter ? Json(codePointText(problem)) : Json()}});
 }
 
 } // namespace
@@ -77,7 +67,7 @@ void Tally::add(const Tally &later) {
 }
 
 std::string placeOf(const Problem &problem, std::string_view unit) {
-  std::string text = fmt::format("{} {} at byte {}", unit, problem.record + 1, problem.byte);
+  std::string text = fmt::format("{} {} at byte {}", unit, problem.record, problem.byte);
   if (problem.kind != ProblemKind::shortRecord) {
     text += fmt::format(", column {}", problem.column + 1);
   }
@@ -87,52 +77,45 @@ std::string placeOf(const Problem &problem, std::string_view unit) {
   return text;
 }
 
-std::string reasonOf(const Problem &problem) {
+Explanation explain(const Problem &problem) {
   constexpr std::array limits{"--out-length is", "the width is", "the field has"};
   const nls2::field_result &found = problem.found;
+  const std::string bytes = bytesText(problem);
+  const std::string in = fmt::format("code page {}", problem.page);
   switch (problem.kind) {
   case ProblemKind::invalidBytes:
-    return fmt::format("the {} {} not valid in code page {}", bytesText(problem),
-                       found.byte_count == 1 ? "is" : "are", problem.page);
+    return {
+        fmt::format("the {} {} not valid in {}", bytes, found.byte_count == 1 ? "is" : "are", in),
+        "; is --from right? --on-error replace puts a substitution character"};
   case ProblemKind::notInPage:
-    return fmt::format("the character {}{} is not in code page {}", codePointText(problem),
-                       found.byte_count > 0 ? " (" + bytesText(problem) + ")" : "", problem.page);
+    return {fmt::format("the character {}{} is not in {}", codePointText(problem),
+                        found.byte_count > 0 ? " (" + bytes + ")" : "", in),
+            "; --on-error replace puts its substitution character"};
   case ProblemKind::tooLong:
-    return fmt::format("the text takes {} bytes, but {} {}", found.needed,
-                       limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit);
+    return {fmt::format("the text takes {} bytes, but {} {}", found.needed,
+                        limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit),
+            widthAdvice(problem.limitedBy, "; give a larger --out-length")};
   case ProblemKind::nullInside:
-    return "a null (U+0000) is inside the text, where --strip, --fill and --keep-blanks would cut "
-           "it";
+    return {
+        "a null (U+0000) is inside the text, where --strip, --fill and --keep-blanks would cut it",
+        "; leave the option out, or replace the nulls"};
   case ProblemKind::noExactFill:
-    return fmt::format("filled with blanks it can be {} bytes long, but not {}", found.needed,
-                       problem.limit);
+    return {fmt::format("filled with blanks it can be {} bytes long, but not {}", found.needed,
+                        problem.limit),
+            widthAdvice(problem.limitedBy, "; give another --out-length")};
   case ProblemKind::notReversible:
-    return notReversible(problem);
+    return {fmt::format("not reversible: {} {} from {}{}",
+                        found.byte_count == 0 ? "it" : "the " + bytes,
+                        problem.cameBack < 0 ? "does not come back" : "comes back", in,
+                        problem.cameBack < 0 ? "" : fmt::format(" as {:02X}", problem.cameBack)),
+            ""};
   case ProblemKind::shortRecord:
-    return fmt::format("the input ends after {} of {} bytes", found.needed, problem.limit);
+    return {fmt::format("the input ends after {} of {} bytes", found.needed, problem.limit),
+            fmt::format("; is --record-length {} right?", problem.limit)};
+  case ProblemKind::beyondLimit:
+    return {"the field has more than 1 GiB", ""};
   default:
-    return "out of memory";
-  }
-}
-
-std::string adviceOn(const Problem &problem) {
-  switch (problem.kind) {
-  case ProblemKind::invalidBytes:
-    return "; is --from right? --on-error replace puts a substitution character";
-  case ProblemKind::notInPage:
-    return "; --on-error replace puts its substitution character";
-  case ProblemKind::tooLong:
-    return widerAdvice(problem.limitedBy, "; give a larger --out-length");
-  case ProblemKind::nullInside:
-    return "; leave the option out, or replace the nulls";
-  case ProblemKind::noExactFill:
-    return widerAdvice(problem.limitedBy, "; give another --out-length");
-  case ProblemKind::shortRecord:
-    return fmt::format("; is --record-length {} right?", problem.limit);
-  case ProblemKind::noMemory:
-    return "; is the record length right?";
-  default:
-    return "";
+    return {"out of memory", "; is the record length right?"};
   }
 }
 
@@ -140,7 +123,7 @@ std::string summaryOf(const Tally &tally, std::string_view unit) {
   if (!tally.first) {
     return "";
   }
-  const std::string first = placeOf(*tally.first, unit) + ": " + reasonOf(*tally.first);
+  const std::string first = placeOf(*tally.first, unit) + ": " + explain(*tally.first).reason;
   if (tally.rejected > 0) {
     return fmt::format("{} {} rejected, the first is {}", counted(tally.rejected, unit),
                        wasOrWere(tally.rejected), first);
@@ -150,18 +133,17 @@ std::string summaryOf(const Tally &tally, std::string_view unit) {
 }
 
 std::string reportOf(const Tally &tally, const TranslateOptions &options, double seconds) {
-  Json object = Json::object();
-  object.set("records", tally.records);
-  object.set("rejected", tally.rejected);
-  object.set("replaced", tally.replaced);
-  object.set("bytes_in", tally.bytesIn);
-  object.set("bytes_out", tally.bytesOut);
-  object.set("seconds", seconds);
-  object.set("from", options.from);
-  object.set("to", options.to);
   const auto &first = tally.first ? tally.first : tally.failure;
-  object.set("first_problem", first ? jsonOf(*first) : Json());
-  return object.text();
+  return Json::object({{"records", tally.records},
+                       {"rejected", tally.rejected},
+                       {"replaced", tally.replaced},
+                       {"bytes_in", tally.bytesIn},
+                       {"bytes_out", tally.bytesOut},
+                       {"seconds", seconds},
+                       {"from", options.from},
+                       {"to", options.to},
+                       {"first_problem", first ? jsonOf(*first) : Json()}})
+      .text();
 }
 
 } // namespace nls2::tool

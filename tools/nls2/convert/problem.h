@@ -8,15 +8,18 @@
 
 namespace nls2::tool {
 
+// Those of nls2::field_problem come first, with its numbers.
 enum class ProblemKind {
+  none,
   invalidBytes,
   notInPage,
   tooLong,
   nullInside,
   noExactFill,
+  noMemory,
+  beyondLimit,
   notReversible,
-  shortRecord,
-  noMemory
+  shortRecord
 };
 
 // What a text had to fit in.
@@ -24,7 +27,7 @@ enum class Limit { outLength, fieldWidth, ownLength };
 
 struct Problem {
   ProblemKind kind = ProblemKind::invalidBytes;
-  uint64_t record = 0;      // before it in the input
+  uint64_t record = 0;      // its number, from 1
   uint64_t byte = 0;        // the record's offset in the input
   std::size_t column = 0;   // the offset in the record
   std::size_t field = 0;    // of --fields, from 1; 0 without it
@@ -52,11 +55,12 @@ struct Tally {
 // "record 3 at byte 160, column 5, field 2"; `unit` is "record" or "line".
 std::string placeOf(const Problem &problem, std::string_view unit);
 
-// "the character U+0416 (bytes D0 96) is not in code page 37"
-std::string reasonOf(const Problem &problem);
+struct Explanation {
+  std::string reason; // "the character U+0416 (bytes D0 96) is not in code page 37"
+  std::string advice; // what would help, after a semicolon; empty where nothing is known to
+};
 
-// What would help, after a semicolon; empty where nothing is known to.
-std::string adviceOn(const Problem &problem);
+Explanation explain(const Problem &problem);
 
 // What became of the characters and records that were replaced or rejected; empty where none was.
 std::string summaryOf(const Tally &tally, std::string_view unit);

@@ -48,23 +48,6 @@ void quoteForCsv(ByteBuffer &out, std::size_t length) {
   out.append(quoted + '"');
 }
 
-ProblemKind kindOf(nls2::field_problem problem) {
-  switch (problem) {
-  case nls2::field_problem::invalid_bytes:
-    return ProblemKind::invalidBytes;
-  case nls2::field_problem::not_in_page:
-    return ProblemKind::notInPage;
-  case nls2::field_problem::embedded_null:
-    return ProblemKind::nullInside;
-  case nls2::field_problem::no_exact_fill:
-    return ProblemKind::noExactFill;
-  case nls2::field_problem::no_room:
-    return ProblemKind::tooLong;
-  default:
-    return ProblemKind::noMemory;
-  }
-}
-
 // As it is after a record's text, without a signature. Pages that change their mode for U+0085 have
 // no bytes that always mean it. Where nothing else is asked for, records are not ended and lines
 // are, unless they are filled.
@@ -158,7 +141,7 @@ Problem OutputField::newProblem(ProblemKind kind) const {
 }
 
 Problem OutputField::describe(const nls2::field_result &failed) const {
-  Problem problem = newProblem(kindOf(failed.problem));
+  Problem problem = newProblem(static_cast<ProblemKind>(failed.problem));
   problem.found = failed;
   if (problem.kind == ProblemKind::invalidBytes) {
     problem.page = spec_.from;
@@ -223,6 +206,13 @@ RecordTranslator::RecordTranslator(const TranslateOptions &options) : options_(&
 
 std::optional<Problem> RecordTranslator::translate(std::string_view record, ByteBuffer &out,
                                                    std::size_t &replaced) {
+  if (record.size() < options_->recordLength) {
+    Problem problem;
+    problem.kind = ProblemKind::shortRecord;
+    problem.found.needed = record.size();
+    problem.limit = options_->recordLength;
+    return problem;
+  }
   const std::size_t before = out.size();
   for (OutputField &field : fields_) {
     if (options_->csv && &field != fields_.data()) {

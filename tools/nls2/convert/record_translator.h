@@ -1,8 +1,8 @@
 // One record from one code page to another, shaped as the options say.
 #pragma once
 
-#include "convert/byte_buffer.h"
 #include "convert/problem.h"
+#include "io/byte_buffer.h"
 #include "nls2/field_translator.hpp"
 
 #include <optional>

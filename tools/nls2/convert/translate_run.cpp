@@ -2,11 +2,11 @@
 
 #include "convert/pipeline.h"
 #include "convert/progress.h"
-#include "convert/record_reader.h"
 #include "convert/record_translator.h"
 #include "errors.h"
 #include "io/input_file.h"
 #include "io/output_file.h"
+#include "text/record_reader.h"
 
 #include <memory>
 
@@ -22,7 +22,7 @@ struct Piece {
   ByteBuffer rejects;
   Tally tally;
 
-  std::size_t weight() const { return batch.bytes.size(); }
+  std::size_t weight() const { return batch.size(); }
 };
 
 // Two descriptors of one regular file. What is read would be lost, or grow without end, where it is
@@ -53,12 +53,23 @@ std::optional<uint64_t> bytesToRead(const InputFile &input, const TranslateOptio
   return std::min(records - skipped, options.count) * options.recordLength;
 }
 
-std::optional<Problem> shortRecord(std::size_t length, std::size_t wanted) {
-  Problem problem;
-  problem.kind = ProblemKind::shortRecord;
-  problem.found.needed = length;
-  problem.limit = wanted;
-  return problem;
+// The bytes that a record takes in the output at the least, where it is filled.
+std::size_t filledLength(const TranslateOptions &options) {
+  const std::size_t filled = options.padding == nls2::padding::fill ? options.outLength : 0;
+  std::size_t length = options.fields.empty() ? filled : 0;
+  for (const FieldSpec &field : options.fields) {
+    length += field.width != 0 ? field.width : filled;
+  }
+  return length;
+}
+
+// Batches are small enough for their output to be small too.
+RecordShape shapeOf(const TranslateOptions &options) {
+  return {.length = options.recordLength,
+          .page = options.from,
+          .skip = options.skip,
+          .count = options.count,
+          .mostInBatch = std::max<uint64_t>(usualOutput / (filledLength(options) + 1), 1)};
 }
 
 // The steps of the pipeline, and the files; those that are not wanted are null.
@@ -67,7 +78,7 @@ public:
   TranslateRun(const TranslateOptions &options, const RecordTranslator &translator, Tally &tally)
       : options_(options), translator_(translator), tally_(tally), input_(options.input),
         output_(openOutput(options.dryRun ? "" : options.output, &input_)),
-        rejects_(openOutput(options.rejects, &input_)), reader_(input_, options),
+        rejects_(openOutput(options.rejects, &input_)), reader_(input_, shapeOf(options)),
         progress_(options.progress, bytesToRead(input_, options)) {}
 
   void run();
@@ -79,10 +90,7 @@ public:
   void interrupt() { input_.interrupt(); }
 
 private:
-  bool translate(RecordTranslator &worker, std::string_view record, std::string_view whole,
-                 Piece &piece) const;
-  bool refuse(Problem problem, std::string_view whole, Piece &piece) const;
-  static void place(Problem &problem, const Piece &piece);
+  bool translate(RecordTranslator &worker, const Record &record, Piece &piece) const;
   void summarize();
 
   const TranslateOptions &options_;
@@ -129,53 +137,42 @@ void TranslateRun::work(RecordTranslator &worker, Piece &piece) const {
   if (piece.batch.size() > usualOutput) {
     passing.emplace(translator_);
   }
-  piece.batch.forEach([&](std::string_view record, std::string_view whole) {
-    return translate(passing ? *passing : worker, record, whole, piece);
-  });
+  bool goesOn = true;
+  for (auto record = piece.batch.next(); record && goesOn; record = piece.batch.next()) {
+    goesOn = translate(passing ? *passing : worker, *record, piece);
+  }
   piece.tally.bytesOut = piece.output.size();
 }
 
 // False ends the piece, and the run.
-bool TranslateRun::translate(RecordTranslator &worker, std::string_view record,
-                             std::string_view whole, Piece &piece) const {
+bool TranslateRun::translate(RecordTranslator &worker, const Record &record, Piece &piece) const {
+  Tally &tally = piece.tally;
   std::size_t replaced = 0;
-  const auto problem = record.size() < options_.recordLength
-                           ? shortRecord(record.size(), options_.recordLength)
-                           : worker.translate(record, piece.output, replaced);
-  if (problem && !refuse(*problem, whole, piece)) {
-    return false;
+  std::optional<Problem> problem = worker.translate(record.text, piece.output, replaced);
+  const bool isRefused = problem.has_value();
+  if (replaced > 0 && !tally.first) {
+    problem = worker.firstReplaced(record.text);
   }
-  if (!problem && replaced > 0) {
-    if (!piece.tally.first) {
-      piece.tally.first = worker.firstReplaced(record);
-      place(*piece.tally.first, piece);
+  if (problem) {
+    problem->record = record.number;
+    problem->byte = record.offset;
+    const bool isRejected =
+        options_.onError == OnError::reject && problem->kind != ProblemKind::noMemory;
+    if (isRefused && !isRejected) {
+      tally.failure = problem;
+      return false;
     }
-    piece.tally.replaced += replaced;
-    ++piece.tally.replacedRecords;
+    tally.first = tally.first ? tally.first : problem;
   }
-  ++piece.tally.records;
-  piece.tally.bytesIn += whole.size();
+  if (isRefused) {
+    piece.rejects.append(record.whole);
+    ++tally.rejected;
+  }
+  tally.replaced += replaced;
+  tally.replacedRecords += replaced > 0 ? 1 : 0;
+  ++tally.records;
+  tally.bytesIn += record.whole.size();
   return true;
-}
-
-bool TranslateRun::refuse(Problem problem, std::string_view whole, Piece &piece) const {
-  place(problem, piece);
-  if (options_.onError != OnError::reject || problem.kind == ProblemKind::noMemory) {
-    piece.tally.failure = problem;
-    return false;
-  }
-  if (!piece.tally.first) {
-    piece.tally.first = problem;
-  }
-  piece.rejects.append(whole);
-  ++piece.tally.rejected;
-  return true;
-}
-
-// Of the record that comes after those counted in the piece.
-void TranslateRun::place(Problem &problem, const Piece &piece) {
-  problem.record = piece.batch.recordsBefore + piece.tally.records;
-  problem.byte = piece.batch.offset + piece.tally.bytesIn;
 }
 
 void TranslateRun::write(Piece &piece) {
@@ -188,8 +185,9 @@ void TranslateRun::write(Piece &piece) {
   tally_.add(piece.tally);
   progress_.update(tally_.bytesIn);
   if (const auto &problem = piece.tally.failure) {
-    throw failure("{}: {}: {}{}", input_.name(), placeOf(*problem, options_.unit()),
-                  reasonOf(*problem), adviceOn(*problem));
+    const auto [reason, advice] = explain(*problem);
+    throw failure("{}: {}: {}{}", input_.name(), placeOf(*problem, options_.unit()), reason,
+                  advice);
   }
   piece.output.clear(usualOutput);
 }
