@@ -91,10 +91,10 @@ void runCase(const support::Case &each) {
   for (const CaseLine &line : each.lines) {
     run.read(line);
   }
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__) || defined(EMULATED)
   if (run.shell.find("$FAULTS") != std::string::npos ||
       run.shell.find("ulimit -v") != std::string::npos) {
-    return; // a sanitizer's runtime must be the first library, and takes much address space
+    return; // a sanitizer or an emulator must come first, and takes much address space
   }
 #endif
   ASSERT_TRUE(run.out.empty() || run.has.empty()) << "out and has exclude each other";
