@@ -28,7 +28,8 @@ TEST(Errors, MessagesAreWordsAndTheNameOfTheStatus) {
   for (int status = -128; status <= 0x10300; ++status) {
     const std::string message = nls2::category().message(status);
     const std::string name = u_errorName(static_cast<UErrorCode>(status));
-    EXPECT_TRUE(message.ends_with(" (" + name + ")") || name.starts_with('[')) << message;
+    EXPECT_TRUE(message.ends_with(std::string(" (").append(name) + ")") || name.starts_with('['))
+        << message;
     EXPECT_TRUE(!known.contains(status) || message == known.at(status)) << message;
     EXPECT_EQ(message.starts_with("an error"), status > 40 && !name.starts_with('[')) << message;
   }
