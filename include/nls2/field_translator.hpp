@@ -11,7 +11,7 @@
 // opens nor allocates anything. What it says is exact: lengths are bytes, a shift state is closed
 // and counted, a page with a signature writes one a field, and what is a null is asked of the text,
 // not of its bytes. With padding as_is and on_bad::replace the bytes are those of
-// NLS2_TranslateString with options 0.
+// NLS2_TranslateString with options 0, unless drop_ignorable is false.
 #ifndef NLS2_FIELD_TRANSLATOR_HPP
 #define NLS2_FIELD_TRANSLATOR_HPP
 
@@ -149,7 +149,9 @@ private:
   }
 
   void learn_table(std::error_code &error) noexcept {
-    detail::field_path teacher(from_, to_, {.bad = on_bad::replace}, error);
+    const bool drops = policy().drop_ignorable;
+    detail::field_path teacher(from_, to_, {.bad = on_bad::replace, .drop_ignorable = drops},
+                               error);
     state_->has_table = !error && state_->table.build(teacher);
   }
 

@@ -30,6 +30,10 @@ struct field_policy {
   nls2::padding padding = nls2::padding::as_is;
   std::size_t width = 0; // bytes: of a filled field; of others the most, 0 for no limit
   on_bad bad = on_bad::stop;
+  // Under replace, what becomes of characters that are ignorable by default (U+00AD, U+200B ...) and
+  // that the destination page lacks: true drops them, as ICU and NLS2_TranslateString do; false puts
+  // a substitution character for them too. Both count them.
+  bool drop_ignorable = true;
   bool use_table = true; // false: always through ICU. The results are the same, only slower
 };
 

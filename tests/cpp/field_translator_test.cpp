@@ -212,6 +212,7 @@ TEST(FieldTranslator, TextThatFillsItsRoomToTheLastByteIsWhole) {
 TEST(FieldTranslator, SaysWhatFailedAndWhere) {
   constexpr field_policy strip{.padding = padding::strip};
   constexpr field_policy replace{.bad = on_bad::replace};
+  constexpr field_policy mark{.bad = on_bad::replace, .drop_ignorable = false};
   constexpr field_policy fill{.padding = padding::fill, .width = 5};
   const struct {
     const char *reason;
@@ -227,6 +228,11 @@ TEST(FieldTranslator, SaysWhatFailedAndWhere) {
       {"one of two units", 1208, 37, strip, "\xF0\x9F\x98\x80", 9, "2 0 0 0 U+1f600 | f0 9f 98 80 |"},
       {"one that ICU would drop", 1208, 37, {}, "A\xE2\x80\x8B", 9, "2 0 1 0 U+200b | e2 80 8b |"},
       {"which counts as replaced", 1208, 37, replace, "A\xE2\x80\x8B", 9, "0 1 0 0 U+0 | | c1"},
+      {"and is, if asked", 1208, 37, mark, "A\xE2\x80\x8B", 9, "0 1 0 0 U+0 | | c1 3f"},
+      {"also by the table", 37, 437, mark, "\xC1\xCA", 9, "0 1 0 0 U+0 | | 41 7f"},
+      {"one of two units, which two pieces share", 1208, 37, {}, std::string(63, '0') + "\xF0\x9F\x98\x80zz", 99, "2 0 63 0 U+1f600 | f0 9f 98 80 |"},
+      {"half a pair", 57370, 1208, {}, "A\xED\xA0\x80\x42", 9, "2 0 1 0 U+d800 | ed a0 80 |"},
+      {"half a pair at the end", 57370, 1208, {}, "\xED\xA0\x80", 9, "2 0 0 0 U+d800 | ed a0 80 |"},
       {"invalid, with a U+FFFD that is lacking: once", 1208, 37, replace, "\xFFy", 9, "0 1 0 0 U+0 | | 3f a8"},
       {"no room", 37, 1208, {}, "\xC1\x43\xC2", 3, "3 0 2 4 U+0 | c2 |"},
       {"no room to shift back", 1208, 930, {}, "\xE6\x97\xA5", 3, "3 0 3 4 U+0 | |"},

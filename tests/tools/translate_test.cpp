@@ -11,6 +11,7 @@
 #include <sstream>
 #include <unicode/uchar.h>
 #include <unicode/ucnv.h>
+#include <unicode/ucnv_cb.h>
 #include <unicode/utf16.h>
 
 namespace tools {
@@ -31,9 +32,16 @@ enum class OnError { stop, replace, reject };
 using namespace std::string_literals;
 using Bytes = std::optional<std::string>; // nothing: refused
 
-// ICU's own leaves out characters that are ignorable by default.
+// ICU's own leave out characters that are ignorable by default.
 void leaveError(const void *, UConverterFromUnicodeArgs *, const UChar *, int32_t, UChar32,
                 UConverterCallbackReason, UErrorCode *) {}
+void substitute(const void *, UConverterFromUnicodeArgs *arguments, const UChar *, int32_t, UChar32,
+                UConverterCallbackReason reason, UErrorCode *error) {
+  if (reason <= UCNV_IRREGULAR) {
+    *error = U_ZERO_ERROR;
+    ucnv_cbFromUWriteSub(arguments, 0, error);
+  }
+}
 
 // One converter, which stops at what is bad or replaces it.
 class Page {
@@ -41,10 +49,11 @@ public:
   Page(int number, bool replaces) {
     UErrorCode error = U_ZERO_ERROR;
     converter_.adoptInstead(ucnv_open(pages.at(number), &error));
+    UConverter *const opened = converter_.getAlias();
+    ucnv_setFromUCallBack(opened, replaces ? substitute : leaveError, nullptr, nullptr, nullptr,
+                          &error);
     if (!replaces) {
-      UConverter *const stops = converter_.getAlias();
-      ucnv_setToUCallBack(stops, UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr, &error);
-      ucnv_setFromUCallBack(stops, leaveError, nullptr, nullptr, nullptr, &error);
+      ucnv_setToUCallBack(opened, UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr, &error);
     }
     EXPECT_TRUE(U_SUCCESS(error)) << number;
   }

@@ -8,6 +8,7 @@
 #include <algorithm>
 #include <span>
 #include <unicode/ucnv.h>
+#include <unicode/ucnv_cb.h>
 #include <unicode/ucnv_err.h>
 #include <unicode/utf16.h>
 
@@ -50,13 +51,19 @@ inline void count_to_unicode(const void *count, UConverterToUnicodeArgs *argumen
   }
 }
 
-inline void count_from_unicode(const void *count, UConverterFromUnicodeArgs *arguments,
-                               const UChar *units, std::int32_t length, UChar32 code_point,
-                               UConverterCallbackReason reason, UErrorCode *error) noexcept {
+template <bool drops_ignorable>
+void count_from_unicode(const void *count, UConverterFromUnicodeArgs *arguments, const UChar *units,
+                        std::int32_t length, UChar32 code_point, UConverterCallbackReason reason,
+                        UErrorCode *error) noexcept {
   if (reason <= UCNV_IRREGULAR) {
     auto &counted = *static_cast<replacement_count *>(const_cast<void *>(count));
     ++(code_point == 0xFFFD ? counted.encoding_fffd : counted.encoding);
-    UCNV_FROM_U_CALLBACK_SUBSTITUTE(nullptr, arguments, units, length, code_point, reason, error);
+    if constexpr (drops_ignorable) {
+      UCNV_FROM_U_CALLBACK_SUBSTITUTE(nullptr, arguments, units, length, code_point, reason, error);
+    } else {
+      *error = U_ZERO_ERROR;
+      ucnv_cbFromUWriteSub(arguments, 0, error);
+    }
   }
 }
 
@@ -104,16 +111,13 @@ UErrorCode for_each_unit(UConverter *from, std::span<const char> field, std::siz
     const bool stopped = failed(error) && error != U_BUFFER_OVERFLOW_ERROR;
     const std::size_t valid = consumed - (stopped ? invalid_length(from) : 0);
     for (std::size_t i = 0; i < count; ++i) {
-      std::size_t next = valid;
       if (offsets[i] >= 0) { // -1: a unit left over from the piece before
         place = start + static_cast<std::size_t>(offsets[i]);
-        const auto *after = std::find_if(offsets.data() + i, offsets.data() + count,
-                                         [&](std::int32_t other) { return other > offsets[i]; });
-        if (after != offsets.data() + count) {
-          next = start + static_cast<std::size_t>(*after);
-        }
       }
-      if (!use(units[i], place, next)) {
+      const auto *after = std::find_if(offsets.data() + i, offsets.data() + count,
+                                       [&](std::int32_t other) { return other > offsets[i]; });
+      const bool is_last = after == offsets.data() + count;
+      if (!use(units[i], place, is_last ? valid : start + static_cast<std::size_t>(*after))) {
         return U_ZERO_ERROR;
       }
     }
@@ -158,6 +162,10 @@ public:
           }
           encode(&unit, 1, error);
           note(error, room, offset, next);
+          if (U16_IS_LEAD(unit)) { // which fails with the next unit, if that is no trail
+            lead_offset_ = offset;
+            lead_next_ = next;
+          }
           return !failed(error);
         });
     if (failed(decoding)) {
@@ -183,8 +191,11 @@ private:
 
   void note(UErrorCode error, std::size_t room, std::size_t offset, std::size_t next) noexcept {
     if (failed(error)) {
-      found_ = problem_at(field_problem::not_in_page, field_, offset, next);
-      found_.code_point = invalid_character();
+      const char32_t character = invalid_character();
+      found_ = U16_IS_LEAD(character)
+                   ? problem_at(field_problem::not_in_page, field_, lead_offset_, lead_next_)
+                   : problem_at(field_problem::not_in_page, field_, offset, next);
+      found_.code_point = character;
     } else if (total_ > room && found_) {
       found_ = problem_at(field_problem::no_room, field_, offset, next);
     }
@@ -210,6 +221,8 @@ private:
   std::span<const char> field_;
   field_result found_;
   std::size_t total_ = 0;
+  std::size_t lead_offset_ = 0; // of the last lead surrogate
+  std::size_t lead_next_ = 0;
 };
 
 } // namespace nls2::detail

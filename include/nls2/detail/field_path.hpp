@@ -101,8 +101,11 @@ private:
     UErrorCode error = U_ZERO_ERROR;
     ucnv_setToUCallBack(from(), stop ? stop_to_unicode : count_to_unicode, &count_, nullptr,
                         nullptr, &error);
-    ucnv_setFromUCallBack(to(), stop ? stop_from_unicode : count_from_unicode, &count_, nullptr,
-                          nullptr, &error);
+    ucnv_setFromUCallBack(to(),
+                          stop                     ? stop_from_unicode
+                          : policy_.drop_ignorable ? count_from_unicode<true>
+                                                   : count_from_unicode<false>,
+                          &count_, nullptr, nullptr, &error);
     return make_status(error);
   }
 

@@ -44,7 +44,8 @@ Json jsonOf(const Problem &problem) {
   constexpr std::array kinds{"none",           "invalid bytes", "not in the page", "too long",
                              "null inside",    "no exact fill", "no memory",       "too long",
                              "not reversible", "short record"};
-  const bool hasCharacter = problem.kind == ProblemKind::notInPage;
+  const bool hasCharacter =
+      problem.kind == ProblemKind::notInPage || problem.kind == ProblemKind::nullInside;
   return Json::object({{"record", problem.record},
                        {"byte", problem.byte},
                        {"column", problem.column + 1},
@@ -86,28 +87,33 @@ Explanation explain(const Problem &problem) {
   case ProblemKind::invalidBytes:
     return {
         fmt::format("the {} {} not valid in {}", bytes, found.byte_count == 1 ? "is" : "are", in),
-        "; is --from right? --on-error replace puts a substitution character"};
+        "; is that page right? --on-error replace puts a substitution character"};
   case ProblemKind::notInPage:
     return {fmt::format("the character {}{} is not in {}", codePointText(problem),
                         found.byte_count > 0 ? " (" + bytes + ")" : "", in),
             "; --on-error replace puts its substitution character"};
   case ProblemKind::tooLong:
-    return {fmt::format("the text takes {} bytes, but {} {}", found.needed,
-                        limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit),
+    return {fmt::format("the text takes {} bytes, but {} {}{}", found.needed,
+                        limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit,
+                        found.byte_count > 0 ? ", which ends before the " + bytes : ""),
             widthAdvice(problem.limitedBy, "; give a larger --out-length")};
   case ProblemKind::nullInside:
-    return {
-        "a null (U+0000) is inside the text, where --strip, --fill and --keep-blanks would cut it",
-        "; leave the option out, or replace the nulls"};
+    return {fmt::format("a null (U+0000, {}) is inside the text, and would end it", bytes),
+            "; replace it, or do without --strip, --fill, --keep-blanks, --csv and widths"};
   case ProblemKind::noExactFill:
     return {fmt::format("filled with blanks it can be {} bytes long, but not {}", found.needed,
                         problem.limit),
             widthAdvice(problem.limitedBy, "; give another --out-length")};
   case ProblemKind::notReversible:
-    return {fmt::format("not reversible: {} {} from {}{}",
-                        found.byte_count == 0 ? "it" : "the " + bytes,
-                        problem.cameBack < 0 ? "does not come back" : "comes back", in,
-                        problem.cameBack < 0 ? "" : fmt::format(" as {:02X}", problem.cameBack)),
+    if (problem.cameBack >= 0) {
+      return {fmt::format("not reversible: the {} comes back from {} as {:02X}", bytes, in,
+                          problem.cameBack),
+              ""};
+    }
+    return {"not reversible: " + (found.needed == 0
+                                      ? "it does not come back from " + in
+                                      : fmt::format("its {} bytes come back from {} as {}",
+                                                    problem.limit, in, found.needed)),
             ""};
   case ProblemKind::shortRecord:
     return {fmt::format("the input ends after {} of {} bytes", found.needed, problem.limit),

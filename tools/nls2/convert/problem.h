@@ -35,7 +35,7 @@ struct Problem {
   nls2::field_result found; // the bytes and the character at fault, and the bytes needed
   std::size_t limit = 0;    // bytes that it may take, or should have
   Limit limitedBy = Limit::outLength;
-  int cameBack = -1; // notReversible: the byte in place of the first one; -1: none
+  int cameBack = -1; // notReversible: the byte in place of the one found; -1: not that many came
 };
 
 // Counts of a piece of the input, or of all of it.

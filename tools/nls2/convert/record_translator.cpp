@@ -83,6 +83,7 @@ OutputField::OutputField(const FieldSpec &spec, std::size_t number, const Transl
       csv_(options.csv) {
   nls2::field_policy policy;
   policy.bad = options.onError == OnError::replace ? nls2::on_bad::replace : nls2::on_bad::stop;
+  policy.drop_ignorable = false; // nothing is lost without a mark
   if (spec.width != 0) {
     policy.padding = nls2::padding::fill;
     policy.width = spec.width;
@@ -173,15 +174,15 @@ std::optional<Problem> OutputField::verify(std::string_view field, std::string_v
     return {};
   }
   Problem problem = newProblem(ProblemKind::notReversible);
-  if (comesBack) {
-    const auto [wrong, back] =
-        std::mismatch(field.begin(), field.end(), cameBack_.cbegin(), cameBack_.cend());
+  problem.found.needed = cameBack_.size();
+  problem.limit = field.size();
+  const auto [wrong, back] =
+      std::mismatch(field.begin(), field.end(), cameBack_.cbegin(), cameBack_.cend());
+  if (comesBack && wrong != field.end() && back != cameBack_.cend()) {
     problem.column += static_cast<std::size_t>(wrong - field.begin());
-    if (wrong != field.end()) {
-      problem.found.bytes[0] = *wrong;
-      problem.found.byte_count = 1;
-      problem.cameBack = back != cameBack_.cend() ? static_cast<unsigned char>(*back) : -1;
-    }
+    problem.found.bytes[0] = *wrong;
+    problem.found.byte_count = 1;
+    problem.cameBack = static_cast<unsigned char>(*back);
   }
   return problem;
 }

@@ -33,7 +33,8 @@ std::string bytesOfNel(const CodePage &page) {
 } // namespace
 
 std::string lineFeedOf(const CodePage &page, bool isMoved) {
-  static const std::set dependent{UCNV_UTF16, UCNV_UTF32, UCNV_SCSU, UCNV_COMPOUND_TEXT};
+  static const std::set dependent{UCNV_UTF16, UCNV_UTF32, UCNV_SCSU, UCNV_ISCII,
+                                  UCNV_COMPOUND_TEXT};
   static const std::set withStates{UCNV_HZ, UCNV_ISO_2022};
   std::string bytes = bytesOf(page, u'\n');
   if (bytes.empty()) {
