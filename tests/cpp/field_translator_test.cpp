@@ -19,7 +19,7 @@ using nls2::field_translator;
 using nls2::on_bad;
 using nls2::padding;
 
-std::size_t allocations = 0;
+[[maybe_unused]] std::size_t allocations = 0;
 
 // Every code page that opens, of the numbers in use.
 const std::vector<code_page> &allPages() {
