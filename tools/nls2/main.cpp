@@ -1,10 +1,10 @@
 // nls2: the library's work on files, from the command line.
 
-#include "commands.h"
-#include "io/print.h"
-#include "memory.h"
+#include "errors.h"
+#include "io/output_file.h"
 #include "near_names.h"
 #include "nls2.h"
+#include "options.h"
 
 #include <algorithm>
 #include <array>
@@ -13,8 +13,10 @@
 #include <cstdlib>
 #include <exception>
 #include <fcntl.h>
+#include <memory>
 #include <new>
 #include <string_view>
+#include <unicode/uclean.h>
 #include <unistd.h>
 
 namespace nls2::tool {
@@ -67,8 +69,6 @@ Error unknownCommand(const std::string &name) {
   return usageError("unknown command {}{}", printable(name), didYouMean(nearNames(name, names)));
 }
 
-std::string versionText() { return std::string(NLS2_BuildStamp()) + "\n"; }
-
 std::string generalHelp() {
   std::string text = "Usage: nls2 COMMAND [OPTION]... [OPERAND]...\n"
                      "National-language support from the command line.\n\n";
@@ -80,50 +80,40 @@ std::string generalHelp() {
          helpLine("--version", "Print how the library was built") + "\n" + generalNotes;
 }
 
-// Options before the command, `nls2 help`, or nothing at all.
-int runWithoutCommand(int argc, char **argv) {
-  const std::string first = argc > 1 ? argv[1] : "-";
-  const bool isHelp = first == "help";
-  std::string topic;
-  Command general;
-  if (isHelp) {
-    general.operands.push_back({"COMMAND", "", into(topic)});
-  } else if (!first.starts_with("-")) {
+std::string helpOn(const CommandEntry *entry) {
+  return entry != nullptr ? helpOf(*entry, entry->make()) : generalHelp();
+}
+
+// `nls2 help`, options without a command, or nothing at all.
+Command generalCommand(const std::string &first) {
+  if (first.starts_with("-")) {
+    return {.run = []() -> int { throw usageError("COMMAND is missing"); }};
+  }
+  if (first != "help") {
     throw unknownCommand(first);
   }
-  const Request request = parse(general, isHelp ? argc - 1 : argc, isHelp ? argv + 1 : argv);
-  const CommandEntry *entry = commandNamed(topic);
-  if (!isHelp && request == Request::work) {
-    throw usageError("COMMAND is missing");
-  }
-  if (entry == nullptr && !topic.empty()) {
-    throw unknownCommand(topic);
-  }
-  print(request == Request::version ? versionText()
-        : entry != nullptr          ? helpOf(*entry, entry->make())
-                                    : generalHelp());
-  return exitDone;
+  const auto topic = std::make_shared<std::string>();
+  return {.operands = {{"COMMAND", "", into(*topic)}}, .run = [topic] {
+            const CommandEntry *entry = commandNamed(*topic);
+            if (entry == nullptr && !topic->empty()) {
+              throw unknownCommand(*topic);
+            }
+            return print(helpOn(entry)), exitDone;
+          }};
 }
 
-int runCommand(const CommandEntry &entry, int argc, char **argv) {
-  const Command command = entry.make();
-  const Request request = parse(command, argc, argv);
-  if (request == Request::work) {
+int runCommand(const CommandEntry *entry, int argc, char **argv) {
+  const std::string first = argc > 1 ? argv[1] : "-";
+  const int own = first.starts_with("-") ? 0 : 1; // words before the command's own
+  const Command command = entry != nullptr ? entry->make() : generalCommand(first);
+  switch (parse(command, argc - own, argv + own)) {
+  case Request::help:
+    return print(helpOn(entry)), exitDone;
+  case Request::version:
+    return print(fmt::format("{}\n", NLS2_BuildStamp())), exitDone;
+  default:
     return command.run();
   }
-  print(request == Request::help ? helpOf(entry, command) : versionText());
-  return exitDone;
-}
-
-int report(const CommandEntry *entry, const Error &error) {
-  requireMemory();
-  if (error.code() != exitUsage) {
-    complain(error.what());
-    return failureCode;
-  }
-  std::fprintf(stderr, "nls2: %s; see nls2%s%s --help\n", error.what(), entry != nullptr ? " " : "",
-               entry != nullptr ? entry->name : "");
-  return exitUsage;
 }
 
 // The one place where failures become messages and exit codes. What ICU reports without memory is
@@ -131,12 +121,17 @@ int report(const CommandEntry *entry, const Error &error) {
 int run(const CommandEntry *entry, int argc, char **argv) noexcept {
   try {
     try {
-      const int code =
-          entry != nullptr ? runCommand(*entry, argc - 1, argv + 1) : runWithoutCommand(argc, argv);
+      const int code = runCommand(entry, argc, argv);
       requireMemory();
       return code;
     } catch (const Error &error) {
-      return report(entry, error);
+      requireMemory();
+      if (error.code() == exitUsage) {
+        std::fprintf(stderr, "nls2: %s; see nls2%s%s --help\n", error.what(),
+                     entry != nullptr ? " " : "", entry != nullptr ? entry->name : "");
+        return exitUsage;
+      }
+      complain(error.what());
     }
   } catch (const std::bad_alloc &) {
     complain("out of memory");
@@ -144,6 +139,21 @@ int run(const CommandEntry *entry, int argc, char **argv) noexcept {
     complain(error.what());
   }
   return failureCode;
+}
+
+// Has to come before any other use of ICU.
+void watchMemory() {
+  static constexpr auto noted = [](void *block) {
+    if (block == nullptr) {
+      ranOutOfMemory = true;
+    }
+    return block;
+  };
+  UErrorCode status = U_ZERO_ERROR;
+  u_setMemoryFunctions(
+      nullptr, [](const void *, std::size_t size) { return noted(std::malloc(size)); },
+      [](const void *, void *block, std::size_t size) { return noted(std::realloc(block, size)); },
+      [](const void *, void *block) { std::free(block); }, &status);
 }
 
 // Without memory for an exception the process would be aborted.

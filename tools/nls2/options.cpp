@@ -16,9 +16,8 @@ namespace {
 // What getopt_long returns for the long option at an index of the table; letters come as they are.
 constexpr int firstLong = 256;
 
-const Option helpOption{.name = "help", .letter = 'h', .help = "print this help", .take = {}};
-const Option versionOption{
-    .name = "version", .help = "print how the library was built", .take = {}};
+const Option helpOption = flag("help", "print this help", {}, 'h');
+const Option versionOption = flag("version", "print how the library was built", {});
 
 using Given = std::vector<std::pair<const Option *, std::string>>;
 

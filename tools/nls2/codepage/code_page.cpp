@@ -3,7 +3,6 @@
 #include "codepage/code_page.h"
 
 #include "errors.h"
-#include "memory.h"
 #include "near_names.h"
 #include "options.h"
 

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "nls2/code_page.hpp"
+#include "options.h"
 
 #include <array>
 #include <cstdint>
@@ -44,6 +45,11 @@ std::string nearPages(const std::string &asked);
 // The number of a code page that an option gives by number or by name. Whether the number opens is
 // seen when the page is. Throws usageError.
 int32_t parsePage(const char *option, const std::string &text);
+
+template <typename Page>
+Take pageInto(const char *option, Page &page) {
+  return [=, &page](const std::string &text) { page = parsePage(option, text); };
+}
 
 // The converter of a page that an option gives by number, or by any name that ICU knows, be it
 // ambiguous or without a number. Throws usageError.

@@ -1,9 +1,9 @@
 // nls2 cat: text files in any encoding as UTF-8 on standard output.
 
 #include "codepage/code_page.h"
-#include "commands.h"
 #include "io/output_file.h"
 #include "io/text_stream.h"
+#include "options.h"
 
 #include <algorithm>
 #include <memory>
@@ -74,15 +74,12 @@ int copyAll(const Arguments &arguments) {
 
 Command catCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {.operands = {{"FILE", "files to read, one after another; - is standard input",
-                        into(arguments->paths), 1, Operand::anyNumber}},
-          .options = {{.name = "encoding",
-                       .metavar = "NAME",
-                       .help = "the files' encoding",
-                       .take = into(arguments->encoding),
-                       .isRequired = true}},
-          .notes = notes,
-          .run = [arguments] { return copyAll(*arguments); }};
+  return {
+      .operands = {{"FILE", "files to read, one after another; - is standard input",
+                    into(arguments->paths), 1, Operand::anyNumber}},
+      .options = {required("encoding", "NAME", "the files' encoding", into(arguments->encoding))},
+      .notes = notes,
+      .run = [arguments] { return copyAll(*arguments); }};
 }
 
 } // namespace nls2::tool

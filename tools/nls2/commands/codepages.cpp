@@ -4,8 +4,8 @@
 #include "codepage/code_page.h"
 #include "codepage/display.h"
 #include "codepage/page_facts.h"
-#include "commands.h"
-#include "io/print.h"
+#include "io/output_file.h"
+#include "options.h"
 
 #include <algorithm>
 #include <fmt/format.h>
@@ -185,16 +185,12 @@ Command codepagesCommand() {
   const auto arguments = std::make_shared<Arguments>();
   return {.operands = {{"PAGE", "show what the library and ICU make of this number or name",
                         into(arguments->pages), 0, 2}},
-          .options = {{.name = "chart",
-                       .help = "show what every byte of PAGE means",
-                       .take = into(arguments->asChart)},
-                      {.name = "diff",
-                       .help = "show the bytes whose characters differ in two PAGEs",
-                       .take = into(arguments->asDifference)},
-                      {.name = "names",
-                       .help = "list the names that options take for a PAGE",
-                       .take = into(arguments->asNames)},
-                      {.name = "json", .help = "write JSON", .take = into(arguments->asJson)}},
+          .options = {flag("chart", "show what every byte of PAGE means", into(arguments->asChart)),
+                      flag("diff", "show the bytes whose characters differ in two PAGEs",
+                           into(arguments->asDifference)),
+                      flag("names", "list the names that options take for a PAGE",
+                           into(arguments->asNames)),
+                      flag("json", "write JSON", into(arguments->asJson))},
           .notes = notes,
           .run = [arguments] { return print(answer(*arguments)), exitDone; }};
 }

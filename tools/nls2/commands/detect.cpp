@@ -1,10 +1,10 @@
 // nls2 detect: which Unicode signatures files begin with.
 
-#include "commands.h"
 #include "io/input_file.h"
-#include "io/print.h"
+#include "io/output_file.h"
 #include "json.h"
 #include "nls2.h"
+#include "options.h"
 
 #include <algorithm>
 #include <memory>
@@ -93,7 +93,7 @@ Command detectCommand() {
   const auto arguments = std::make_shared<Arguments>();
   return {.operands = {{"FILE", "files to look at; - is standard input", into(arguments->paths), 1,
                         Operand::anyNumber}},
-          .options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}},
+          .options = {flag("json", "write JSON", into(arguments->asJson))},
           .notes = notes,
           .run = [arguments] { return detectAll(*arguments); }};
 }

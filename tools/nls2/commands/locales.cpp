@@ -1,10 +1,10 @@
 // nls2 locales: the library's table of locales, or its records of one name or number.
 
 #include "codepage/page_facts.h"
-#include "commands.h"
-#include "io/print.h"
+#include "io/output_file.h"
 #include "locale/locale_option.h"
 #include "nls2/language.hpp"
+#include "options.h"
 
 #include <memory>
 #include <set>
@@ -133,7 +133,7 @@ Command localesCommand() {
   return {
       .operands = {{"LOCALE-OR-PAGE", "show the records with this name, language id or code page",
                     into(arguments->asked)}},
-      .options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}},
+      .options = {flag("json", "write JSON", into(arguments->asJson))},
       .notes = notes,
       .run = [arguments] { return print(answer(*arguments)), exitDone; }};
 }

@@ -2,10 +2,11 @@
 
 #include "convert/translate.h"
 #include "codepage/code_page.h"
-#include "commands.h"
+#include "options.h"
 
 #include <algorithm>
 #include <fmt/format.h>
+#include <iterator>
 #include <memory>
 #include <string>
 
@@ -75,15 +76,6 @@ int run(Arguments &arguments) {
   return translateFile(options);
 }
 
-// Tables of options: flags, and those that have a value.
-Option flag(const char *name, const char *help, Take take) {
-  return {.name = name, .help = help, .take = std::move(take)};
-}
-
-Option value(const char *name, const char *metavar, const char *help, Take take) {
-  return {.name = name, .metavar = metavar, .help = help, .take = std::move(take)};
-}
-
 template <typename Value>
 Take set(Value &value, bool to) {
   return [&value, to](const std::string &) { value = to; };
@@ -95,17 +87,6 @@ Take set(nls2::padding &padding, nls2::padding chosen) {
       throw usageError("--fill, --keep-blanks and --strip exclude each other");
     }
     padding = chosen;
-  };
-}
-
-template <typename Page>
-Take page(const char *option, Page &page) {
-  return [=, &page](const std::string &text) { page = parsePage(option, text); };
-}
-
-Take number(const char *option, uint64_t &number, uint64_t least, uint64_t most) {
-  return [=, &number](const std::string &text) {
-    number = parseNumber<uint64_t>(option, text, least, most);
   };
 }
 
@@ -127,24 +108,21 @@ std::vector<Option> inputOptions(Arguments &arguments) {
   constexpr uint64_t most = std::numeric_limits<int64_t>::max();
   TranslateOptions &options = arguments.options;
   return {
-      {.name = "from",
-       .metavar = "PAGE",
-       .help = "code page of the input",
-       .take = page("--from", options.from),
-       .isRequired = true},
+      required("from", "PAGE", "code page of the input", pageInto("--from", options.from)),
       value("to", "PAGE", "code page of the output; required but for --csv",
-            page("--to", arguments.to)),
+            pageInto("--to", arguments.to)),
       value("record-length", "N", "bytes of every input record",
-            number("--record-length", options.recordLength, 1, longest)),
+            numberInto("--record-length", options.recordLength, 1, longest)),
       flag("lines", "read lines that end in LF, CR LF or NEL in place of records",
            into(arguments.lines)),
-      value("skip", "N", "leave out the first N records", number("--skip", options.skip, 0, most)),
+      value("skip", "N", "leave out the first N records",
+            numberInto("--skip", options.skip, 0, most)),
       value("count", "M", "translate M records at the most",
-            number("--count", options.count, 0, most)),
+            numberInto("--count", options.count, 0, most)),
       value("fields", "LIST", "START-END[=KIND][:WIDTH],...: the bytes of a record to put out",
-            [&](const std::string &text) { arguments.fields = text; }),
+            into(arguments.fields)),
       value("out-length", "M", "the most bytes of an output record",
-            number("--out-length", options.outLength, 1, longest)),
+            numberInto("--out-length", options.outLength, 1, longest)),
   };
 }
 
@@ -166,11 +144,8 @@ std::vector<Option> outputOptions(TranslateOptions &options) {
       flag("progress", "show how far the run is; the default on a terminal",
            set(options.progress, true)),
       flag("no-progress", "do not show it", set(options.progress, false)),
-      {.name = "output",
-       .letter = 'o',
-       .metavar = "OUT",
-       .help = "file to write; standard output if - or not given",
-       .take = into(options.output)},
+      value("output", "OUT", "file to write; standard output if - or not given",
+            into(options.output), 'o'),
       flag("sync", "wait until the disk has it", into(options.sync)),
   };
 }
@@ -179,17 +154,13 @@ std::vector<Option> outputOptions(TranslateOptions &options) {
 
 Command translateCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {{.metavar = "INPUT",
-                       .help = "file to read; standard input if - or not given",
-                       .take = into(arguments->options.input)}};
-  command.options = inputOptions(*arguments);
-  for (Option &option : outputOptions(arguments->options)) {
-    command.options.push_back(std::move(option));
-  }
-  command.notes = notes;
-  command.run = [arguments] { return run(*arguments); };
-  return command;
+  std::vector<Option> options = inputOptions(*arguments);
+  std::ranges::move(outputOptions(arguments->options), std::back_inserter(options));
+  return {.operands = {{"INPUT", "file to read; standard input if - or not given",
+                        into(arguments->options.input)}},
+          .options = std::move(options),
+          .notes = notes,
+          .run = [arguments] { return run(*arguments); }};
 }
 
 } // namespace nls2::tool

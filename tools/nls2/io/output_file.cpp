@@ -2,7 +2,6 @@
 
 #include "io/output_file.h"
 
-#include "memory.h"
 #include "options.h"
 
 #include <cerrno>
@@ -145,6 +144,13 @@ void OutputFile::commit(bool sync) {
   if (unsynced || (second >= 0 && close(second) != 0)) {
     fail();
   }
+}
+
+void print(std::string_view text) {
+  requireMemory();
+  OutputFile out("-");
+  out.write(text);
+  out.commit();
 }
 
 } // namespace nls2::tool

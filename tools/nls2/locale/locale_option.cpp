@@ -148,16 +148,10 @@ std::string localesNear(const std::string &name) {
 
 std::vector<Option> localeOptions(LocaleOptions &options, const std::vector<Option> &own) {
   std::vector<Option> all = {
-      {.name = "locale",
-       .metavar = "LOCALE",
-       .help = "whose rules: a name or language id of `nls2 locales`",
-       .take = [&options](const std::string &text) { options.locale = parseLocale(text); }},
-      {.name = "codepage",
-       .metavar = "PAGE",
-       .help = "code page of all texts; 1208 (UTF-8) by default",
-       .take = [&options](const std::string &text) {
-         options.codepage = parsePage("--codepage", text);
-       }}};
+      value("locale", "LOCALE", "whose rules: a name or language id of `nls2 locales`",
+            [&options](const std::string &text) { options.locale = parseLocale(text); }),
+      value("codepage", "PAGE", "code page of all texts; 1208 (UTF-8) by default",
+            pageInto("--codepage", options.codepage))};
   all.insert(all.end(), own.begin(), own.end());
   return all;
 }
