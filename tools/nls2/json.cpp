@@ -32,7 +32,7 @@ Json::Json(bool value) : Json(json_boolean(value)) {}
 Json::Json(double value) : Json(json_real(value)) {}
 Json::Json(std::string_view text) : Json(makeString(text)) {}
 json_t *Json::integer(int64_t value) { return json_integer(value); }
-Json Json::emptyArray() { return Json(json_array()); }
+Json Json::array() { return Json(json_array()); }
 
 Json Json::object(std::initializer_list<std::pair<const char *, Json>> members) {
   Json object(json_object());

@@ -1,9 +1,8 @@
-// JSON values to be written: all that a renderer of facts needs.
+// What commands find, as text and as JSON.
 #pragma once
 
 #include <concepts>
 #include <cstdint>
-#include <functional>
 #include <initializer_list>
 #include <memory>
 #include <optional>
@@ -22,15 +21,16 @@ public:
   static Json object(std::initializer_list<std::pair<const char *, Json>> members = {});
   Json &set(const char *key, const Json &value);
 
-  // Of what `render` makes of each element.
-  template <class Range, class Render = std::identity>
-  static Json array(const Range &range, Render render = {}) {
-    Json values = emptyArray();
+  static Json array();
+  template <class Range>
+  static Json array(const Range &range) {
+    Json values = array();
     for (const auto &each : range) {
-      values.append(render(each));
+      values.append(each);
     }
     return values;
   }
+  void append(const Json &value);
 
   Json(std::nullptr_t = nullptr);
   Json(bool value);
@@ -38,7 +38,7 @@ public:
   Json(std::integral auto value) : Json(integer(static_cast<int64_t>(value))) {}
   Json(std::string_view text); // bytes that are not valid UTF-8 become U+FFFD
   Json(const std::string &text) : Json(std::string_view(text)) {}
-  Json(const char *text) : Json(std::string_view(text)) {}
+  Json(const char *text) : Json(text != nullptr ? Json(std::string_view(text)) : Json()) {}
   template <typename Value>
   Json(const std::optional<Value> &value) : Json(value ? Json(*value) : Json()) {}
 
@@ -48,10 +48,16 @@ public:
 private:
   explicit Json(json_t *owned); // null is want of memory
   static json_t *integer(int64_t value);
-  static Json emptyArray();
-  void append(const Json &value);
 
   std::shared_ptr<json_t> value_;
+};
+
+// The same facts for people and for programs.
+struct Answer {
+  std::string text;
+  Json json;
+
+  std::string rendered(bool asJson) const { return asJson ? json.text() : text; }
 };
 
 } // namespace nls2::tool

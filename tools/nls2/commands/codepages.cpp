@@ -94,89 +94,76 @@ std::string cellOf(const ByteMeaning &meaning) {
          std::string(static_cast<std::size_t>(std::max(0, 2 - display.columns)), ' ');
 }
 
-std::string asText(const ByteChart &chart) {
-  std::string text = "   0  1  2  3  4  5  6  7  8  9  A  B  C  D  E  F\n";
-  for (std::size_t row = 0; row < 16; ++row) {
-    std::string line = fmt::format("{:X} ", row);
-    for (std::size_t column = 0; column < 16; ++column) {
-      line.append(1, ' ').append(cellOf(chart.bytes[16 * row + column]));
-    }
-    text += line.substr(0, line.find_last_not_of(' ') + 1) + "\n";
-  }
-  return text + "SP blank, .. does not print, >> lead byte, <> shift, -- no character\n";
-}
-
-Json asJson(const ByteMeaning &meaning) {
+Json jsonOf(const ByteMeaning &meaning) {
   return meaning.kind == ByteMeaning::character ? Json(codePointsOf(meaning.text)) : Json();
 }
 
-Json asJson(const ByteChart &chart) {
+Answer chart(const std::string &name) {
   constexpr std::array kinds{"character", "lead byte", "shift", "none"};
-  const auto row = [&](const ByteMeaning &meaning) {
-    return Json::object({{"byte", fmt::format("{:02X}", &meaning - chart.bytes.data())},
-                         {"kind", kinds[meaning.kind]},
-                         {"character", asJson(meaning)}});
-  };
-  return Json::object({{"codepage", chart.page}, {"bytes", Json::array(chart.bytes, row)}});
-}
-
-std::string asText(const ByteMeaning &meaning) {
-  return meaning.kind == ByteMeaning::character
-             ? displayOf(meaning.text).text + " " + codePointsOf(meaning.text)
-             : "-";
-}
-
-std::string difference(const Arguments &arguments) {
-  if (arguments.pages.size() != 2) {
-    throw usageError("--diff needs two PAGEs");
+  const ByteChart chart = chartOf("--chart", name);
+  std::string text = "   0  1  2  3  4  5  6  7  8  9  A  B  C  D  E  F\n";
+  Json rows = Json::array();
+  for (std::size_t row = 0; row < 256; row += 16) {
+    std::string line = fmt::format("{:X} ", row / 16);
+    for (std::size_t byte = row; byte < row + 16; ++byte) {
+      const ByteMeaning &meaning = chart.bytes[byte];
+      line.append(1, ' ').append(cellOf(meaning));
+      rows.append(Json::object({{"byte", fmt::format("{:02X}", byte)},
+                                {"kind", kinds[meaning.kind]},
+                                {"character", jsonOf(meaning)}}));
+    }
+    text += line.substr(0, line.find_last_not_of(' ') + 1) + "\n";
   }
-  const ByteChart a = chartOf("--diff", arguments.pages[0]);
-  const ByteChart b = chartOf("--diff", arguments.pages[1]);
+  text += "SP blank, .. does not print, >> lead byte, <> shift, -- no character\n";
+  return {text, Json::object({{"codepage", chart.page}, {"bytes", rows}})};
+}
+
+Answer difference(const std::string &first, const std::string &second) {
+  const ByteChart a = chartOf("--diff", first);
+  const ByteChart b = chartOf("--diff", second);
+  const auto shown = [](const ByteMeaning &meaning) {
+    return meaning.kind == ByteMeaning::character
+               ? displayOf(meaning.text).text + " " + codePointsOf(meaning.text)
+               : "-";
+  };
   std::string text;
-  std::vector<Json> rows;
+  Json rows = Json::array();
   for (std::size_t i = 0; i < a.bytes.size(); ++i) {
     if (a.bytes[i].text != b.bytes[i].text) {
       const std::string byte = fmt::format("{:02X}", i);
-      text += fmt::format("{}  {}  {}\n", byte, asText(a.bytes[i]), asText(b.bytes[i]));
-      rows.push_back(Json::object(
-          {{"byte", byte}, {"first", asJson(a.bytes[i])}, {"second", asJson(b.bytes[i])}}));
+      text += fmt::format("{}  {}  {}\n", byte, shown(a.bytes[i]), shown(b.bytes[i]));
+      rows.append(Json::object(
+          {{"byte", byte}, {"first", jsonOf(a.bytes[i])}, {"second", jsonOf(b.bytes[i])}}));
     }
   }
-  const Json json = Json::object(
-      {{"codepages", Json::array(std::array{a.page, b.page})}, {"differences", Json::array(rows)}});
-  return arguments.asJson ? json.text() : text;
+  return {text, Json::object({{"codepages", Json::array(std::array{a.page, b.page})},
+                              {"differences", rows}})};
 }
 
-std::string names(const Arguments &arguments) {
-  const std::vector<std::string> names = namesWithNumbers();
-  return arguments.asJson ? Json::array(names).text() : fmt::format("{}\n", fmt::join(names, "\n"));
-}
-
-std::string answer(const Arguments &arguments) {
+// What the options ask for of the pages.
+Answer answer(const Arguments &arguments) {
+  const auto &pages = arguments.pages;
   if (arguments.asChart + arguments.asDifference + arguments.asNames > 1) {
     throw usageError("--chart, --diff and --names exclude each other");
   }
-  if (arguments.asDifference) {
-    return difference(arguments);
+  if (arguments.asDifference && pages.size() != 2) {
+    throw usageError("--diff needs two PAGEs");
   }
-  const std::size_t most = arguments.asNames ? 0 : 1;
-  if (arguments.pages.size() > most) {
-    throw usageError("extra operand {}", printable(arguments.pages[most]));
+  const std::size_t most = arguments.asDifference ? 2 : arguments.asNames ? 0 : 1;
+  if (pages.size() > most) {
+    throw usageError("extra operand {}", printable(pages[most]));
+  }
+  if (arguments.asChart && pages.empty()) {
+    throw usageError("--chart needs a PAGE");
   }
   if (arguments.asNames) {
-    return names(arguments);
+    const std::vector<std::string> names = namesWithNumbers();
+    return {fmt::format("{}\n", fmt::join(names, "\n")), Json::array(names)};
   }
-  if (arguments.pages.empty()) {
-    if (arguments.asChart) {
-      throw usageError("--chart needs a PAGE");
-    }
-    return arguments.asJson ? allPagesAsJson().text() : allPagesAsText();
-  }
-  const auto rendered = [&](const auto &facts) {
-    return arguments.asJson ? asJson(facts).text() : asText(facts);
-  };
-  return arguments.asChart ? rendered(chartOf("--chart", arguments.pages[0]))
-                           : rendered(lookUpPage(arguments.pages[0]));
+  return arguments.asDifference ? difference(pages[0], pages[1])
+         : arguments.asChart    ? chart(pages[0])
+         : pages.empty()        ? allPages()
+                                : lookUpPage(pages[0]);
 }
 
 } // namespace
@@ -192,7 +179,9 @@ Command codepagesCommand() {
                            into(arguments->asNames)),
                       flag("json", "write JSON", into(arguments->asJson))},
           .notes = notes,
-          .run = [arguments] { return print(answer(*arguments)), exitDone; }};
+          .run = [arguments] {
+            return print(answer(*arguments).rendered(arguments->asJson)), exitDone;
+          }};
 }
 
 } // namespace nls2::tool
