@@ -8,7 +8,6 @@
 #include <cstdio>
 #include <fmt/core.h>
 #include <new>
-#include <optional>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -42,9 +41,6 @@ template <typename... Arguments>
 Error usageError(fmt::format_string<Arguments...> format, Arguments &&...arguments) {
   return {exitUsage, fmt::format(format, std::forward<Arguments>(arguments)...)};
 }
-
-// Why a piece of the input cannot be used; nothing where it can.
-using Refusal = std::optional<std::string>;
 
 // A status of the library or of ICU in words.
 inline std::string statusText(int32_t status) { return category().message(status); }

@@ -7,12 +7,12 @@
 #include "options.h"
 
 #include <algorithm>
-#include <array>
 #include <csignal>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
 #include <fcntl.h>
+#include <iterator>
 #include <memory>
 #include <new>
 #include <string_view>
@@ -23,21 +23,16 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr std::array commands{
-    CommandEntry{"translate", "Translate fixed-length records to another code page", exitFailed,
-                 translateCommand},
-    CommandEntry{"locales", "List the locales that the library knows", exitFailed, localesCommand},
-    CommandEntry{"codepages", "List code pages by number and by Windows name", exitFailed,
-                 codepagesCommand},
-    CommandEntry{"detect", "Report the Unicode signatures of files", exitUsage, detectCommand},
-    CommandEntry{"dump", "Show a file in hex and as text of a code page", exitFailed, dumpCommand},
-    CommandEntry{"cat", "Write text files in any encoding to standard output as UTF-8", exitFailed,
-                 catCommand},
-    CommandEntry{"compare", "Compare two strings by the rules of a language", exitUsage,
-                 compareCommand},
-    CommandEntry{"sort", "Sort lines or fixed-length records by the rules of a language",
-                 exitFailed, sortCommand},
-    CommandEntry{"find", "Print the lines in which a text occurs", exitUsage, findCommand}};
+constexpr CommandEntry commands[] = {
+    {"translate", "Translate fixed-length records to another code page", translateCommand},
+    {"locales", "List the locales that the library knows", localesCommand},
+    {"codepages", "List code pages by number and by Windows name", codepagesCommand},
+    {"detect", "Report the Unicode signatures of files", detectCommand, exitUsage},
+    {"dump", "Show a file in hex and as text of a code page", dumpCommand},
+    {"cat", "Write text files in any encoding to standard output as UTF-8", catCommand},
+    {"compare", "Compare two strings by the rules of a language", compareCommand, exitUsage},
+    {"sort", "Sort lines or fixed-length records by the rules of a language", sortCommand},
+    {"find", "Print the lines in which a text occurs", findCommand, exitUsage}};
 
 int failureCode = exitFailed; // of the command
 
@@ -56,9 +51,8 @@ void occupyStandardStreams() {
 }
 
 const CommandEntry *commandNamed(std::string_view name) {
-  const auto found = std::find_if(commands.begin(), commands.end(),
-                                  [=](const CommandEntry &entry) { return name == entry.name; });
-  return found == commands.end() ? nullptr : &*found;
+  const auto *found = std::ranges::find(commands, name, &CommandEntry::name);
+  return found == std::end(commands) ? nullptr : found;
 }
 
 Error unknownCommand(const std::string &name) {

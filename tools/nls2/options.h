@@ -74,8 +74,8 @@ Command translateCommand();
 struct CommandEntry {
   const char *name;
   const char *summary;
-  ExitCode failureCode; // 2 for a command whose 1 means "no"
   Command (*make)();
+  ExitCode failureCode = exitFailed; // 2 for a command whose 1 means "no"
 };
 
 // What a command line asks for.

@@ -9,7 +9,6 @@
 #include <cstdint>
 #include <optional>
 #include <string>
-#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -75,8 +74,6 @@ public:
   std::optional<EncodedCharacter> encoded(char16_t character) const;
 
 private:
-  std::string encode(std::u16string_view text) const;
-
   int32_t number_;
   nls2::converter converter_;
 };

@@ -24,6 +24,8 @@ struct PageFacts {
   std::optional<std::string> converter; // nothing where it has no name
   std::optional<int32_t> ccsid;
   std::optional<int32_t> maxCharSize;
+
+  std::string name() const { return converter.value_or("without a name"); }
 };
 
 PageFacts factsOf(int32_t number) {
@@ -42,8 +44,6 @@ PageFacts factsOf(int32_t number) {
   return facts;
 }
 
-std::string openedAs(const PageFacts &facts) { return facts.converter.value_or("without a name"); }
-
 std::vector<std::string> windowsNamesOf(int32_t number) {
   std::vector<std::string> names;
   for (const CcsidMapEntry &entry : windows_names()) {
@@ -61,7 +61,7 @@ std::string textOf(const PageFacts &facts) {
   };
   line("opens", facts.opens ? "yes" : "no: " + statusText(facts.status));
   if (facts.opens) {
-    line("converter", openedAs(facts));
+    line("converter", facts.name());
     line("CCSID", facts.ccsid ? std::to_string(*facts.ccsid) : "none");
     line("largest character", fmt::format("{} byte(s) a UTF-16 unit", *facts.maxCharSize));
   }
@@ -147,7 +147,29 @@ Answer describe(const std::vector<int32_t> &numbers, const std::vector<std::stri
           Json::object({{"numbers", numberRows}, {"names", nameRows}, {"tablesDiffer", differ}})};
 }
 
-Answer lookUpName(const std::string &name) {
+} // namespace
+
+Answer describePage(int32_t number) {
+  const PageFacts facts = factsOf(number);
+  return {textOf(facts), jsonOf(facts)};
+}
+
+Answer lookUpPage(const std::string &asked) {
+  std::string name = asked;
+  if (const auto given = wholeNumber(asked)) {
+    const auto number = pageNumber(asked);
+    const auto *listed = std::find(pagesWithNames.begin(), pagesWithNames.end(), number);
+    if (number && (listed != pagesWithNames.end() || converterOf(*number))) {
+      return describe({*number}, namesOf(*number));
+    }
+    name = fmt::format("windows-{}", *given);
+    if (!windowsPage(name)) {
+      throw failure(
+          "code page {} is unknown: it is not one of the library's numbers, and ICU has no "
+          "converter for it as a CCSID",
+          *given);
+    }
+  }
   const auto numbers = name.empty() ? std::vector<int32_t>() : numbersOf(name);
   if (numbers.empty() && !converterOf(name)) {
     throw failure("code page \"{}\" is unknown: it is neither a name that ICU has a converter for "
@@ -157,42 +179,15 @@ Answer lookUpName(const std::string &name) {
   return describe(numbers, {name});
 }
 
-} // namespace
-
-Answer describePage(int32_t number) {
-  const PageFacts facts = factsOf(number);
-  return {textOf(facts), jsonOf(facts)};
-}
-
-Answer lookUpPage(const std::string &asked) {
-  const auto given = wholeNumber(asked);
-  if (!given) {
-    return lookUpName(asked);
-  }
-  const auto number = pageNumber(asked);
-  const auto *listed = std::find(pagesWithNames.begin(), pagesWithNames.end(), number);
-  if (number && (listed != pagesWithNames.end() || converterOf(*number))) {
-    return describe({*number}, namesOf(*number));
-  }
-  const std::string windowsName = fmt::format("windows-{}", *given);
-  if (windowsPage(windowsName)) {
-    return lookUpName(windowsName);
-  }
-  throw failure("code page {} is unknown: it is not one of the library's numbers, and ICU has no "
-                "converter for it as a CCSID",
-                *given);
-}
-
 Answer allPages() {
   std::string text = "Numbers opened by name (any other number is opened as a CCSID of ICU's):\n";
   Json numbers = Json::array();
   Json names = Json::array();
   for (const int32_t number : pagesWithNames) {
     const PageFacts facts = factsOf(number);
-    text +=
-        fmt::format("{:>6}  {}{}\n", number,
-                    facts.opens ? openedAs(facts) : "does not open: " + statusText(facts.status),
-                    facts.twoNulls != 0 ? ", two-null terminator" : "");
+    text += fmt::format("{:>6}  {}{}\n", number,
+                        facts.opens ? facts.name() : "does not open: " + statusText(facts.status),
+                        facts.twoNulls != 0 ? ", two-null terminator" : "");
     numbers.append(jsonOf(facts));
   }
   text += "\nWindows names:\n";

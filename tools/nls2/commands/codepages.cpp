@@ -95,7 +95,7 @@ std::string cellOf(const ByteMeaning &meaning) {
 }
 
 Json jsonOf(const ByteMeaning &meaning) {
-  return meaning.kind == ByteMeaning::character ? Json(codePointsOf(meaning.text)) : Json();
+  return meaning.text.empty() ? Json() : Json(codePointsOf(meaning.text));
 }
 
 Answer chart(const std::string &name) {
@@ -122,9 +122,8 @@ Answer difference(const std::string &first, const std::string &second) {
   const ByteChart a = chartOf("--diff", first);
   const ByteChart b = chartOf("--diff", second);
   const auto shown = [](const ByteMeaning &meaning) {
-    return meaning.kind == ByteMeaning::character
-               ? displayOf(meaning.text).text + " " + codePointsOf(meaning.text)
-               : "-";
+    return meaning.text.empty() ? "-"
+                                : displayOf(meaning.text).text + " " + codePointsOf(meaning.text);
   };
   std::string text;
   Json rows = Json::array();

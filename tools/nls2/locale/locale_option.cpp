@@ -146,14 +146,14 @@ std::string localesNear(const std::string &name) {
   return didYouMean(names);
 }
 
-std::vector<Option> localeOptions(LocaleOptions &options, const std::vector<Option> &own) {
-  std::vector<Option> all = {
-      value("locale", "LOCALE", "whose rules: a name or language id of `nls2 locales`",
-            [&options](const std::string &text) { options.locale = parseLocale(text); }),
-      value("codepage", "PAGE", "code page of all texts; 1208 (UTF-8) by default",
-            pageInto("--codepage", options.codepage))};
-  all.insert(all.end(), own.begin(), own.end());
-  return all;
+std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own) {
+  const auto takeLocale = [&](const std::string &text) { options.locale = parseLocale(text); };
+  own.insert(own.begin(),
+             {value("locale", "LOCALE", "whose rules: a name or language id of `nls2 locales`",
+                    takeLocale),
+              value("codepage", "PAGE", "code page of all texts; 1208 (UTF-8) by default",
+                    pageInto("--codepage", options.codepage))});
+  return own;
 }
 
 std::string orderLocale(const LocaleOptions &options) {
@@ -161,10 +161,8 @@ std::string orderLocale(const LocaleOptions &options) {
     return *options.locale;
   }
   const auto [variable, name] = environmentLocale();
-  std::string locale = knownLocale(name);
-  if (locale.empty()) {
-    locale = localeOfLanguage(name);
-  }
+  const std::string known = knownLocale(name);
+  const std::string locale = known.empty() ? localeOfLanguage(name) : known;
   if (locale.empty()) {
     throw usageError("{}: \"{}\" is not a known locale{}; give --locale", variable, printable(name),
                      localesNear(name));
