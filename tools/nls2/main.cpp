@@ -36,10 +36,6 @@ constexpr CommandEntry commands[] = {
 
 int failureCode = exitFailed; // of the command
 
-constexpr const char *generalNotes =
-    "Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of detect,\n"
-    "compare and find, which answer a question: 0 yes, 1 no, 2 trouble.\nSee nls2(1).\n";
-
 // A standard stream that the caller closed must not become a file opened here: its descriptor is
 // taken by an open file that can only fail.
 void occupyStandardStreams() {
@@ -71,7 +67,9 @@ std::string generalHelp() {
   }
   return text + helpLine("help [COMMAND]", "Print this help, or that of a command") +
          helpLine("-h, --help", "Print this help, or a command's after its name") +
-         helpLine("--version", "Print how the library was built") + "\n" + generalNotes;
+         helpLine("--version", "Print how the library was built") +
+         "\nExit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of detect,\n"
+         "compare and find, which answer a question: 0 yes, 1 no, 2 trouble.\nSee nls2(1).\n";
 }
 
 std::string helpOn(const CommandEntry *entry) {

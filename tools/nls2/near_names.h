@@ -36,14 +36,15 @@ inline std::vector<std::string> nearNames(const std::string &unknown,
   std::vector<std::string> names;
   for (const std::string &name : known) {
     const std::size_t letters = letterDistance(unknown, name);
-    if (letters > nearest || letters >= name.size()) {
+    if (letters > nearest || letters >= name.size() ||
+        std::ranges::find(names, name) != names.end()) {
       continue;
     }
     if (letters < nearest) {
       names.clear();
       nearest = letters;
     }
-    if (names.size() < 3 && std::find(names.begin(), names.end(), name) == names.end()) {
+    if (names.size() < 3) {
       names.push_back(name);
     }
   }

@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <limits>
+#include <set>
 #include <unicode/unistr.h>
 
 namespace nls2::tool {
@@ -140,11 +141,10 @@ std::optional<int32_t> windowsPage(const std::string &name) {
   return {};
 }
 
-std::vector<std::string> namesWithNumbers() {
-  std::vector<std::string> names = allPageNames();
+std::set<std::string> namesWithNumbers() {
+  const std::vector<std::string> all = allPageNames();
+  std::set<std::string> names(all.begin(), all.end());
   std::erase_if(names, [](const std::string &name) { return !numberOf(name); });
-  std::sort(names.begin(), names.end());
-  names.erase(std::unique(names.begin(), names.end()), names.end());
   return names;
 }
 

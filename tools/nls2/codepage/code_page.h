@@ -8,9 +8,9 @@
 #include <array>
 #include <cstdint>
 #include <optional>
+#include <set>
 #include <string>
 #include <utility>
-#include <vector>
 
 namespace nls2::tool {
 
@@ -35,8 +35,8 @@ std::optional<int32_t> ccsidOf(const std::string &name);
 // The number of exactly this Windows name of the library's.
 std::optional<int32_t> windowsPage(const std::string &name);
 
-// The names that parsePage() finds a number for, sorted.
-std::vector<std::string> namesWithNumbers();
+// The names that parsePage() finds a number for.
+std::set<std::string> namesWithNumbers();
 
 // " (did you mean cp037?)" for a name that is unknown, or a number that has a Windows name.
 std::string nearPages(const std::string &asked);

@@ -41,9 +41,22 @@ public:
   Copier(const Copier &) = delete; // the converters count into it
   Copier &operator=(const Copier &) = delete;
 
+  int copyAll(const std::vector<std::string> &paths) {
+    int code = exitDone;
+    for (const std::string &path : paths) {
+      code = std::max(code, copy(path));
+    }
+    out_.commit();
+    return code;
+  }
+
+private:
   // The exit code for this file. A failure to read is reported, and leaves the others to be read.
   int copy(const std::string &path) {
-    begin();
+    ucnv_reset(source_.get());
+    ucnv_reset(utf8_.get());
+    pivotSource_ = pivotTarget_ = pivot_.data();
+    replaced_ = 0;
     std::optional<InputFile> in;
     int code = exitDone;
     for (bool isOpen = true; isOpen;) {
@@ -64,9 +77,6 @@ public:
     return code;
   }
 
-  void commit() { out_.commit(); }
-
-private:
   static void onInvalid(const void *counter, UConverterToUnicodeArgs *arguments, const char *bytes,
                         int32_t length, UConverterCallbackReason reason, UErrorCode *error) {
     count(counter, reason);
@@ -83,13 +93,6 @@ private:
 
   static void count(const void *counter, UConverterCallbackReason reason) {
     *static_cast<uint64_t *>(const_cast<void *>(counter)) += reason <= UCNV_IRREGULAR ? 1 : 0;
-  }
-
-  void begin() {
-    ucnv_reset(source_.get());
-    ucnv_reset(utf8_.get());
-    pivotSource_ = pivotTarget_ = pivot_.data();
-    replaced_ = 0;
   }
 
   // Adds the next part of the file. False at its end.
@@ -127,16 +130,6 @@ private:
   OutputFile out_{"-"};
 };
 
-int copyAll(const Arguments &arguments) {
-  Copier copier(arguments.encoding);
-  int code = exitDone;
-  for (const std::string &path : arguments.paths) {
-    code = std::max(code, copier.copy(path));
-  }
-  copier.commit();
-  return code;
-}
-
 } // namespace
 
 Command catCommand() {
@@ -146,7 +139,7 @@ Command catCommand() {
                     into(arguments->paths), 1, Operand::anyNumber}},
       .options = {required("encoding", "NAME", "the files' encoding", into(arguments->encoding))},
       .notes = notes,
-      .run = [arguments] { return copyAll(*arguments); }};
+      .run = [arguments] { return Copier(arguments->encoding).copyAll(arguments->paths); }};
 }
 
 } // namespace nls2::tool

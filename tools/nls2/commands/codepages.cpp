@@ -30,16 +30,15 @@ struct Arguments {
 };
 
 struct ByteMeaning {
-  enum Kind { character, leadByte, shift, none };
-
-  Kind kind = none;
+  const char *kind;
+  const char *mark;    // in a chart
   std::u16string text; // of a character; empty for all else
 };
 
 // What each single byte of a code page means.
 struct ByteChart {
-  int32_t page = 0;
-  std::array<ByteMeaning, 256> bytes;
+  int32_t page;
+  std::vector<ByteMeaning> bytes;
 };
 
 ByteMeaning meaningOf(UConverter *converter, char byte) {
@@ -51,27 +50,25 @@ ByteMeaning meaningOf(UConverter *converter, char byte) {
   ucnv_toUnicode(converter, &end, units.data() + units.size(), &source, &byte + 1, nullptr, 0,
                  &error);
   if (U_FAILURE(error)) {
-    return {ByteMeaning::none, {}};
+    return {"none", "--", {}};
   }
   if (end != units.data()) {
-    return {ByteMeaning::character, {units.data(), end}};
+    return {"character", "", {units.data(), end}};
   }
   const bool isPending = ucnv_toUCountPending(converter, &error) > 0;
-  return {isPending ? ByteMeaning::leadByte : ByteMeaning::shift, {}};
+  return isPending ? ByteMeaning{"lead byte", ">>", {}} : ByteMeaning{"shift", "<>", {}};
 }
 
 // Throws Error where the page does not open or no byte of it is a character by itself.
 ByteChart chartOf(const char *option, const std::string &name) {
   const CodePage page(parsePage(option, name), option);
-  ByteChart chart{.page = page.number(), .bytes = {}};
   UErrorCode error = U_ZERO_ERROR;
   ucnv_setToUCallBack(page.converter(), UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr, &error);
-  bool hasCharacters = false;
-  for (std::size_t byte = 0; byte < chart.bytes.size(); ++byte) {
-    chart.bytes[byte] = meaningOf(page.converter(), static_cast<char>(byte));
-    hasCharacters = hasCharacters || chart.bytes[byte].kind == ByteMeaning::character;
+  ByteChart chart{page.number(), {}};
+  for (int byte = 0; byte < 256; ++byte) {
+    chart.bytes.push_back(meaningOf(page.converter(), static_cast<char>(byte)));
   }
-  if (!hasCharacters) {
+  if (std::ranges::all_of(chart.bytes, &std::u16string::empty, &ByteMeaning::text)) {
     throw failure("code page {} has no characters of one byte", page.number());
   }
   return chart;
@@ -79,9 +76,8 @@ ByteChart chartOf(const char *option, const std::string &name) {
 
 // Two columns, so that no mark can be taken for a character.
 std::string cellOf(const ByteMeaning &meaning) {
-  constexpr std::array marks{"", ">>", "<>", "--"};
-  if (meaning.kind != ByteMeaning::character) {
-    return marks[meaning.kind];
+  if (meaning.text.empty()) {
+    return meaning.mark;
   }
   if (meaning.text == u" ") {
     return "SP";
@@ -99,7 +95,6 @@ Json jsonOf(const ByteMeaning &meaning) {
 }
 
 Answer chart(const std::string &name) {
-  constexpr std::array kinds{"character", "lead byte", "shift", "none"};
   const ByteChart chart = chartOf("--chart", name);
   std::string text = "   0  1  2  3  4  5  6  7  8  9  A  B  C  D  E  F\n";
   Json rows = Json::array();
@@ -109,7 +104,7 @@ Answer chart(const std::string &name) {
       const ByteMeaning &meaning = chart.bytes[byte];
       line.append(1, ' ').append(cellOf(meaning));
       rows.append(Json::object({{"byte", fmt::format("{:02X}", byte)},
-                                {"kind", kinds[meaning.kind]},
+                                {"kind", meaning.kind},
                                 {"character", jsonOf(meaning)}}));
     }
     text += line.substr(0, line.find_last_not_of(' ') + 1) + "\n";
@@ -156,7 +151,7 @@ Answer answer(const Arguments &arguments) {
     throw usageError("--chart needs a PAGE");
   }
   if (arguments.asNames) {
-    const std::vector<std::string> names = namesWithNumbers();
+    const std::set<std::string> names = namesWithNumbers();
     return {fmt::format("{}\n", fmt::join(names, "\n")), Json::array(names)};
   }
   return arguments.asDifference ? difference(pages[0], pages[1])
