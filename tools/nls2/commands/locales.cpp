@@ -6,8 +6,10 @@
 #include "nls2/language.hpp"
 #include "options.h"
 
+#include <functional>
 #include <memory>
 #include <set>
+#include <utility>
 
 namespace nls2::tool {
 
@@ -25,11 +27,6 @@ struct Arguments {
 
 using Records = std::vector<const LocaleMapEntry *>;
 
-struct FoundLocales {
-  const char *matchedBy;
-  Records records;
-};
-
 template <class IsWanted>
 Records recordsThat(IsWanted isWanted) {
   Records records;
@@ -41,33 +38,22 @@ Records recordsThat(IsWanted isWanted) {
   return records;
 }
 
-FoundLocales recordsWith(uint32_t number) {
-  FoundLocales found{"language id",
-                     recordsThat([=](const auto &entry) { return entry.languageId == number; })};
-  if (found.records.empty()) {
-    found = {"code page", recordsThat([=](const auto &entry) {
-               return entry.asciiCcsid == number || entry.ebcdicCcsid == number;
-             })};
-  }
-  return found;
-}
-
-FoundLocales recordsWith(const std::string &name) {
-  return {"name", recordsThat([&](const auto &entry) {
-            return entry.localeName == name || entry.shortName == name;
-          })};
-}
-
-// Throws Error where there is none.
-FoundLocales lookUp(const std::string &asked) {
+// What the text matches, by the first of the ways that finds any. Throws Error where none does.
+std::pair<const char *, Records> lookUp(const std::string &asked) {
   const auto number = wholeNumber(asked);
-  FoundLocales found = number ? recordsWith(*number) : recordsWith(asked);
-  if (found.records.empty()) {
-    throw failure("no locale has the {} {}{}; `nls2 locales` lists them all",
-                  number ? "language id or code page" : "locale name or short name",
-                  printable(asked), number ? "" : localesNear(asked));
+  const std::pair<const char *, std::function<bool(const LocaleMapEntry &)>> ways[] = {
+      {"name", [&](const auto &it) { return it.localeName == asked || it.shortName == asked; }},
+      {"language id", [&](const auto &it) { return it.languageId == number; }},
+      {"code page",
+       [&](const auto &it) { return it.asciiCcsid == number || it.ebcdicCcsid == number; }}};
+  for (const auto &[matchedBy, isWanted] : ways) {
+    if (Records records = recordsThat(isWanted); !records.empty()) {
+      return {matchedBy, std::move(records)};
+    }
   }
-  return found;
+  throw failure("no locale has the {} {}{}; `nls2 locales` lists them all",
+                number ? "language id or code page" : "locale name or short name", printable(asked),
+                number ? "" : localesNear(asked));
 }
 
 // The records' code pages, each once.
