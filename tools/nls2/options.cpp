@@ -66,25 +66,24 @@ private:
                           [=](const Option *option) { return option->letter == code; });
   }
 
+  // A letter, or a long option, of which `word` is the argument.
   Error unknown(int code, const std::string &word) const {
     if (code >= firstLong) {
       return usageError("--{} takes no value", optionOf(code).name);
     }
+    const std::string letter(code != 0 ? 1 : 0, static_cast<char>(code));
+    const std::string name = code != 0 ? "-" + letter : word.substr(0, word.find('='));
     std::vector<std::string> names;
+    std::vector<std::string> longer;
     for (const Option *option : options_) {
       names.push_back(std::string("--") + option->name);
+      if (names.back().starts_with(code != 0 ? "--" + letter : name)) {
+        longer.push_back(names.back());
+      }
     }
-    if (code != 0) {
-      std::erase_if(names, [=](const std::string &name) { return name[2] != code; });
-      return usageError("unknown option -{}{}", printable(std::string(1, static_cast<char>(code))),
-                        didYouMean(names));
-    }
-    const std::string name = word.substr(0, word.find('='));
-    std::vector<std::string> longer;
-    std::copy_if(names.begin(), names.end(), std::back_inserter(longer),
-                 [&](const std::string &known) { return known.starts_with(name); });
+    const bool isLong = code == 0;
     return usageError("unknown option {}{}", printable(name),
-                      didYouMean(longer.empty() ? nearNames(name, names) : longer));
+                      didYouMean(isLong && longer.empty() ? nearNames(name, names) : longer));
   }
 
   std::vector<const Option *> options_;

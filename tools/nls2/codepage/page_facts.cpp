@@ -118,9 +118,10 @@ std::vector<int32_t> numbersOf(const std::string &name) {
 std::vector<std::string> namesOf(int32_t number) {
   std::vector<std::string> names;
   for (const char *prefix : prefixes) {
-    names.push_back(fmt::format("{}{}", prefix, number));
+    if (std::string name = fmt::format("{}{}", prefix, number); converterOf(name)) {
+      names.push_back(std::move(name));
+    }
   }
-  std::erase_if(names, [](const std::string &name) { return !converterOf(name); });
   return names;
 }
 

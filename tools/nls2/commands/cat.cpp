@@ -105,7 +105,7 @@ private:
       char *target = utf8Bytes_.data();
       ucnv_convertEx(utf8_.get(), source_.get(), &target, target + utf8Bytes_.size(), &source,
                      bytes_.data() + length, pivot_.data(), &pivotSource_, &pivotTarget_,
-                     pivot_.data() + pivot_.size(), false, length == 0, &error);
+                     pivot_.data() + pivot_.size(), false, static_cast<UBool>(length == 0), &error);
       text.append(utf8Bytes_.data(), target);
     }
     requireSuccess(error, "convert to UTF-8");

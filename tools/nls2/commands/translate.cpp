@@ -6,7 +6,6 @@
 
 #include <algorithm>
 #include <fmt/format.h>
-#include <iterator>
 #include <memory>
 #include <string>
 
@@ -103,7 +102,7 @@ Take word(const char *option, Target &target, const std::vector<const char *> &k
   };
 }
 
-std::vector<Option> inputOptions(Arguments &arguments) {
+std::vector<Option> optionsOf(Arguments &arguments) {
   constexpr uint64_t longest = 1 << 30;
   constexpr uint64_t most = std::numeric_limits<int64_t>::max();
   TranslateOptions &options = arguments.options;
@@ -123,11 +122,6 @@ std::vector<Option> inputOptions(Arguments &arguments) {
             into(arguments.fields)),
       value("out-length", "M", "the most bytes of an output record",
             numberInto("--out-length", options.outLength, 1, longest)),
-  };
-}
-
-std::vector<Option> outputOptions(TranslateOptions &options) {
-  return {
       flag("fill", "pad with blanks to M bytes", set(options.padding, nls2::padding::fill)),
       flag("keep-blanks", "keep the trailing blanks, or as many as fit in M",
            set(options.padding, nls2::padding::keep_blanks)),
@@ -154,11 +148,9 @@ std::vector<Option> outputOptions(TranslateOptions &options) {
 
 Command translateCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  std::vector<Option> options = inputOptions(*arguments);
-  std::ranges::move(outputOptions(arguments->options), std::back_inserter(options));
   return {.operands = {{"INPUT", "file to read; standard input if - or not given",
                         into(arguments->options.input)}},
-          .options = std::move(options),
+          .options = optionsOf(*arguments),
           .notes = notes,
           .run = [arguments] { return run(*arguments); }};
 }

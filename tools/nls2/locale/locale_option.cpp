@@ -162,7 +162,7 @@ std::string orderLocale(const LocaleOptions &options) {
   }
   const auto [variable, name] = environmentLocale();
   const std::string known = knownLocale(name);
-  const std::string locale = known.empty() ? localeOfLanguage(name) : known;
+  std::string locale = known.empty() ? localeOfLanguage(name) : known;
   if (locale.empty()) {
     throw usageError("{}: \"{}\" is not a known locale{}; give --locale", variable, printable(name),
                      localesNear(name));
