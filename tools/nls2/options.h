@@ -38,8 +38,9 @@ inline Option value(const char *name, const char *metavar, const char *help, Tak
   return {name, metavar, help, std::move(take), letter};
 }
 
-inline Option required(const char *name, const char *metavar, const char *help, Take take) {
-  return {name, metavar, help, std::move(take), '\0', true};
+inline Option required(Option option) {
+  option.isRequired = true;
+  return option;
 }
 
 // Arguments that are not options, taken in the order of the table.
@@ -111,11 +112,11 @@ Number parseNumber(const char *option, const std::string &text, Number least, Nu
 std::optional<uint32_t> wholeNumber(const std::string &text); // decimal or 0x...; never octal
 
 template <typename Number>
-Take numberInto(const char *option, Number &number, std::type_identity_t<Number> least,
-                std::type_identity_t<Number> most) {
-  return [=, &number](const std::string &text) {
-    number = parseNumber<Number>(option, text, least, most);
-  };
+Option numberValue(const char *name, const char *metavar, const char *help, Number &number,
+                   std::type_identity_t<Number> least, std::type_identity_t<Number> most) {
+  return value(name, metavar, help, [=, &number](const std::string &text) {
+    number = parseNumber<Number>(fmt::format("--{}", name).c_str(), text, least, most);
+  });
 }
 
 // Keeps the value as a text or an optional one, appends it to a list, or sets a flag.

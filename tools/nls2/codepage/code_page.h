@@ -46,8 +46,10 @@ std::string nearPages(const std::string &asked);
 int32_t parsePage(const char *option, const std::string &text);
 
 template <typename Page>
-Take pageInto(const char *option, Page &page) {
-  return [=, &page](const std::string &text) { page = parsePage(option, text); };
+Option pageValue(const char *name, const char *help, Page &page) {
+  return value(name, "PAGE", help, [=, &page](const std::string &text) {
+    page = parsePage(fmt::format("--{}", name).c_str(), text);
+  });
 }
 
 // The converter of a page that an option gives by number, or by any name that ICU knows, be it

@@ -134,12 +134,12 @@ private:
 
 Command catCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {
-      .operands = {{"FILE", "files to read, one after another; - is standard input",
-                    into(arguments->paths), 1, Operand::anyNumber}},
-      .options = {required("encoding", "NAME", "the files' encoding", into(arguments->encoding))},
-      .notes = notes,
-      .run = [arguments] { return Copier(arguments->encoding).copyAll(arguments->paths); }};
+  return {.operands = {{"FILE", "files to read, one after another; - is standard input",
+                        into(arguments->paths), 1, Operand::anyNumber}},
+          .options = {required(
+              value("encoding", "NAME", "the files' encoding", into(arguments->encoding)))},
+          .notes = notes,
+          .run = [arguments] { return Copier(arguments->encoding).copyAll(arguments->paths); }};
 }
 
 } // namespace nls2::tool

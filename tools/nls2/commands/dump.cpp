@@ -159,10 +159,9 @@ Command dumpCommand() {
   const auto arguments = std::make_shared<Arguments>();
   return {.operands = {{"FILE", "file to read; standard input if - or not given",
                         into(arguments->path)}},
-          .options = {required("from", "PAGE", "code page of the file",
-                               pageInto("--from", arguments->page)),
-                      value("record-length", "N", "bytes of every record",
-                            numberInto("--record-length", arguments->recordLength, 1, 1 << 30))},
+          .options = {required(pageValue("from", "code page of the file", arguments->page)),
+                      numberValue("record-length", "N", "bytes of every record",
+                                  arguments->recordLength, 1, 1 << 30)},
           .notes = notes,
           .run = [arguments] { return dumpFile(*arguments); }};
 }

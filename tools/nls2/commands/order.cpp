@@ -173,8 +173,8 @@ Command sortCommand() {
           .options = localeOptions(
               arguments->locale,
               {ignoreTrailing(*arguments),
-               value("record-length", "N", "sort records of N bytes instead of lines",
-                     numberInto("--record-length", arguments->recordLength, 1, Decoder::mostBytes)),
+               numberValue("record-length", "N", "sort records of N bytes instead of lines",
+                           arguments->recordLength, 1, Decoder::mostBytes),
                value("output", "OUT", "file to write; standard output if - or not given",
                      into(arguments->output), 'o')}),
           .notes = sortNotes,

@@ -148,11 +148,11 @@ std::string localesNear(const std::string &name) {
 
 std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own) {
   const auto takeLocale = [&](const std::string &text) { options.locale = parseLocale(text); };
-  own.insert(own.begin(),
-             {value("locale", "LOCALE", "whose rules: a name or language id of `nls2 locales`",
-                    takeLocale),
-              value("codepage", "PAGE", "code page of all texts; 1208 (UTF-8) by default",
-                    pageInto("--codepage", options.codepage))});
+  own.insert(
+      own.begin(),
+      {value("locale", "LOCALE", "whose rules: a name or language id of `nls2 locales`",
+             takeLocale),
+       pageValue("codepage", "code page of all texts; 1208 (UTF-8) by default", options.codepage)});
   return own;
 }
 
