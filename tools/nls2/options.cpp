@@ -62,8 +62,7 @@ private:
     if (code >= firstLong) {
       return *options_[static_cast<std::size_t>(code - firstLong)];
     }
-    return **std::find_if(options_.begin(), options_.end(),
-                          [=](const Option *option) { return option->letter == code; });
+    return **std::ranges::find(options_, code, &Option::letter);
   }
 
   // A letter, or a long option, of which `word` is the argument.
@@ -109,9 +108,8 @@ void checkOperands(const Command &command, int count, char **operands) {
 
 void checkRequired(const Command &command, const Given &given) {
   for (const Option &option : command.options) {
-    if (option.isRequired && std::none_of(given.begin(), given.end(), [&](const auto &each) {
-          return each.first == &option;
-        })) {
+    if (option.isRequired &&
+        std::ranges::find(given, &option, &Given::value_type::first) == given.end()) {
       throw usageError("--{} {} is missing", option.name, option.metavar);
     }
   }

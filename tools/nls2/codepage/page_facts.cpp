@@ -93,7 +93,7 @@ Json jsonOf(const PageFacts &facts) {
 std::vector<int32_t> numbersOf(const std::string &name) {
   std::vector<int32_t> numbers;
   const auto add = [&](std::optional<int32_t> number) {
-    if (number && std::find(numbers.begin(), numbers.end(), *number) == numbers.end()) {
+    if (number && std::ranges::find(numbers, *number) == numbers.end()) {
       numbers.push_back(*number);
     }
   };
@@ -108,8 +108,8 @@ std::vector<int32_t> numbersOf(const std::string &name) {
     add(inside && converterOf(*inside) ? inside : std::nullopt);
   }
   if (const auto converter = converterOf(name); numbers.empty() && converter) {
-    std::copy_if(pagesWithNames.begin(), pagesWithNames.end(), std::back_inserter(numbers),
-                 [&](int32_t number) { return converterOf(number) == converter; });
+    std::ranges::copy_if(pagesWithNames, std::back_inserter(numbers),
+                         [&](int32_t number) { return converterOf(number) == converter; });
   }
   return numbers;
 }
@@ -159,7 +159,7 @@ Answer lookUpPage(const std::string &asked) {
   std::string name = asked;
   if (const auto given = wholeNumber(asked)) {
     const auto number = pageNumber(asked);
-    const auto *listed = std::find(pagesWithNames.begin(), pagesWithNames.end(), number);
+    const auto *listed = std::ranges::find(pagesWithNames, number);
     if (number && (listed != pagesWithNames.end() || converterOf(*number))) {
       return describe({*number}, namesOf(*number));
     }

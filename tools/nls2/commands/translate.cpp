@@ -93,7 +93,7 @@ Take set(nls2::padding &padding, nls2::padding chosen) {
 template <typename Kind, typename Target>
 Take word(const char *option, Target &target, const std::vector<const char *> &kinds) {
   return [=, &target](const std::string &text) {
-    const auto found = std::find(kinds.begin(), kinds.end(), text);
+    const auto found = std::ranges::find(kinds, text);
     if (found == kinds.end()) {
       throw usageError("{}: \"{}\" is not {} or {}", option, printable(text),
                        fmt::join(kinds.begin(), kinds.end() - 1, ", "), kinds.back());
