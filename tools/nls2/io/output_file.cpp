@@ -165,8 +165,7 @@ void OutputFile::openTemporary(mode_t mode) {
 }
 
 // Calls `make` with names beside the target until one is free.
-template <typename Make>
-void OutputFile::takeFreeName(Make make) {
+void OutputFile::takeFreeName(const std::function<int(const char *)> &make) {
   const SignalsHeldBack held;
   int made = -1;
   for (int attempt = 0; made < 0 && attempt < 1000; ++attempt) {

@@ -1,6 +1,7 @@
 // Where a command writes: standard output, a file that appears when it is complete, or a device.
 #pragma once
 
+#include <functional>
 #include <string>
 #include <string_view>
 #include <sys/stat.h>
@@ -34,8 +35,7 @@ private:
   void makeFile(const std::string &path);
   void replaceFile(const std::string &path, const struct stat &existing);
   void openTemporary(mode_t mode);
-  template <typename Make>
-  void takeFreeName(Make make);
+  void takeFreeName(const std::function<int(const char *)> &make);
   void giveUpName();
   void publish(bool sync);
   [[noreturn]] void fail() const;
