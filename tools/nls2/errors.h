@@ -3,13 +3,15 @@
 
 #include "nls2/error.hpp"
 
+#include <atomic>
 #include <cstdint>
 #include <cstdio>
 #include <fmt/core.h>
-#include <optional>
+#include <new>
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <unicode/utypes.h>
 #include <utility>
 
 namespace nls2::tool {
@@ -46,11 +48,30 @@ public:
   explicit TextFault(const std::string &text) : Error(exitFailed, text) {}
 };
 
-// Why a piece of the input cannot be used; nothing where it can.
-using Refusal = std::optional<std::string>;
-
 // A status of the library or of ICU in words.
 inline std::string statusText(int32_t status) { return category().message(status); }
+
+// Throws where ICU failed: std::bad_alloc without memory, else Error, which says what could not be
+// done.
+inline void requireSuccess(UErrorCode status, const char *what) {
+  if (status == U_MEMORY_ALLOCATION_ERROR) {
+    throw std::bad_alloc();
+  }
+  if (U_FAILURE(status)) {
+    throw failure("cannot {}: {}", what, statusText(status));
+  }
+}
+
+// Whether a request of ICU's for memory has failed. Some of its functions report that as a name that
+// is unknown, or not at all.
+inline std::atomic<bool> ranOutOfMemory = false;
+
+// Throws std::bad_alloc where one has. To be called before an answer is given.
+inline void requireMemory() {
+  if (ranOutOfMemory) {
+    throw std::bad_alloc();
+  }
+}
 
 // A file name for a message: its control characters are escaped, U+0080 to U+009F too.
 inline std::string printable(std::string_view name) {

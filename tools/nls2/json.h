@@ -1,57 +1,93 @@
-// JSON values to be written: all that a renderer of facts needs.
+// What commands find, as text and as JSON by libjansson.
 #pragma once
 
 #include <concepts>
-#include <cstdint>
-#include <functional>
 #include <initializer_list>
+#include <jansson.h>
 #include <memory>
+#include <new>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <unicode/unistr.h>
 #include <utility>
-
-struct json_t;
 
 namespace nls2::tool {
 
-// Every function throws std::bad_alloc without memory. Copies share the value.
+// A value to be written. Every function throws std::bad_alloc without memory. Copies share the value.
 class Json {
 public:
-  // Members are written in the order in which they were set.
-  static Json object(std::initializer_list<std::pair<const char *, Json>> members = {});
-  Json &set(const char *key, const Json &value);
-
-  // Of what `render` makes of each element.
-  template <class Range, class Render = std::identity>
-  static Json array(const Range &range, Render render = {}) {
-    Json values = emptyArray();
-    for (const auto &each : range) {
-      values.append(render(each));
-    }
-    return values;
-  }
-
-  Json(std::nullptr_t = nullptr);
-  Json(bool value);
-  Json(double value);
-  Json(std::integral auto value) : Json(integer(static_cast<int64_t>(value))) {}
-  Json(std::string_view text); // bytes that are not valid UTF-8 become U+FFFD
+  Json(std::nullptr_t = nullptr) : Json(json_null()) {}
+  Json(bool value) : Json(json_boolean(value)) {}
+  Json(double value) : Json(json_real(value)) {}
+  Json(std::integral auto value) : Json(json_integer(static_cast<json_int_t>(value))) {}
   Json(const std::string &text) : Json(std::string_view(text)) {}
-  Json(const char *text) : Json(std::string_view(text)) {}
+  Json(const char *text) : Json(text != nullptr ? Json(std::string_view(text)) : Json()) {}
   template <typename Value>
   Json(const std::optional<Value> &value) : Json(value ? Json(*value) : Json()) {}
 
+  // Bytes that are not valid UTF-8 become U+FFFD.
+  Json(std::string_view text) {
+    const auto units =
+        icu::UnicodeString::fromUTF8({text.data(), static_cast<int32_t>(text.size())});
+    require(!units.isBogus());
+    std::string valid;
+    units.toUTF8String(valid);
+    *this = Json(json_stringn(valid.data(), valid.size()));
+  }
+
+  // Members are written in the order in which they were set.
+  static Json object(std::initializer_list<std::pair<const char *, Json>> members = {}) {
+    Json object(json_object());
+    for (const auto &[key, value] : members) {
+      object.set(key, value);
+    }
+    return object;
+  }
+  Json &set(const char *key, const Json &value) {
+    require(json_object_set(value_.get(), key, value.value_.get()) == 0);
+    return *this;
+  }
+
+  template <class Range = std::initializer_list<Json>>
+  static Json array(const Range &range = {}) {
+    Json array(json_array());
+    for (const auto &each : range) {
+      array.append(each);
+    }
+    return array;
+  }
+  void append(const Json &value) {
+    require(json_array_append(value_.get(), value.value_.get()) == 0);
+  }
+
   // Indented by two blanks, and ended by a newline.
-  std::string text() const;
+  std::string text() const {
+    constexpr std::size_t style = JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9);
+    std::string text(json_dumpb(value_.get(), nullptr, 0, style), '\0');
+    require(!text.empty() &&
+            json_dumpb(value_.get(), text.data(), text.size(), style) == text.size());
+    return text + "\n";
+  }
 
 private:
-  explicit Json(json_t *owned); // null is want of memory
-  static json_t *integer(int64_t value);
-  static Json emptyArray();
-  void append(const Json &value);
+  explicit Json(json_t *owned) : value_(owned, json_decref) { require(owned != nullptr); }
+
+  static void require(bool done) {
+    if (!done) {
+      throw std::bad_alloc();
+    }
+  }
 
   std::shared_ptr<json_t> value_;
+};
+
+// The same facts for people and for programs.
+struct Answer {
+  std::string text;
+  Json json;
+
+  std::string rendered(bool asJson) const { return asJson ? json.text() : text; }
 };
 
 } // namespace nls2::tool

@@ -1,47 +1,40 @@
 // nls2: the library's work on files, from the command line.
 
-#include "commands.h"
-#include "io/print.h"
-#include "memory.h"
+#include "errors.h"
+#include "io/output_file.h"
 #include "near_names.h"
 #include "nls2.h"
+#include "options.h"
 
 #include <algorithm>
-#include <array>
 #include <csignal>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
 #include <fcntl.h>
+#include <iterator>
+#include <memory>
 #include <new>
 #include <string_view>
+#include <unicode/uclean.h>
 #include <unistd.h>
 
 namespace nls2::tool {
 
 namespace {
 
-constexpr std::array commands{
-    CommandEntry{"translate", "Translate fixed-length records to another code page", exitFailed,
-                 translateCommand},
-    CommandEntry{"locales", "List the locales that the library knows", exitFailed, localesCommand},
-    CommandEntry{"codepages", "List code pages by number and by Windows name", exitFailed,
-                 codepagesCommand},
-    CommandEntry{"detect", "Report the Unicode signatures of files", exitUsage, detectCommand},
-    CommandEntry{"dump", "Show a file in hex and as text of a code page", exitFailed, dumpCommand},
-    CommandEntry{"cat", "Write text files in any encoding to standard output as UTF-8", exitFailed,
-                 catCommand},
-    CommandEntry{"compare", "Compare two strings by the rules of a language", exitUsage,
-                 compareCommand},
-    CommandEntry{"sort", "Sort lines or fixed-length records by the rules of a language",
-                 exitFailed, sortCommand},
-    CommandEntry{"find", "Print the lines in which a text occurs", exitUsage, findCommand}};
+constexpr CommandEntry commands[] = {
+    {"translate", "Translate fixed-length records to another code page", translateCommand},
+    {"locales", "List the locales that the library knows", localesCommand},
+    {"codepages", "List code pages by number and by Windows name", codepagesCommand},
+    {"detect", "Report the Unicode signatures of files", detectCommand, exitUsage},
+    {"dump", "Show a file in hex and as text of a code page", dumpCommand},
+    {"cat", "Write text files in any encoding to standard output as UTF-8", catCommand},
+    {"compare", "Compare two strings by the rules of a language", compareCommand, exitUsage},
+    {"sort", "Sort lines or fixed-length records by the rules of a language", sortCommand},
+    {"find", "Print the lines in which a text occurs", findCommand, exitUsage}};
 
 int failureCode = exitFailed; // of the command
-
-constexpr const char *generalNotes =
-    "Exit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of detect,\n"
-    "compare and find, which answer a question: 0 yes, 1 no, 2 trouble.\nSee nls2(1).\n";
 
 // A standard stream that the caller closed must not become a file opened here: its descriptor is
 // taken by an open file that can only fail.
@@ -54,9 +47,8 @@ void occupyStandardStreams() {
 }
 
 const CommandEntry *commandNamed(std::string_view name) {
-  const auto found = std::find_if(commands.begin(), commands.end(),
-                                  [=](const CommandEntry &entry) { return name == entry.name; });
-  return found == commands.end() ? nullptr : &*found;
+  const auto *found = std::ranges::find(commands, name, &CommandEntry::name);
+  return found == std::end(commands) ? nullptr : found;
 }
 
 Error unknownCommand(const std::string &name) {
@@ -67,8 +59,6 @@ Error unknownCommand(const std::string &name) {
   return usageError("unknown command {}{}", printable(name), didYouMean(nearNames(name, names)));
 }
 
-std::string versionText() { return std::string(NLS2_BuildStamp()) + "\n"; }
-
 std::string generalHelp() {
   std::string text = "Usage: nls2 COMMAND [OPTION]... [OPERAND]...\n"
                      "National-language support from the command line.\n\n";
@@ -77,53 +67,45 @@ std::string generalHelp() {
   }
   return text + helpLine("help [COMMAND]", "Print this help, or that of a command") +
          helpLine("-h, --help", "Print this help, or a command's after its name") +
-         helpLine("--version", "Print how the library was built") + "\n" + generalNotes;
+         helpLine("--version", "Print how the library was built") +
+         "\nExit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of detect,\n"
+         "compare and find, which answer a question: 0 yes, 1 no, 2 trouble.\nSee nls2(1).\n";
 }
 
-// Options before the command, `nls2 help`, or nothing at all.
-int runWithoutCommand(int argc, char **argv) {
-  const std::string first = argc > 1 ? argv[1] : "-";
-  const bool isHelp = first == "help";
-  std::string topic;
-  Command general;
-  if (isHelp) {
-    general.operands.push_back({"COMMAND", "", into(topic)});
-  } else if (!first.starts_with("-")) {
+std::string helpOn(const CommandEntry *entry) {
+  return entry != nullptr ? helpOf(*entry, entry->make()) : generalHelp();
+}
+
+// `nls2 help`, options without a command, or nothing at all.
+Command generalCommand(const std::string &first) {
+  if (first.starts_with("-")) {
+    return {.run = []() -> int { throw usageError("COMMAND is missing"); }};
+  }
+  if (first != "help") {
     throw unknownCommand(first);
   }
-  const Request request = parse(general, isHelp ? argc - 1 : argc, isHelp ? argv + 1 : argv);
-  const CommandEntry *entry = commandNamed(topic);
-  if (!isHelp && request == Request::work) {
-    throw usageError("COMMAND is missing");
-  }
-  if (entry == nullptr && !topic.empty()) {
-    throw unknownCommand(topic);
-  }
-  print(request == Request::version ? versionText()
-        : entry != nullptr          ? helpOf(*entry, entry->make())
-                                    : generalHelp());
-  return exitDone;
+  const auto topic = std::make_shared<std::string>();
+  return {.operands = {{"COMMAND", "", into(*topic)}}, .run = [topic] {
+            const CommandEntry *entry = commandNamed(*topic);
+            if (entry == nullptr && !topic->empty()) {
+              throw unknownCommand(*topic);
+            }
+            return print(helpOn(entry)), exitDone;
+          }};
 }
 
-int runCommand(const CommandEntry &entry, int argc, char **argv) {
-  const Command command = entry.make();
-  const Request request = parse(command, argc, argv);
-  if (request == Request::work) {
+int runCommand(const CommandEntry *entry, int argc, char **argv) {
+  const std::string first = argc > 1 ? argv[1] : "-";
+  const int own = first.starts_with("-") ? 0 : 1; // words before the command's own
+  const Command command = entry != nullptr ? entry->make() : generalCommand(first);
+  switch (parse(command, argc - own, argv + own)) {
+  case Request::help:
+    return print(helpOn(entry)), exitDone;
+  case Request::version:
+    return print(fmt::format("{}\n", NLS2_BuildStamp())), exitDone;
+  default:
     return command.run();
   }
-  print(request == Request::help ? helpOf(entry, command) : versionText());
-  return exitDone;
-}
-
-int report(const CommandEntry *entry, const Error &error) {
-  requireMemory();
-  if (error.code() != exitUsage) {
-    complain(error.what());
-    return failureCode;
-  }
-  std::fprintf(stderr, "nls2: %s; see nls2%s%s --help\n", error.what(), entry != nullptr ? " " : "",
-               entry != nullptr ? entry->name : "");
-  return exitUsage;
 }
 
 // The one place where failures become messages and exit codes. What ICU reports without memory is
@@ -131,12 +113,17 @@ int report(const CommandEntry *entry, const Error &error) {
 int run(const CommandEntry *entry, int argc, char **argv) noexcept {
   try {
     try {
-      const int code =
-          entry != nullptr ? runCommand(*entry, argc - 1, argv + 1) : runWithoutCommand(argc, argv);
+      const int code = runCommand(entry, argc, argv);
       requireMemory();
       return code;
     } catch (const Error &error) {
-      return report(entry, error);
+      requireMemory();
+      if (error.code() == exitUsage) {
+        std::fprintf(stderr, "nls2: %s; see nls2%s%s --help\n", error.what(),
+                     entry != nullptr ? " " : "", entry != nullptr ? entry->name : "");
+        return exitUsage;
+      }
+      complain(error.what());
     }
   } catch (const std::bad_alloc &) {
     complain("out of memory");
@@ -144,6 +131,21 @@ int run(const CommandEntry *entry, int argc, char **argv) noexcept {
     complain(error.what());
   }
   return failureCode;
+}
+
+// Has to come before any other use of ICU.
+void watchMemory() {
+  static constexpr auto noted = [](void *block) {
+    if (block == nullptr) {
+      ranOutOfMemory = true;
+    }
+    return block;
+  };
+  UErrorCode status = U_ZERO_ERROR;
+  u_setMemoryFunctions(
+      nullptr, [](const void *, std::size_t size) { return noted(std::malloc(size)); },
+      [](const void *, void *block, std::size_t size) { return noted(std::realloc(block, size)); },
+      [](const void *, void *block) { std::free(block); }, &status);
 }
 
 // Without memory for an exception the process would be aborted.

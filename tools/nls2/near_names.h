@@ -29,21 +29,22 @@ inline std::size_t letterDistance(std::string_view a, std::string_view b) {
   return table[a.size()][b.size()];
 }
 
-// Up to `most` of the known names that are nearest and differ in few letters.
-inline std::vector<std::string>
-nearNames(const std::string &unknown, const std::vector<std::string> &known, std::size_t most = 3) {
+// Up to three of the known names that are nearest and differ in few letters.
+inline std::vector<std::string> nearNames(const std::string &unknown,
+                                          const std::vector<std::string> &known) {
   std::size_t nearest = 1 + unknown.size() / 4;
   std::vector<std::string> names;
   for (const std::string &name : known) {
     const std::size_t letters = letterDistance(unknown, name);
-    if (letters > nearest || letters >= name.size()) {
+    if (letters > nearest || letters >= name.size() ||
+        std::ranges::find(names, name) != names.end()) {
       continue;
     }
     if (letters < nearest) {
       names.clear();
       nearest = letters;
     }
-    if (names.size() < most && std::find(names.begin(), names.end(), name) == names.end()) {
+    if (names.size() < 3) {
       names.push_back(name);
     }
   }

@@ -16,9 +16,8 @@ namespace {
 // What getopt_long returns for the long option at an index of the table; letters come as they are.
 constexpr int firstLong = 256;
 
-const Option helpOption{.name = "help", .letter = 'h', .help = "print this help", .take = {}};
-const Option versionOption{
-    .name = "version", .help = "print how the library was built", .take = {}};
+const Option helpOption = flag("help", "print this help", {}, 'h');
+const Option versionOption = flag("version", "print how the library was built", {});
 
 using Given = std::vector<std::pair<const Option *, std::string>>;
 
@@ -63,29 +62,27 @@ private:
     if (code >= firstLong) {
       return *options_[static_cast<std::size_t>(code - firstLong)];
     }
-    return **std::find_if(options_.begin(), options_.end(),
-                          [=](const Option *option) { return option->letter == code; });
+    return **std::ranges::find(options_, code, &Option::letter);
   }
 
+  // A letter, or a long option, of which `word` is the argument.
   Error unknown(int code, const std::string &word) const {
     if (code >= firstLong) {
       return usageError("--{} takes no value", optionOf(code).name);
     }
+    const std::string letter(code != 0 ? 1 : 0, static_cast<char>(code));
+    const std::string name = code != 0 ? "-" + letter : word.substr(0, word.find('='));
     std::vector<std::string> names;
+    std::vector<std::string> longer;
     for (const Option *option : options_) {
       names.push_back(std::string("--") + option->name);
+      if (names.back().starts_with(code != 0 ? "--" + letter : name)) {
+        longer.push_back(names.back());
+      }
     }
-    if (code != 0) {
-      std::erase_if(names, [=](const std::string &name) { return name[2] != code; });
-      return usageError("unknown option -{}{}", printable(std::string(1, static_cast<char>(code))),
-                        didYouMean(names));
-    }
-    const std::string name = word.substr(0, word.find('='));
-    std::vector<std::string> longer;
-    std::copy_if(names.begin(), names.end(), std::back_inserter(longer),
-                 [&](const std::string &known) { return known.starts_with(name); });
+    const bool isLong = code == 0;
     return usageError("unknown option {}{}", printable(name),
-                      didYouMean(longer.empty() ? nearNames(name, names) : longer));
+                      didYouMean(isLong && longer.empty() ? nearNames(name, names) : longer));
   }
 
   std::vector<const Option *> options_;
@@ -111,9 +108,8 @@ void checkOperands(const Command &command, int count, char **operands) {
 
 void checkRequired(const Command &command, const Given &given) {
   for (const Option &option : command.options) {
-    if (option.isRequired && std::none_of(given.begin(), given.end(), [&](const auto &each) {
-          return each.first == &option;
-        })) {
+    if (option.isRequired &&
+        std::ranges::find(given, &option, &Given::value_type::first) == given.end()) {
       throw usageError("--{} {} is missing", option.name, option.metavar);
     }
   }

@@ -1,4 +1,4 @@
-// The command line: commands as tables of options and operands, and the parser that reads them.
+// The command line: the commands as tables of options and operands, and the parser that reads them.
 #pragma once
 
 #include "errors.h"
@@ -11,6 +11,7 @@
 #include <optional>
 #include <string>
 #include <type_traits>
+#include <utility>
 #include <vector>
 
 namespace nls2::tool {
@@ -20,38 +21,62 @@ namespace nls2::tool {
 using Take = std::function<void(const std::string &)>;
 
 struct Option {
-  const char *name = "";         // without its two dashes
-  char letter = '\0';            // of the short form; none by default
-  const char *metavar = nullptr; // of the value; null for a flag, whose `take` gets an empty text
-  const char *help = "";
+  const char *name;    // without its two dashes
+  const char *metavar; // of the value; null for a flag, whose `take` gets an empty text
+  const char *help;
   Take take;
+  char letter = '\0'; // of the short form; none by default
   bool isRequired = false;
 };
+
+inline Option flag(const char *name, const char *help, Take take, char letter = '\0') {
+  return {name, nullptr, help, std::move(take), letter};
+}
+
+inline Option value(const char *name, const char *metavar, const char *help, Take take,
+                    char letter = '\0') {
+  return {name, metavar, help, std::move(take), letter};
+}
+
+inline Option required(Option option) {
+  option.isRequired = true;
+  return option;
+}
 
 // Arguments that are not options, taken in the order of the table.
 struct Operand {
   static constexpr std::size_t anyNumber = std::numeric_limits<std::size_t>::max();
 
-  const char *metavar = "";
-  const char *help = "";
+  const char *metavar;
+  const char *help;
   Take take;
   std::size_t least = 0;
   std::size_t most = 1;
 };
 
 struct Command {
-  std::vector<Operand> operands;
-  std::vector<Option> options;
+  std::vector<Operand> operands = {};
+  std::vector<Option> options = {};
   const char *notes = "";   // of --help, at most six lines
   std::function<int()> run; // the exit code; throws Error
 };
+
+Command catCommand();
+Command codepagesCommand();
+Command compareCommand();
+Command detectCommand();
+Command dumpCommand();
+Command findCommand();
+Command localesCommand();
+Command sortCommand();
+Command translateCommand();
 
 // What stands in the list of commands.
 struct CommandEntry {
   const char *name;
   const char *summary;
-  ExitCode failureCode; // 2 for a command whose 1 means "no"
   Command (*make)();
+  ExitCode failureCode = exitFailed; // 2 for a command whose 1 means "no"
 };
 
 // What a command line asks for.
@@ -85,6 +110,14 @@ Number parseNumber(const char *option, const std::string &text, Number least, Nu
   return *number;
 }
 std::optional<uint32_t> wholeNumber(const std::string &text); // decimal or 0x...; never octal
+
+template <typename Number>
+Option numberValue(const char *name, const char *metavar, const char *help, Number &number,
+                   std::type_identity_t<Number> least, std::type_identity_t<Number> most) {
+  return value(name, metavar, help, [=, &number](const std::string &text) {
+    number = parseNumber<Number>(fmt::format("--{}", name).c_str(), text, least, most);
+  });
+}
 
 // Keeps the value as a text or an optional one, appends it to a list, or sets a flag.
 template <class Value>

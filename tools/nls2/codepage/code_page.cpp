@@ -3,12 +3,13 @@
 #include "codepage/code_page.h"
 
 #include "errors.h"
-#include "memory.h"
 #include "near_names.h"
 #include "options.h"
 
 #include <algorithm>
 #include <limits>
+#include <set>
+#include <unicode/unistr.h>
 
 namespace nls2::tool {
 
@@ -46,7 +47,7 @@ std::vector<std::string> meaningsOf(const std::string &name) {
   for (int32_t i = 0; status == U_AMBIGUOUS_ALIAS_WARNING && i < ucnv_countAvailable(); ++i) {
     const char *converter = ucnv_getAvailableName(i);
     const std::vector<std::string> aliases = aliasesOf(converter);
-    if (std::any_of(aliases.begin(), aliases.end(), [&](const std::string &alias) {
+    if (std::ranges::any_of(aliases, [&](const std::string &alias) {
           return ucnv_compareNames(alias.c_str(), name.c_str()) == 0;
         })) {
       meanings.emplace_back(converter);
@@ -60,17 +61,19 @@ std::vector<std::string> meaningsOf(const std::string &name) {
 std::optional<int32_t> numberOf(const std::string &name) {
   const auto windows = windowsPage(name);
   const auto converter = converterOf(name);
-  const auto opensIt = [&](int32_t number) { return converterOf(number) == converter; };
-  if (!converter || (windows && opensIt(*windows))) {
+  const auto opensIt = [&](std::optional<int32_t> number) {
+    return number && converterOf(*number) == converter;
+  };
+  if (!converter || opensIt(windows)) {
     return windows;
   }
   if (!meaningsOf(name).empty()) {
     return {};
   }
-  if (const auto ccsid = ccsidOf(name); ccsid && opensIt(*ccsid)) {
+  if (const auto ccsid = ccsidOf(name); opensIt(ccsid)) {
     return ccsid;
   }
-  const auto found = std::find_if(pagesWithNames.begin(), pagesWithNames.end(), opensIt);
+  const auto *found = std::ranges::find_if(pagesWithNames, opensIt);
   return found != pagesWithNames.end() ? std::optional(*found) : std::nullopt;
 }
 
@@ -138,11 +141,10 @@ std::optional<int32_t> windowsPage(const std::string &name) {
   return {};
 }
 
-std::vector<std::string> namesWithNumbers() {
-  std::vector<std::string> names = allPageNames();
+std::set<std::string> namesWithNumbers() {
+  const std::vector<std::string> all = allPageNames();
+  std::set<std::string> names(all.begin(), all.end());
   std::erase_if(names, [](const std::string &name) { return !numberOf(name); });
-  std::sort(names.begin(), names.end());
-  names.erase(std::unique(names.begin(), names.end()), names.end());
   return names;
 }
 
@@ -155,10 +157,9 @@ std::string nearPages(const std::string &asked) {
 }
 
 int32_t parsePage(const char *option, const std::string &text) {
-  if (const auto number = givenNumber(option, text)) {
-    return *number;
-  }
-  if (const auto number = numberOf(text)) {
+  auto number = givenNumber(option, text);
+  number = number ? number : numberOf(text);
+  if (number) {
     return *number;
   }
   if (const auto meanings = meaningsOf(text); !meanings.empty()) {
@@ -178,11 +179,10 @@ converter openEncoding(const char *option, const std::string &text) {
     return CodePage(*number, option).take();
   }
   UErrorCode error = U_ZERO_ERROR;
-  nls2::converter opened = openNamed(text, error);
-  if (!opened) {
-    throw unknownPage(option, text);
+  if (nls2::converter opened = openNamed(text, error)) {
+    return opened;
   }
-  return opened;
+  throw unknownPage(option, text);
 }
 
 CodePage::CodePage(int32_t number, const char *option) : number_(number) {
@@ -194,25 +194,22 @@ CodePage::CodePage(int32_t number, const char *option) : number_(number) {
   }
 }
 
-std::string CodePage::encode(std::u16string_view text) const {
-  std::string bytes(fewBytes, '\0');
-  UErrorCode error = U_ZERO_ERROR;
-  const int32_t length = ucnv_fromUChars(converter(), bytes.data(), fewBytes, text.data(),
-                                         static_cast<int32_t>(text.size()), &error);
-  bytes.resize(U_FAILURE(error) ? 0 : static_cast<std::size_t>(length));
-  return bytes;
-}
-
 // The second of two equal characters carries no signature, and what is left is the first one's.
 std::optional<EncodedCharacter> CodePage::encoded(char16_t character) const {
-  const std::string one = encode(std::u16string(1, character));
-  const std::string two = encode(std::u16string(2, character));
-  char16_t back[fewBytes] = {};
+  const auto encode = [this](const icu::UnicodeString &text) {
+    std::string bytes(fewBytes, '\0');
+    UErrorCode error = U_ZERO_ERROR;
+    const int32_t length = text.extract(bytes.data(), fewBytes, converter(), error);
+    bytes.resize(U_FAILURE(error) ? 0 : static_cast<std::size_t>(length));
+    return bytes;
+  };
+  const icu::UnicodeString text(character);
+  const std::string one = encode(text);
+  const std::string two = encode(text + text);
   UErrorCode error = U_ZERO_ERROR;
-  const int32_t units = ucnv_toUChars(converter(), back, fewBytes, one.data(),
-                                      static_cast<int32_t>(one.size()), &error);
+  const icu::UnicodeString back(one.data(), static_cast<int32_t>(one.size()), converter(), error);
   requireMemory();
-  if (U_FAILURE(error) || units != 1 || back[0] != character) {
+  if (U_FAILURE(error) || back != text) {
     return {};
   }
   return EncodedCharacter{two.substr(one.size()), 2 * one.size() - two.size()};

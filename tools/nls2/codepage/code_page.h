@@ -3,14 +3,14 @@
 #pragma once
 
 #include "nls2/code_page.hpp"
+#include "options.h"
 
 #include <array>
 #include <cstdint>
 #include <optional>
+#include <set>
 #include <string>
-#include <string_view>
 #include <utility>
-#include <vector>
 
 namespace nls2::tool {
 
@@ -35,8 +35,8 @@ std::optional<int32_t> ccsidOf(const std::string &name);
 // The number of exactly this Windows name of the library's.
 std::optional<int32_t> windowsPage(const std::string &name);
 
-// The names that parsePage() finds a number for, sorted.
-std::vector<std::string> namesWithNumbers();
+// The names that parsePage() finds a number for.
+std::set<std::string> namesWithNumbers();
 
 // " (did you mean cp037?)" for a name that is unknown, or a number that has a Windows name.
 std::string nearPages(const std::string &asked);
@@ -44,6 +44,13 @@ std::string nearPages(const std::string &asked);
 // The number of a code page that an option gives by number or by name. Whether the number opens is
 // seen when the page is. Throws usageError.
 int32_t parsePage(const char *option, const std::string &text);
+
+template <typename Page>
+Option pageValue(const char *name, const char *help, Page &page) {
+  return value(name, "PAGE", help, [=, &page](const std::string &text) {
+    page = parsePage(fmt::format("--{}", name).c_str(), text);
+  });
+}
 
 // The converter of a page that an option gives by number, or by any name that ICU knows, be it
 // ambiguous or without a number. Throws usageError.
@@ -69,8 +76,6 @@ public:
   std::optional<EncodedCharacter> encoded(char16_t character) const;
 
 private:
-  std::string encode(std::u16string_view text) const;
-
   int32_t number_;
   nls2::converter converter_;
 };

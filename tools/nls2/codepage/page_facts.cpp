@@ -1,9 +1,8 @@
-// What the library and ICU make of code pages, as text and as JSON.
+// What the library and ICU make of code pages.
 
 #include "codepage/page_facts.h"
 
 #include "codepage/code_page.h"
-#include "options.h"
 
 #include <algorithm>
 #include <iterator>
@@ -14,24 +13,87 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr const char *prefixes[] = {"ibm-", "cp", "windows-"}; // that people write before numbers
+constexpr std::array prefixes{"ibm-", "cp", "windows-"}; // that people write before numbers
 
-// The 1252 of "windows-1252": the number that somebody who knows the name would write.
-std::optional<int32_t> numberInside(const std::string &name) {
-  for (const std::string prefix : prefixes) {
-    if (name.starts_with(prefix)) {
-      return pageNumber(name.substr(prefix.size()));
-    }
+// What opening a number shows. All but the first three are empty where it does not open.
+struct PageFacts {
+  int32_t number = 0;
+  int32_t status = 0;
+  int32_t twoNulls = 0;
+  bool opens = false;
+  std::optional<std::string> converter; // nothing where it has no name
+  std::optional<int32_t> ccsid;
+  std::optional<int32_t> maxCharSize;
+
+  std::string name() const { return converter.value_or("without a name"); }
+};
+
+PageFacts factsOf(int32_t number) {
+  PageFacts facts;
+  facts.number = number;
+  const nls2::converter opened(NLS2_MapCodepageIdToName(number, &facts.twoNulls, &facts.status));
+  if (facts.status == U_MEMORY_ALLOCATION_ERROR) {
+    throw std::bad_alloc(); // a page that would open must not be called one that does not
   }
-  return {};
+  if (opened) {
+    facts.opens = true;
+    facts.converter = converterOf(number);
+    facts.ccsid = facts.converter ? ccsidOf(*facts.converter) : std::nullopt;
+    facts.maxCharSize = ucnv_getMaxCharSize(opened.get());
+  }
+  return facts;
 }
 
-// ICU's number of the name, that of the library's Windows names, and the one inside the name; for a
-// name without any of them, the numbers that the library opens as the same converter.
+std::vector<std::string> windowsNamesOf(int32_t number) {
+  std::vector<std::string> names;
+  for (const CcsidMapEntry &entry : windows_names()) {
+    if (entry.ccsid == static_cast<uint32_t>(number)) {
+      names.emplace_back(entry.name);
+    }
+  }
+  return names;
+}
+
+std::string textOf(const PageFacts &facts) {
+  std::string text = fmt::format("Code page {}\n", facts.number);
+  const auto line = [&](const char *what, const std::string &value) {
+    text += fmt::format("  {:<20} {}\n", what, value);
+  };
+  line("opens", facts.opens ? "yes" : "no: " + statusText(facts.status));
+  if (facts.opens) {
+    line("converter", facts.name());
+    line("CCSID", facts.ccsid ? std::to_string(*facts.ccsid) : "none");
+    line("largest character", fmt::format("{} byte(s) a UTF-16 unit", *facts.maxCharSize));
+  }
+  line("two-null terminator", facts.twoNulls != 0 ? "yes" : "no");
+  for (const std::string &name : windowsNamesOf(facts.number)) {
+    line("Windows name", name);
+  }
+  return text;
+}
+
+Json jsonOf(const PageFacts &facts) {
+  return Json::object(
+      {{"codepage", facts.number},
+       {"opens", facts.opens},
+       {"converter", facts.converter},
+       {"ccsid", facts.ccsid},
+       {"twoNullTerminator", facts.twoNulls != 0},
+       {"maxCharSize", facts.maxCharSize},
+       {"windowsNames", Json::array(windowsNamesOf(facts.number))},
+       {"status", facts.status},
+       // ICU's name of the status, for programs; people get statusText().
+       {"statusName",
+        fmt::format("{} ({})", u_errorName(static_cast<UErrorCode>(facts.status)), facts.status)}});
+}
+
+// ICU's number of the name, that of the library's Windows names, and the one inside the name, as
+// 1252 is in windows-1252; for a name without any of them, the numbers that the library opens as
+// the same converter.
 std::vector<int32_t> numbersOf(const std::string &name) {
   std::vector<int32_t> numbers;
   const auto add = [&](std::optional<int32_t> number) {
-    if (number && std::find(numbers.begin(), numbers.end(), *number) == numbers.end()) {
+    if (number && std::ranges::find(numbers, *number) == numbers.end()) {
       numbers.push_back(*number);
     }
   };
@@ -41,179 +103,100 @@ std::vector<int32_t> numbersOf(const std::string &name) {
   if (status == U_ZERO_ERROR) {
     add(static_cast<int32_t>(windows));
   }
-  if (const auto inside = numberInside(name); inside && converterOf(*inside)) {
-    add(inside);
+  for (const std::string prefix : prefixes) {
+    const auto inside = pageNumber(name.starts_with(prefix) ? name.substr(prefix.size()) : "");
+    add(inside && converterOf(*inside) ? inside : std::nullopt);
   }
   if (const auto converter = converterOf(name); numbers.empty() && converter) {
-    std::copy_if(pagesWithNames.begin(), pagesWithNames.end(), std::back_inserter(numbers),
-                 [&](int32_t number) { return converterOf(number) == converter; });
+    std::ranges::copy_if(pagesWithNames, std::back_inserter(numbers),
+                         [&](int32_t number) { return converterOf(number) == converter; });
   }
   return numbers;
 }
 
-FoundPages lookUpName(const std::string &name) {
-  FoundPages found{.numbers = {}, .names = {{name, converterOf(name)}}};
-  for (const int32_t number : name.empty() ? std::vector<int32_t>() : numbersOf(name)) {
-    found.numbers.push_back(describePage(number));
-  }
-  if (found.numbers.empty() && !found.names[0].converter) {
-    throw failure("code page \"{}\" is unknown: it is neither a name that ICU has a converter for "
-                  "nor a Windows name of the library's{}",
-                  printable(name), nearPages(name));
-  }
-  return found;
-}
-
-// With the names that people write for the number, as far as ICU has them.
-FoundPages describeNumber(int32_t number) {
-  FoundPages found{.numbers = {describePage(number)}, .names = {}};
+// The names that people write for a number, as far as ICU has them.
+std::vector<std::string> namesOf(int32_t number) {
+  std::vector<std::string> names;
   for (const char *prefix : prefixes) {
-    const std::string name = fmt::format("{}{}", prefix, number);
-    if (auto converter = converterOf(name)) {
-      found.names.push_back({name, std::move(converter)});
+    if (std::string name = fmt::format("{}{}", prefix, number); converterOf(name)) {
+      names.push_back(std::move(name));
     }
   }
-  return found;
+  return names;
+}
+
+Answer describe(const std::vector<int32_t> &numbers, const std::vector<std::string> &names) {
+  std::string text = numbers.empty() ? "No number of the library's opens this code page.\n" : "";
+  Json numberRows = Json::array();
+  Json nameRows = Json::array();
+  std::set<std::optional<std::string>> tables;
+  for (const int32_t number : numbers) {
+    const PageFacts facts = factsOf(number);
+    text += textOf(facts);
+    numberRows.append(jsonOf(facts));
+    tables.insert(facts.converter);
+  }
+  for (const std::string &name : names) {
+    const auto converter = converterOf(name);
+    text += fmt::format("The name {} opens {}\n", name, converter.value_or("nothing in this ICU"));
+    nameRows.append(Json::object({{"name", name}, {"converter", converter}}));
+    tables.insert(converter);
+  }
+  tables.erase(std::nullopt);
+  const bool differ = tables.size() > 1;
+  return {text + (differ ? "Beware: these open different tables.\n" : ""),
+          Json::object({{"numbers", numberRows}, {"names", nameRows}, {"tablesDiffer", differ}})};
 }
 
 } // namespace
 
-bool FoundPages::tablesDiffer() const {
-  std::set<std::optional<std::string>> tables;
-  for (const PageFacts &facts : numbers) {
-    tables.insert(facts.converter);
-  }
-  for (const NameFacts &facts : names) {
-    tables.insert(facts.converter);
-  }
-  tables.erase(std::nullopt);
-  return tables.size() > 1;
+Answer describePage(int32_t number) {
+  const PageFacts facts = factsOf(number);
+  return {textOf(facts), jsonOf(facts)};
 }
 
-PageFacts describePage(int32_t number) {
-  PageFacts facts;
-  facts.number = number;
-  facts.converter = converterOf(number);
-  int32_t twoNull = 0;
-  const nls2::converter converter(NLS2_MapCodepageIdToName(number, &twoNull, &facts.status));
-  if (facts.status == U_MEMORY_ALLOCATION_ERROR) {
-    throw std::bad_alloc(); // a page that would open must not be called one that does not
-  }
-  facts.hasTwoNulls = twoNull != 0;
-  facts.opens = static_cast<bool>(converter);
-  facts.ccsid = facts.converter ? ccsidOf(*facts.converter) : std::nullopt;
-  if (converter) {
-    facts.maxCharSize = ucnv_getMaxCharSize(converter.get());
-  }
-  for (const CcsidMapEntry &entry : windows_names()) {
-    if (entry.ccsid == static_cast<uint32_t>(number)) {
-      facts.windowsNames.emplace_back(entry.name);
+Answer lookUpPage(const std::string &asked) {
+  std::string name = asked;
+  if (const auto given = wholeNumber(asked)) {
+    const auto number = pageNumber(asked);
+    const auto *listed = std::ranges::find(pagesWithNames, number);
+    if (number && (listed != pagesWithNames.end() || converterOf(*number))) {
+      return describe({*number}, namesOf(*number));
+    }
+    name = fmt::format("windows-{}", *given);
+    if (!windowsPage(name)) {
+      throw failure(
+          "code page {} is unknown: it is not one of the library's numbers, and ICU has no "
+          "converter for it as a CCSID",
+          *given);
     }
   }
-  return facts;
+  const auto numbers = name.empty() ? std::vector<int32_t>() : numbersOf(name);
+  if (numbers.empty() && !converterOf(name)) {
+    throw failure("code page \"{}\" is unknown: it is neither a name that ICU has a converter for "
+                  "nor a Windows name of the library's{}",
+                  printable(name), nearPages(name));
+  }
+  return describe(numbers, {name});
 }
 
-FoundPages lookUpPage(const std::string &asked) {
-  const auto given = wholeNumber(asked);
-  if (!given) {
-    return lookUpName(asked);
-  }
-  const auto number = pageNumber(asked);
-  const auto *listed = std::find(pagesWithNames.begin(), pagesWithNames.end(), number);
-  if (number && (listed != pagesWithNames.end() || converterOf(*number))) {
-    return describeNumber(*number);
-  }
-  const std::string windowsName = fmt::format("windows-{}", *given);
-  if (windowsPage(windowsName)) {
-    return lookUpName(windowsName);
-  }
-  throw failure("code page {} is unknown: it is not one of the library's numbers, and ICU has no "
-                "converter for it as a CCSID",
-                *given);
-}
-
-std::string asText(const PageFacts &facts) {
-  std::string text = fmt::format("Code page {}\n", facts.number);
-  const auto line = [&](const char *what, const std::string &value) {
-    text += fmt::format("  {:<20} {}\n", what, value);
-  };
-  line("opens", facts.opens ? "yes" : "no: " + statusText(facts.status));
-  if (facts.opens) {
-    line("converter", facts.converter.value_or("without a name"));
-    line("CCSID", facts.ccsid ? std::to_string(*facts.ccsid) : "none");
-    line("largest character",
-         fmt::format("{} byte(s) a UTF-16 unit", facts.maxCharSize.value_or(0)));
-  }
-  line("two-null terminator", facts.hasTwoNulls ? "yes" : "no");
-  for (const std::string &name : facts.windowsNames) {
-    line("Windows name", name);
-  }
-  return text;
-}
-
-std::string asText(const FoundPages &found) {
-  std::string text;
-  for (const PageFacts &facts : found.numbers) {
-    text += asText(facts);
-  }
-  if (found.numbers.empty()) {
-    text += "No number of the library's opens this code page.\n";
-  }
-  for (const NameFacts &facts : found.names) {
-    text += fmt::format("The name {} opens {}\n", facts.name,
-                        facts.converter.value_or("nothing in this ICU"));
-  }
-  return found.tablesDiffer() ? text + "Beware: these open different tables.\n" : text;
-}
-
-Json asJson(const PageFacts &facts) {
-  return Json::object(
-      {{"codepage", facts.number},
-       {"opens", facts.opens},
-       {"converter", facts.converter},
-       {"ccsid", facts.ccsid},
-       {"twoNullTerminator", facts.hasTwoNulls},
-       {"maxCharSize", facts.maxCharSize},
-       {"windowsNames", Json::array(facts.windowsNames)},
-       {"status", facts.status},
-       // ICU's name of the status, for programs; people get statusText().
-       {"statusName",
-        fmt::format("{} ({})", u_errorName(static_cast<UErrorCode>(facts.status)), facts.status)}});
-}
-
-Json asJson(const FoundPages &found) {
-  const auto numberAsJson = [](const PageFacts &facts) { return asJson(facts); };
-  const auto nameAsJson = [](const NameFacts &facts) {
-    return Json::object({{"name", facts.name}, {"converter", facts.converter}});
-  };
-  return Json::object({{"numbers", Json::array(found.numbers, numberAsJson)},
-                       {"names", Json::array(found.names, nameAsJson)},
-                       {"tablesDiffer", found.tablesDiffer()}});
-}
-
-std::string allPagesAsText() {
+Answer allPages() {
   std::string text = "Numbers opened by name (any other number is opened as a CCSID of ICU's):\n";
+  Json numbers = Json::array();
+  Json names = Json::array();
   for (const int32_t number : pagesWithNames) {
-    const PageFacts facts = describePage(number);
+    const PageFacts facts = factsOf(number);
     text += fmt::format("{:>6}  {}{}\n", number,
-                        facts.opens ? facts.converter.value_or("without a name")
-                                    : "does not open: " + statusText(facts.status),
-                        facts.hasTwoNulls ? ", two-null terminator" : "");
+                        facts.opens ? facts.name() : "does not open: " + statusText(facts.status),
+                        facts.twoNulls != 0 ? ", two-null terminator" : "");
+    numbers.append(jsonOf(facts));
   }
   text += "\nWindows names:\n";
-  for (const CcsidMapEntry &entry : windows_names()) {
-    text += fmt::format("{:>6}  {}\n", entry.ccsid, entry.name);
+  for (const auto &[name, number] : windows_names()) {
+    text += fmt::format("{:>6}  {}\n", number, name);
+    names.append(Json::object({{"name", name}, {"codepage", number}}));
   }
-  return text;
-}
-
-Json allPagesAsJson() {
-  const auto nameAsJson = [](const CcsidMapEntry &entry) {
-    return Json::object({{"name", entry.name}, {"codepage", entry.ccsid}});
-  };
-  const auto numberAsJson = [](int32_t number) { return asJson(describePage(number)); };
-  return Json::object({{"windowsNames", Json::array(windows_names(), nameAsJson)},
-                       {"numbers", Json::array(pagesWithNames, numberAsJson)}});
+  return {text, Json::object({{"windowsNames", names}, {"numbers", numbers}})};
 }
 
 } // namespace nls2::tool

@@ -1,13 +1,15 @@
 // nls2 cat: text files in any encoding as UTF-8 on standard output.
 
 #include "codepage/code_page.h"
-#include "commands.h"
+#include "io/input_file.h"
 #include "io/output_file.h"
-#include "io/text_stream.h"
+#include "options.h"
 
 #include <algorithm>
+#include <array>
 #include <memory>
 #include <optional>
+#include <unicode/ucnv.h>
 
 namespace nls2::tool {
 
@@ -25,50 +27,108 @@ struct Arguments {
   std::vector<std::string> paths;
 };
 
-void reportReplaced(const std::string &name, uint64_t count, const std::string &encoding) {
-  const char *verb = count == 1 ? " is" : "s are";
-  complain(fmt::format("{}: {} byte sequence{} not valid {}; each was replaced", printable(name),
-                       count, verb, printable(encoding))
-               .c_str());
-}
+// Writes files to standard output, one after another.
+class Copier {
+public:
+  explicit Copier(const std::string &encoding)
+      : encoding_(encoding), source_(openEncoding("--encoding", encoding)),
+        utf8_(CodePage(utf8Page, "UTF-8").take()) {
+    UErrorCode error = U_ZERO_ERROR;
+    ucnv_setToUCallBack(source_.get(), onInvalid, &replaced_, nullptr, nullptr, &error);
+    ucnv_setFromUCallBack(utf8_.get(), onLoneSurrogate, &replaced_, nullptr, nullptr, &error);
+    requireSuccess(error, "convert to UTF-8");
+  }
+  Copier(const Copier &) = delete; // the converters count into it
+  Copier &operator=(const Copier &) = delete;
 
-// The exit code for this file. A failure to read is reported, and leaves the others to be read.
-int copy(const Arguments &arguments, const std::string &path, UConverter *converter,
-         OutputFile &out) {
-  std::optional<TextStream> in;
-  int code = exitDone;
-  bool isOpen = true;
-  while (isOpen) {
-    std::string text;
-    try {
-      if (!in) {
-        in.emplace(path, converter);
-      }
-      text = in->read();
-    } catch (const Error &error) {
-      complain(error.what());
-      code = exitUsage;
+  int copyAll(const std::vector<std::string> &paths) {
+    int code = exitDone;
+    for (const std::string &path : paths) {
+      code = std::max(code, copy(path));
     }
-    isOpen = !text.empty();
-    out.write(text);
+    out_.commit();
+    return code;
   }
-  if (in && in->replaced() != 0) {
-    reportReplaced(in->name(), in->replaced(), arguments.encoding);
-    code = std::max<int>(code, exitFailed);
-  }
-  return code;
-}
 
-int copyAll(const Arguments &arguments) {
-  const converter opened = openEncoding("--encoding", arguments.encoding);
-  OutputFile out("-");
-  int code = exitDone;
-  for (const std::string &path : arguments.paths) {
-    code = std::max(code, copy(arguments, path, opened.get(), out));
+private:
+  // The exit code for this file. A failure to read is reported, and leaves the others to be read.
+  int copy(const std::string &path) {
+    ucnv_reset(source_.get());
+    ucnv_reset(utf8_.get());
+    pivotSource_ = pivotTarget_ = pivot_.data();
+    replaced_ = 0;
+    std::optional<InputFile> in;
+    int code = exitDone;
+    for (bool isOpen = true; isOpen;) {
+      std::string text;
+      try {
+        isOpen = read(in ? *in : in.emplace(path), text);
+      } catch (const Error &error) {
+        complain(error.what());
+        code = exitUsage;
+        isOpen = false;
+      }
+      out_.write(text);
+    }
+    if (replaced_ != 0) {
+      reportReplaced(in->name());
+      code = std::max<int>(code, exitFailed);
+    }
+    return code;
   }
-  out.commit();
-  return code;
-}
+
+  static void onInvalid(const void *counter, UConverterToUnicodeArgs *arguments, const char *bytes,
+                        int32_t length, UConverterCallbackReason reason, UErrorCode *error) {
+    count(counter, reason);
+    UCNV_TO_U_CALLBACK_SUBSTITUTE(nullptr, arguments, bytes, length, reason, error);
+  }
+
+  // UTF-8 cannot hold them.
+  static void onLoneSurrogate(const void *counter, UConverterFromUnicodeArgs *arguments,
+                              const UChar *units, int32_t length, UChar32 character,
+                              UConverterCallbackReason reason, UErrorCode *error) {
+    count(counter, reason);
+    UCNV_FROM_U_CALLBACK_SUBSTITUTE(nullptr, arguments, units, length, character, reason, error);
+  }
+
+  static void count(const void *counter, UConverterCallbackReason reason) {
+    *static_cast<uint64_t *>(const_cast<void *>(counter)) += reason <= UCNV_IRREGULAR ? 1 : 0;
+  }
+
+  // Adds the next part of the file. False at its end.
+  bool read(InputFile &in, std::string &text) {
+    const std::size_t length = in.read(bytes_.data(), bytes_.size());
+    const char *source = bytes_.data();
+    UErrorCode error = U_BUFFER_OVERFLOW_ERROR;
+    while (error == U_BUFFER_OVERFLOW_ERROR) {
+      error = U_ZERO_ERROR;
+      char *target = utf8Bytes_.data();
+      ucnv_convertEx(utf8_.get(), source_.get(), &target, target + utf8Bytes_.size(), &source,
+                     bytes_.data() + length, pivot_.data(), &pivotSource_, &pivotTarget_,
+                     pivot_.data() + pivot_.size(), false, static_cast<UBool>(length == 0), &error);
+      text.append(utf8Bytes_.data(), target);
+    }
+    requireSuccess(error, "convert to UTF-8");
+    return length > 0;
+  }
+
+  void reportReplaced(const std::string &name) const {
+    const char *verb = replaced_ == 1 ? " is" : "s are";
+    complain(fmt::format("{}: {} byte sequence{} not valid {}; each was replaced", printable(name),
+                         replaced_, verb, printable(encoding_))
+                 .c_str());
+  }
+
+  const std::string encoding_;
+  const converter source_, utf8_;
+  uint64_t replaced_ = 0; // byte sequences and lone surrogates of the file
+  std::array<char, std::size_t{64} * 1024> bytes_;
+  std::array<char, std::size_t{64} * 1024> utf8Bytes_;
+  std::array<UChar, std::size_t{16} * 1024> pivot_; // text between the two converters
+  UChar *pivotSource_ = nullptr;
+  UChar *pivotTarget_ = nullptr;
+  OutputFile out_{"-"};
+};
 
 } // namespace
 
@@ -76,13 +136,10 @@ Command catCommand() {
   const auto arguments = std::make_shared<Arguments>();
   return {.operands = {{"FILE", "files to read, one after another; - is standard input",
                         into(arguments->paths), 1, Operand::anyNumber}},
-          .options = {{.name = "encoding",
-                       .metavar = "NAME",
-                       .help = "the files' encoding",
-                       .take = into(arguments->encoding),
-                       .isRequired = true}},
+          .options = {required(
+              value("encoding", "NAME", "the files' encoding", into(arguments->encoding)))},
           .notes = notes,
-          .run = [arguments] { return copyAll(*arguments); }};
+          .run = [arguments] { return Copier(arguments->encoding).copyAll(arguments->paths); }};
 }
 
 } // namespace nls2::tool

@@ -4,8 +4,8 @@
 #include "codepage/code_page.h"
 #include "codepage/display.h"
 #include "codepage/page_facts.h"
-#include "commands.h"
-#include "io/print.h"
+#include "io/output_file.h"
+#include "options.h"
 
 #include <algorithm>
 #include <fmt/format.h>
@@ -30,16 +30,15 @@ struct Arguments {
 };
 
 struct ByteMeaning {
-  enum Kind { character, leadByte, shift, none };
-
-  Kind kind = none;
+  const char *kind;
+  const char *mark;    // in a chart
   std::u16string text; // of a character; empty for all else
 };
 
 // What each single byte of a code page means.
 struct ByteChart {
-  int32_t page = 0;
-  std::array<ByteMeaning, 256> bytes;
+  int32_t page;
+  std::vector<ByteMeaning> bytes;
 };
 
 ByteMeaning meaningOf(UConverter *converter, char byte) {
@@ -51,27 +50,25 @@ ByteMeaning meaningOf(UConverter *converter, char byte) {
   ucnv_toUnicode(converter, &end, units.data() + units.size(), &source, &byte + 1, nullptr, 0,
                  &error);
   if (U_FAILURE(error)) {
-    return {ByteMeaning::none, {}};
+    return {"none", "--", {}};
   }
   if (end != units.data()) {
-    return {ByteMeaning::character, {units.data(), end}};
+    return {"character", "", {units.data(), end}};
   }
   const bool isPending = ucnv_toUCountPending(converter, &error) > 0;
-  return {isPending ? ByteMeaning::leadByte : ByteMeaning::shift, {}};
+  return isPending ? ByteMeaning{"lead byte", ">>", {}} : ByteMeaning{"shift", "<>", {}};
 }
 
 // Throws Error where the page does not open or no byte of it is a character by itself.
 ByteChart chartOf(const char *option, const std::string &name) {
   const CodePage page(parsePage(option, name), option);
-  ByteChart chart{.page = page.number(), .bytes = {}};
   UErrorCode error = U_ZERO_ERROR;
   ucnv_setToUCallBack(page.converter(), UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr, &error);
-  bool hasCharacters = false;
-  for (std::size_t byte = 0; byte < chart.bytes.size(); ++byte) {
-    chart.bytes[byte] = meaningOf(page.converter(), static_cast<char>(byte));
-    hasCharacters = hasCharacters || chart.bytes[byte].kind == ByteMeaning::character;
+  ByteChart chart{page.number(), {}};
+  for (int byte = 0; byte < 256; ++byte) {
+    chart.bytes.push_back(meaningOf(page.converter(), static_cast<char>(byte)));
   }
-  if (!hasCharacters) {
+  if (std::ranges::all_of(chart.bytes, &std::u16string::empty, &ByteMeaning::text)) {
     throw failure("code page {} has no characters of one byte", page.number());
   }
   return chart;
@@ -79,9 +76,8 @@ ByteChart chartOf(const char *option, const std::string &name) {
 
 // Two columns, so that no mark can be taken for a character.
 std::string cellOf(const ByteMeaning &meaning) {
-  constexpr std::array marks{"", ">>", "<>", "--"};
-  if (meaning.kind != ByteMeaning::character) {
-    return marks[meaning.kind];
+  if (meaning.text.empty()) {
+    return meaning.mark;
   }
   if (meaning.text == u" ") {
     return "SP";
@@ -94,89 +90,74 @@ std::string cellOf(const ByteMeaning &meaning) {
          std::string(static_cast<std::size_t>(std::max(0, 2 - display.columns)), ' ');
 }
 
-std::string asText(const ByteChart &chart) {
+Json jsonOf(const ByteMeaning &meaning) {
+  return meaning.text.empty() ? Json() : Json(codePointsOf(meaning.text));
+}
+
+Answer chart(const std::string &name) {
+  const ByteChart chart = chartOf("--chart", name);
   std::string text = "   0  1  2  3  4  5  6  7  8  9  A  B  C  D  E  F\n";
-  for (std::size_t row = 0; row < 16; ++row) {
-    std::string line = fmt::format("{:X} ", row);
-    for (std::size_t column = 0; column < 16; ++column) {
-      line.append(1, ' ').append(cellOf(chart.bytes[16 * row + column]));
+  Json rows = Json::array();
+  for (std::size_t row = 0; row < 256; row += 16) {
+    std::string line = fmt::format("{:X} ", row / 16);
+    for (std::size_t byte = row; byte < row + 16; ++byte) {
+      const ByteMeaning &meaning = chart.bytes[byte];
+      line.append(1, ' ').append(cellOf(meaning));
+      rows.append(Json::object({{"byte", fmt::format("{:02X}", byte)},
+                                {"kind", meaning.kind},
+                                {"character", jsonOf(meaning)}}));
     }
     text += line.substr(0, line.find_last_not_of(' ') + 1) + "\n";
   }
-  return text + "SP blank, .. does not print, >> lead byte, <> shift, -- no character\n";
+  text += "SP blank, .. does not print, >> lead byte, <> shift, -- no character\n";
+  return {text, Json::object({{"codepage", chart.page}, {"bytes", rows}})};
 }
 
-Json asJson(const ByteMeaning &meaning) {
-  return meaning.kind == ByteMeaning::character ? Json(codePointsOf(meaning.text)) : Json();
-}
-
-Json asJson(const ByteChart &chart) {
-  constexpr std::array kinds{"character", "lead byte", "shift", "none"};
-  const auto row = [&](const ByteMeaning &meaning) {
-    return Json::object({{"byte", fmt::format("{:02X}", &meaning - chart.bytes.data())},
-                         {"kind", kinds[meaning.kind]},
-                         {"character", asJson(meaning)}});
+Answer difference(const std::string &first, const std::string &second) {
+  const ByteChart a = chartOf("--diff", first);
+  const ByteChart b = chartOf("--diff", second);
+  const auto shown = [](const ByteMeaning &meaning) {
+    return meaning.text.empty() ? "-"
+                                : displayOf(meaning.text).text + " " + codePointsOf(meaning.text);
   };
-  return Json::object({{"codepage", chart.page}, {"bytes", Json::array(chart.bytes, row)}});
-}
-
-std::string asText(const ByteMeaning &meaning) {
-  return meaning.kind == ByteMeaning::character
-             ? displayOf(meaning.text).text + " " + codePointsOf(meaning.text)
-             : "-";
-}
-
-std::string difference(const Arguments &arguments) {
-  if (arguments.pages.size() != 2) {
-    throw usageError("--diff needs two PAGEs");
-  }
-  const ByteChart a = chartOf("--diff", arguments.pages[0]);
-  const ByteChart b = chartOf("--diff", arguments.pages[1]);
   std::string text;
-  std::vector<Json> rows;
+  Json rows = Json::array();
   for (std::size_t i = 0; i < a.bytes.size(); ++i) {
     if (a.bytes[i].text != b.bytes[i].text) {
       const std::string byte = fmt::format("{:02X}", i);
-      text += fmt::format("{}  {}  {}\n", byte, asText(a.bytes[i]), asText(b.bytes[i]));
-      rows.push_back(Json::object(
-          {{"byte", byte}, {"first", asJson(a.bytes[i])}, {"second", asJson(b.bytes[i])}}));
+      text += fmt::format("{}  {}  {}\n", byte, shown(a.bytes[i]), shown(b.bytes[i]));
+      rows.append(Json::object(
+          {{"byte", byte}, {"first", jsonOf(a.bytes[i])}, {"second", jsonOf(b.bytes[i])}}));
     }
   }
-  const Json json = Json::object(
-      {{"codepages", Json::array(std::array{a.page, b.page})}, {"differences", Json::array(rows)}});
-  return arguments.asJson ? json.text() : text;
+  return {text, Json::object({{"codepages", Json::array(std::array{a.page, b.page})},
+                              {"differences", rows}})};
 }
 
-std::string names(const Arguments &arguments) {
-  const std::vector<std::string> names = namesWithNumbers();
-  return arguments.asJson ? Json::array(names).text() : fmt::format("{}\n", fmt::join(names, "\n"));
-}
-
-std::string answer(const Arguments &arguments) {
+// What the options ask for of the pages.
+Answer answer(const Arguments &arguments) {
+  const auto &pages = arguments.pages;
   if (arguments.asChart + arguments.asDifference + arguments.asNames > 1) {
     throw usageError("--chart, --diff and --names exclude each other");
   }
-  if (arguments.asDifference) {
-    return difference(arguments);
+  if (arguments.asDifference && pages.size() != 2) {
+    throw usageError("--diff needs two PAGEs");
   }
-  const std::size_t most = arguments.asNames ? 0 : 1;
-  if (arguments.pages.size() > most) {
-    throw usageError("extra operand {}", printable(arguments.pages[most]));
+  const std::size_t most = arguments.asDifference ? 2 : arguments.asNames ? 0 : 1;
+  if (pages.size() > most) {
+    throw usageError("extra operand {}", printable(pages[most]));
+  }
+  if (arguments.asChart && pages.empty()) {
+    throw usageError("--chart needs a PAGE");
   }
   if (arguments.asNames) {
-    return names(arguments);
+    const std::set<std::string> names = namesWithNumbers();
+    return {fmt::format("{}\n", fmt::join(names, "\n")), Json::array(names)};
   }
-  if (arguments.pages.empty()) {
-    if (arguments.asChart) {
-      throw usageError("--chart needs a PAGE");
-    }
-    return arguments.asJson ? allPagesAsJson().text() : allPagesAsText();
-  }
-  const auto rendered = [&](const auto &facts) {
-    return arguments.asJson ? asJson(facts).text() : asText(facts);
-  };
-  return arguments.asChart ? rendered(chartOf("--chart", arguments.pages[0]))
-                           : rendered(lookUpPage(arguments.pages[0]));
+  return arguments.asDifference ? difference(pages[0], pages[1])
+         : arguments.asChart    ? chart(pages[0])
+         : pages.empty()        ? allPages()
+                                : lookUpPage(pages[0]);
 }
 
 } // namespace
@@ -185,18 +166,16 @@ Command codepagesCommand() {
   const auto arguments = std::make_shared<Arguments>();
   return {.operands = {{"PAGE", "show what the library and ICU make of this number or name",
                         into(arguments->pages), 0, 2}},
-          .options = {{.name = "chart",
-                       .help = "show what every byte of PAGE means",
-                       .take = into(arguments->asChart)},
-                      {.name = "diff",
-                       .help = "show the bytes whose characters differ in two PAGEs",
-                       .take = into(arguments->asDifference)},
-                      {.name = "names",
-                       .help = "list the names that options take for a PAGE",
-                       .take = into(arguments->asNames)},
-                      {.name = "json", .help = "write JSON", .take = into(arguments->asJson)}},
+          .options = {flag("chart", "show what every byte of PAGE means", into(arguments->asChart)),
+                      flag("diff", "show the bytes whose characters differ in two PAGEs",
+                           into(arguments->asDifference)),
+                      flag("names", "list the names that options take for a PAGE",
+                           into(arguments->asNames)),
+                      flag("json", "write JSON", into(arguments->asJson))},
           .notes = notes,
-          .run = [arguments] { return print(answer(*arguments)), exitDone; }};
+          .run = [arguments] {
+            return print(answer(*arguments).rendered(arguments->asJson)), exitDone;
+          }};
 }
 
 } // namespace nls2::tool

@@ -1,10 +1,10 @@
 // nls2 detect: which Unicode signatures files begin with.
 
-#include "commands.h"
 #include "io/input_file.h"
-#include "io/print.h"
+#include "io/output_file.h"
 #include "json.h"
 #include "nls2.h"
+#include "options.h"
 
 #include <algorithm>
 #include <memory>
@@ -26,13 +26,6 @@ struct Arguments {
   bool asJson = false;
 };
 
-struct Signature {
-  std::string file;
-  std::optional<std::string> encoding;
-  int32_t length = 0;
-  std::optional<std::string> error; // why the file could not be looked at
-};
-
 std::string beginningOf(const std::string &path) {
   InputFile file(path);
   std::string bytes(longestSignature, '\0');
@@ -44,46 +37,38 @@ std::string beginningOf(const std::string &path) {
   return bytes;
 }
 
-Signature detect(const std::string &path) {
-  Signature found{.file = path, .encoding = {}, .error = {}};
+// Adds what there is to say of a file. The exit code for it.
+int detect(const std::string &path, Answer &answer) {
   try {
     const std::string bytes = beginningOf(path);
+    int32_t length = 0;
     int32_t status = 0;
     const char *name = NLS2_detectUnicodeSignature(bytes.data(), static_cast<int32_t>(bytes.size()),
-                                                   &found.length, &status);
+                                                   &length, &status);
     if (status > 0) {
       throw failure("{}: {}", printable(path), statusText(status));
     }
-    found.encoding = name != nullptr ? std::optional<std::string>(name) : std::nullopt;
+    answer.text +=
+        fmt::format("{}: {}\n", printable(path),
+                    name != nullptr ? fmt::format("{}, {} bytes", name, length) : "no signature");
+    answer.json.append(
+        Json::object({{"file", path}, {"encoding", name}, {"signatureLength", length}}));
+    return name != nullptr ? exitDone : exitFailed;
   } catch (const Error &error) {
-    found.error = error.what();
     complain(error.what());
+    answer.json.append(Json::object(
+        {{"file", path}, {"encoding", nullptr}, {"signatureLength", 0}, {"error", error.what()}}));
+    return exitUsage;
   }
-  return found;
-}
-
-std::string asText(const Signature &found) {
-  return fmt::format("{}: {}\n", printable(found.file),
-                     found.encoding ? fmt::format("{}, {} bytes", *found.encoding, found.length)
-                                    : "no signature");
-}
-
-Json asJson(const Signature &found) {
-  Json row = Json::object(
-      {{"file", found.file}, {"encoding", found.encoding}, {"signatureLength", found.length}});
-  return found.error ? row.set("error", found.error) : row;
 }
 
 int detectAll(const Arguments &arguments) {
-  std::vector<Signature> signatures;
-  std::string text;
+  Answer answer{"", Json::array()};
   int code = exitDone;
   for (const std::string &path : arguments.paths) {
-    const Signature &found = signatures.emplace_back(detect(path));
-    code = std::max<int>(code, found.error ? exitUsage : found.encoding ? exitDone : exitFailed);
-    text += found.error ? "" : asText(found);
+    code = std::max(code, detect(path, answer));
   }
-  print(arguments.asJson ? Json::array(signatures, asJson).text() : text);
+  print(answer.rendered(arguments.asJson));
   return code;
 }
 
@@ -93,7 +78,7 @@ Command detectCommand() {
   const auto arguments = std::make_shared<Arguments>();
   return {.operands = {{"FILE", "files to look at; - is standard input", into(arguments->paths), 1,
                         Operand::anyNumber}},
-          .options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}},
+          .options = {flag("json", "write JSON", into(arguments->asJson))},
           .notes = notes,
           .run = [arguments] { return detectAll(*arguments); }};
 }

@@ -2,13 +2,12 @@
 
 #include "codepage/code_page.h"
 #include "codepage/display.h"
-#include "commands.h"
 #include "io/input_file.h"
 #include "io/output_file.h"
+#include "options.h"
 
 #include <algorithm>
 #include <memory>
-#include <new>
 
 namespace nls2::tool {
 
@@ -28,22 +27,13 @@ struct Arguments {
   int32_t recordLength = 0; // 0: the whole file is one record
 };
 
-void require(UErrorCode error) {
-  if (error == U_MEMORY_ALLOCATION_ERROR) {
-    throw std::bad_alloc();
-  }
-  if (U_FAILURE(error)) {
-    throw failure("cannot decode: {}", statusText(error));
-  }
-}
-
 // Decodes byte by byte, since only that shows which bytes each character takes.
 class PageDump {
 public:
   explicit PageDump(CodePage page) : page_(std::move(page)) {
     UErrorCode error = U_ZERO_ERROR;
     ucnv_setToUCallBack(page_.converter(), onInvalid, this, nullptr, nullptr, &error);
-    require(error);
+    requireSuccess(error, "decode");
   }
   PageDump(const PageDump &) = delete; // the converter reports into it
   PageDump &operator=(const PageDump &) = delete;
@@ -104,7 +94,7 @@ private:
     UErrorCode error = U_ZERO_ERROR;
     ucnv_toUnicode(page_.converter(), &end, units.data() + units.size(), &byte,
                    byte + (isLast ? 0 : 1), nullptr, static_cast<UBool>(isLast), &error);
-    require(error);
+    requireSuccess(error, "decode");
     const auto pending = static_cast<std::size_t>(ucnv_toUCountPending(page_.converter(), &error));
     const std::size_t unknown = bytes_.size() - cells_.size();
     const std::size_t length = unknown - std::min(pending, unknown);
@@ -167,23 +157,13 @@ int dumpFile(const Arguments &arguments) {
 
 Command dumpCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {
-      .operands = {{"FILE", "file to read; standard input if - or not given",
-                    into(arguments->path)}},
-      .options = {{.name = "from",
-                   .metavar = "PAGE",
-                   .help = "code page of the file",
-                   .take = [=](const auto &text) { arguments->page = parsePage("--from", text); },
-                   .isRequired = true},
-                  {.name = "record-length",
-                   .metavar = "N",
-                   .help = "bytes of every record",
-                   .take =
-                       [=](const auto &text) {
-                         arguments->recordLength = parseNumber("--record-length", text, 1, 1 << 30);
-                       }}},
-      .notes = notes,
-      .run = [arguments] { return dumpFile(*arguments); }};
+  return {.operands = {{"FILE", "file to read; standard input if - or not given",
+                        into(arguments->path)}},
+          .options = {required(pageValue("from", "code page of the file", arguments->page)),
+                      numberValue("record-length", "N", "bytes of every record",
+                                  arguments->recordLength, 1, 1 << 30)},
+          .notes = notes,
+          .run = [arguments] { return dumpFile(*arguments); }};
 }
 
 } // namespace nls2::tool

@@ -1,9 +1,8 @@
 // nls2 find: the lines in which a text occurs.
 
-#include "commands.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
-#include "memory.h"
+#include "options.h"
 #include "text/decoder.h"
 #include "text/record_reader.h"
 
@@ -199,14 +198,11 @@ Command findCommand() {
   return {.operands = {{"PATTERN", "the text to find", into(arguments->pattern), 1},
                        {"FILE", "files to read; standard input if - or not given",
                         into(arguments->inputs), 0, Operand::anyNumber}},
-          .options = localeOptions(arguments->locale,
-                                   {{.name = "ignore-case",
-                                     .help = "fold the case of both, by the language's rules",
-                                     .take = into(arguments->ignoreCase)},
-                                    {.name = "line-number",
-                                     .letter = 'n',
-                                     .help = "print the lines' numbers",
-                                     .take = into(arguments->lineNumbers)}}),
+          .options = localeOptions(
+              arguments->locale,
+              {flag("ignore-case", "fold the case of both, by the language's rules",
+                    into(arguments->ignoreCase)),
+               flag("line-number", "print the lines' numbers", into(arguments->lineNumbers), 'n')}),
           .notes = notes,
           .run = [arguments] { return FindRun(*arguments).run(); }};
 }

@@ -1,13 +1,15 @@
 // nls2 locales: the library's table of locales, or its records of one name or number.
 
 #include "codepage/page_facts.h"
-#include "commands.h"
-#include "io/print.h"
+#include "io/output_file.h"
 #include "locale/locale_option.h"
 #include "nls2/language.hpp"
+#include "options.h"
 
+#include <functional>
 #include <memory>
 #include <set>
+#include <utility>
 
 namespace nls2::tool {
 
@@ -25,11 +27,6 @@ struct Arguments {
 
 using Records = std::vector<const LocaleMapEntry *>;
 
-struct FoundLocales {
-  const char *matchedBy;
-  Records records;
-};
-
 template <class IsWanted>
 Records recordsThat(IsWanted isWanted) {
   Records records;
@@ -41,32 +38,22 @@ Records recordsThat(IsWanted isWanted) {
   return records;
 }
 
-FoundLocales recordsWith(uint32_t number) {
-  Records records = recordsThat([=](const auto &entry) { return entry.languageId == number; });
-  if (!records.empty()) {
-    return {"language id", std::move(records)};
-  }
-  return {"code page", recordsThat([=](const auto &entry) {
-            return entry.asciiCcsid == number || entry.ebcdicCcsid == number;
-          })};
-}
-
-FoundLocales recordsWith(const std::string &name) {
-  return {"name", recordsThat([&](const auto &entry) {
-            return entry.localeName == name || entry.shortName == name;
-          })};
-}
-
-// Throws Error where there is none.
-FoundLocales lookUp(const std::string &asked) {
+// What the text matches, by the first of the ways that finds any. Throws Error where none does.
+std::pair<const char *, Records> lookUp(const std::string &asked) {
   const auto number = wholeNumber(asked);
-  FoundLocales found = number ? recordsWith(*number) : recordsWith(asked);
-  if (found.records.empty()) {
-    throw failure("no locale has the {} {}{}; `nls2 locales` lists them all",
-                  number ? "language id or code page" : "locale name or short name",
-                  printable(asked), number ? "" : localesNear(asked));
+  const std::pair<const char *, std::function<bool(const LocaleMapEntry &)>> ways[] = {
+      {"name", [&](const auto &it) { return it.localeName == asked || it.shortName == asked; }},
+      {"language id", [&](const auto &it) { return it.languageId == number; }},
+      {"code page",
+       [&](const auto &it) { return it.asciiCcsid == number || it.ebcdicCcsid == number; }}};
+  for (const auto &[matchedBy, isWanted] : ways) {
+    if (Records records = recordsThat(isWanted); !records.empty()) {
+      return {matchedBy, std::move(records)};
+    }
   }
-  return found;
+  throw failure("no locale has the {} {}{}; `nls2 locales` lists them all",
+                number ? "language id or code page" : "locale name or short name", printable(asked),
+                number ? "" : localesNear(asked));
 }
 
 // The records' code pages, each once.
@@ -79,51 +66,43 @@ std::set<int32_t> pagesOf(const Records &records) {
   return pages;
 }
 
-std::string asText(const Records &records) {
+Answer describe(const Records &records) {
   std::string text =
       "row  locale   short    id                 id country language  ASCII EBCDIC\n";
+  Json rows = Json::array();
   for (const LocaleMapEntry *entry : records) {
-    text += fmt::format("{:>3}  {:<8} {:<8} 0x{:08X} {:>10} {:>7} {:>8} {:>6} {:>6}\n",
-                        entry - localeMap, entry->localeName, entry->shortName, entry->languageId,
-                        entry->languageId, entry->languageId >> 16, entry->languageId & 0xFFFF,
-                        entry->asciiCcsid, entry->ebcdicCcsid);
+    const auto row = entry - localeMap;
+    const language_id id(entry->languageId);
+    const std::string hex = fmt::format("0x{:08X}", id.number());
+    text += fmt::format("{:>3}  {:<8} {:<8} {} {:>10} {:>7} {:>8} {:>6} {:>6}\n", row,
+                        entry->localeName, entry->shortName, hex, id.number(), id.country(),
+                        id.language(), entry->asciiCcsid, entry->ebcdicCcsid);
+    rows.append(Json::object({{"row", row},
+                              {"locale", entry->localeName},
+                              {"shortName", entry->shortName},
+                              {"languageId", id.number()},
+                              {"languageIdHex", hex},
+                              {"country", id.country()},
+                              {"language", id.language()},
+                              {"asciiCcsid", entry->asciiCcsid},
+                              {"ebcdicCcsid", entry->ebcdicCcsid}}));
   }
-  return text;
+  return {text, rows};
 }
 
-Json asJson(const Records &records) {
-  return Json::array(records, [](const LocaleMapEntry *entry) {
-    return Json::object({{"row", entry - localeMap},
-                         {"locale", entry->localeName},
-                         {"shortName", entry->shortName},
-                         {"languageId", entry->languageId},
-                         {"languageIdHex", fmt::format("0x{:08X}", entry->languageId)},
-                         {"country", entry->languageId >> 16},
-                         {"language", entry->languageId & 0xFFFF},
-                         {"asciiCcsid", entry->asciiCcsid},
-                         {"ebcdicCcsid", entry->ebcdicCcsid}});
-  });
-}
-
-std::string answer(const Arguments &arguments) {
-  if (!arguments.asked) {
-    const Records all = recordsThat([](const auto &) { return true; });
-    return arguments.asJson ? asJson(all).text() : asText(all);
+Answer answer(const std::optional<std::string> &asked) {
+  if (!asked) {
+    return describe(recordsThat([](const auto &) { return true; }));
   }
-  const FoundLocales found = lookUp(*arguments.asked);
-  const std::set<int32_t> pages = pagesOf(found.records);
-  if (arguments.asJson) {
-    const auto pageAsJson = [](int32_t page) { return asJson(describePage(page)); };
-    return Json::object({{"matchedBy", found.matchedBy},
-                         {"records", asJson(found.records)},
-                         {"codepages", Json::array(pages, pageAsJson)}})
-        .text();
+  const auto [matchedBy, records] = lookUp(*asked);
+  auto [text, rows] = describe(records);
+  Json pages = Json::array();
+  for (const int32_t number : pagesOf(records)) {
+    const Answer page = describePage(number);
+    text += "\n" + page.text;
+    pages.append(page.json);
   }
-  std::string text = asText(found.records);
-  for (const int32_t page : pages) {
-    text.append(1, '\n').append(asText(describePage(page)));
-  }
-  return text;
+  return {text, Json::object({{"matchedBy", matchedBy}, {"records", rows}, {"codepages", pages}})};
 }
 
 } // namespace
@@ -133,9 +112,11 @@ Command localesCommand() {
   return {
       .operands = {{"LOCALE-OR-PAGE", "show the records with this name, language id or code page",
                     into(arguments->asked)}},
-      .options = {{.name = "json", .help = "write JSON", .take = into(arguments->asJson)}},
+      .options = {flag("json", "write JSON", into(arguments->asJson))},
       .notes = notes,
-      .run = [arguments] { return print(answer(*arguments)), exitDone; }};
+      .run = [arguments] {
+        return print(answer(arguments->asked).rendered(arguments->asJson)), exitDone;
+      }};
 }
 
 } // namespace nls2::tool

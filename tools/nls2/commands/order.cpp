@@ -1,9 +1,8 @@
 // nls2 sort and nls2 compare: texts in the order of a language.
 
-#include "commands.h"
 #include "io/output_file.h"
-#include "io/print.h"
 #include "locale/locale_option.h"
+#include "options.h"
 #include "text/decoder.h"
 #include "text/record_reader.h"
 
@@ -160,32 +159,22 @@ int compare(const Arguments &arguments) {
 }
 
 Option ignoreTrailing(Arguments &arguments) {
-  return {.name = "ignore-trailing",
-          .help = "trailing blanks do not count",
-          .take = into(arguments.ignoreTrailing)};
+  return flag("ignore-trailing", "trailing blanks do not count", into(arguments.ignoreTrailing));
 }
 
 } // namespace
 
 Command sortCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  const auto takeLength = [arguments](const std::string &text) {
-    arguments->recordLength =
-        static_cast<std::size_t>(parseNumber("--record-length", text, 1, 1 << 30));
-  };
   return {.operands = {{"FILE", "files to read; standard input if - or not given",
                         into(arguments->inputs), 0, Operand::anyNumber}},
-          .options = localeOptions(arguments->locale,
-                                   {ignoreTrailing(*arguments),
-                                    {.name = "record-length",
-                                     .metavar = "N",
-                                     .help = "sort records of N bytes instead of lines",
-                                     .take = takeLength},
-                                    {.name = "output",
-                                     .letter = 'o',
-                                     .metavar = "OUT",
-                                     .help = "file to write; standard output if - or not given",
-                                     .take = into(arguments->output)}}),
+          .options = localeOptions(
+              arguments->locale,
+              {ignoreTrailing(*arguments),
+               numberValue("record-length", "N", "sort records of N bytes instead of lines",
+                           arguments->recordLength, 1, 1 << 30),
+               value("output", "OUT", "file to write; standard output if - or not given",
+                     into(arguments->output), 'o')}),
           .notes = sortNotes,
           .run = [arguments] { return sortFiles(*arguments); }};
 }

@@ -2,7 +2,7 @@
 
 #include "convert/translate.h"
 #include "codepage/code_page.h"
-#include "commands.h"
+#include "options.h"
 
 #include <algorithm>
 #include <fmt/format.h>
@@ -75,15 +75,6 @@ int run(Arguments &arguments) {
   return translateFile(options);
 }
 
-// Tables of options: flags, and those that have a value.
-Option flag(const char *name, const char *help, Take take) {
-  return {.name = name, .help = help, .take = std::move(take)};
-}
-
-Option value(const char *name, const char *metavar, const char *help, Take take) {
-  return {.name = name, .metavar = metavar, .help = help, .take = std::move(take)};
-}
-
 template <typename Value>
 Take set(Value &value, bool to) {
   return [&value, to](const std::string &) { value = to; };
@@ -98,22 +89,11 @@ Take set(nls2::padding &padding, nls2::padding chosen) {
   };
 }
 
-template <typename Page>
-Take page(const char *option, Page &page) {
-  return [=, &page](const std::string &text) { page = parsePage(option, text); };
-}
-
-Take number(const char *option, uint64_t &number, uint64_t least, uint64_t most) {
-  return [=, &number](const std::string &text) {
-    number = parseNumber<uint64_t>(option, text, least, most);
-  };
-}
-
 // One of the words of `kinds`, whose numbers are those of the enumerators.
 template <typename Kind, typename Target>
 Take word(const char *option, Target &target, const std::vector<const char *> &kinds) {
   return [=, &target](const std::string &text) {
-    const auto found = std::find(kinds.begin(), kinds.end(), text);
+    const auto found = std::ranges::find(kinds, text);
     if (found == kinds.end()) {
       throw usageError("{}: \"{}\" is not {} or {}", option, printable(text),
                        fmt::join(kinds.begin(), kinds.end() - 1, ", "), kinds.back());
@@ -122,34 +102,23 @@ Take word(const char *option, Target &target, const std::vector<const char *> &k
   };
 }
 
-std::vector<Option> inputOptions(Arguments &arguments) {
+std::vector<Option> optionsOf(Arguments &arguments) {
   constexpr uint64_t longest = 1 << 30;
   constexpr uint64_t most = std::numeric_limits<int64_t>::max();
   TranslateOptions &options = arguments.options;
   return {
-      {.name = "from",
-       .metavar = "PAGE",
-       .help = "code page of the input",
-       .take = page("--from", options.from),
-       .isRequired = true},
-      value("to", "PAGE", "code page of the output; required but for --csv",
-            page("--to", arguments.to)),
-      value("record-length", "N", "bytes of every input record",
-            number("--record-length", options.recordLength, 1, longest)),
+      required(pageValue("from", "code page of the input", options.from)),
+      pageValue("to", "code page of the output; required but for --csv", arguments.to),
+      numberValue("record-length", "N", "bytes of every input record", options.recordLength, 1,
+                  longest),
       flag("lines", "read lines that end in LF, CR LF or NEL in place of records",
            into(arguments.lines)),
-      value("skip", "N", "leave out the first N records", number("--skip", options.skip, 0, most)),
-      value("count", "M", "translate M records at the most",
-            number("--count", options.count, 0, most)),
+      numberValue("skip", "N", "leave out the first N records", options.skip, 0, most),
+      numberValue("count", "M", "translate M records at the most", options.count, 0, most),
       value("fields", "LIST", "START-END[=KIND][:WIDTH],...: the bytes of a record to put out",
-            [&](const std::string &text) { arguments.fields = text; }),
-      value("out-length", "M", "the most bytes of an output record",
-            number("--out-length", options.outLength, 1, longest)),
-  };
-}
-
-std::vector<Option> outputOptions(TranslateOptions &options) {
-  return {
+            into(arguments.fields)),
+      numberValue("out-length", "M", "the most bytes of an output record", options.outLength, 1,
+                  longest),
       flag("fill", "pad with blanks to M bytes", set(options.padding, nls2::padding::fill)),
       flag("keep-blanks", "keep the trailing blanks, or as many as fit in M",
            set(options.padding, nls2::padding::keep_blanks)),
@@ -166,11 +135,8 @@ std::vector<Option> outputOptions(TranslateOptions &options) {
       flag("progress", "show how far the run is; the default on a terminal",
            set(options.progress, true)),
       flag("no-progress", "do not show it", set(options.progress, false)),
-      {.name = "output",
-       .letter = 'o',
-       .metavar = "OUT",
-       .help = "file to write; standard output if - or not given",
-       .take = into(options.output)},
+      value("output", "OUT", "file to write; standard output if - or not given",
+            into(options.output), 'o'),
       flag("sync", "wait until the disk has it", into(options.sync)),
   };
 }
@@ -179,17 +145,11 @@ std::vector<Option> outputOptions(TranslateOptions &options) {
 
 Command translateCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  Command command;
-  command.operands = {{.metavar = "INPUT",
-                       .help = "file to read; standard input if - or not given",
-                       .take = into(arguments->options.input)}};
-  command.options = inputOptions(*arguments);
-  for (Option &option : outputOptions(arguments->options)) {
-    command.options.push_back(std::move(option));
-  }
-  command.notes = notes;
-  command.run = [arguments] { return run(*arguments); };
-  return command;
+  return {.operands = {{"INPUT", "file to read; standard input if - or not given",
+                        into(arguments->options.input)}},
+          .options = optionsOf(*arguments),
+          .notes = notes,
+          .run = [arguments] { return run(*arguments); }};
 }
 
 } // namespace nls2::tool

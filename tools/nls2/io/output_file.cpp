@@ -2,16 +2,22 @@
 
 #include "io/output_file.h"
 
-#include "memory.h"
+#include "errors.h"
+#include "io/signals.h"
 #include "options.h"
 
+#include <algorithm>
 #include <cerrno>
-#include <csignal>
+#include <cstdio>
 #include <cstring>
 #include <fcntl.h>
 #include <filesystem>
+#include <linux/limits.h>
 #include <poll.h>
+#include <sys/stat.h>
+#include <sys/xattr.h>
 #include <unistd.h>
+#include <utility>
 
 namespace nls2::tool {
 
@@ -21,13 +27,18 @@ namespace fs = std::filesystem;
 
 constexpr std::size_t mostKept = std::size_t{64} * 1024;
 
+std::string directoryOf(const std::string &path) {
+  const auto parent = fs::path(path).parent_path();
+  return parent.empty() ? "." : parent.string();
+}
+
 // The number in /proc/self/fd/NUMBER, to which /dev/stdout, /dev/fd/NUMBER and links of users lead.
 // What lies behind that number is not looked at.
 std::optional<int> descriptorOf(fs::path path) {
   const std::string ours = fmt::format("/proc/{}/", getpid());
   std::error_code error;
   for (int links = 0; links < 40 && !error; ++links) {
-    const fs::path directory = path.has_parent_path() ? path.parent_path() : ".";
+    const fs::path directory = directoryOf(path);
     const std::string real = fs::canonical(directory, error);
     if (real.starts_with(ours) && real.ends_with("/fd")) {
       return decimalNumber<int>(path.filename().native());
@@ -37,18 +48,62 @@ std::optional<int> descriptorOf(fs::path path) {
   return {};
 }
 
+std::string ownPath(int fd) { return fmt::format("/proc/self/fd/{}", fd); }
+
 // In a directory such as /tmp only the owner of a file, or of the directory, may replace it.
 bool isOthersInStickyDirectory(const std::string &path, const struct stat &existing) {
   struct stat directory = {};
-  return stat(fs::path(path).parent_path().c_str(), &directory) == 0 &&
-         (directory.st_mode & S_ISVTX) != 0 && geteuid() != 0 && geteuid() != existing.st_uid &&
-         geteuid() != directory.st_uid;
+  return stat(directoryOf(path).c_str(), &directory) == 0 && (directory.st_mode & S_ISVTX) != 0 &&
+         geteuid() != 0 && geteuid() != existing.st_uid && geteuid() != directory.st_uid;
+}
+
+// No attribute, and no list of their names, is longer; empty where it cannot be read.
+template <typename Get>
+std::string attributeBytes(Get get) {
+  std::string bytes(XATTR_LIST_MAX, '\0');
+  bytes.resize(static_cast<std::size_t>(std::max<ssize_t>(get(bytes.data(), bytes.size()), 0)));
+  return bytes;
+}
+
+std::string valueOf(const std::string &path, const char *name) {
+  return attributeBytes(
+      [&](char *buffer, std::size_t size) { return getxattr(path.c_str(), name, buffer, size); });
+}
+
+// The owner first, since a change of owner takes mode bits away. Only the superuser may give a file
+// away; its group may still be one of the caller's.
+//
+// Where an access list is, the mode's group bits are its mask, which may allow more than the list
+// allows the group. A file that cannot have the list is therefore the owner's alone. A list that
+// the directory gave to the new file goes where the old one had none.
+//
+// Capabilities are for the program that the old file was. Others that cannot be set are left out.
+void copyAttributes(int fd, const std::string &target, const struct stat &existing) {
+  constexpr std::string_view accessList = "system.posix_acl_access";
+  if (fchown(fd, existing.st_uid, existing.st_gid) != 0 &&
+      fchown(fd, static_cast<uid_t>(-1), existing.st_gid) != 0 && errno != EPERM) {
+    throw failure("cannot keep the file's owner: {}", std::strerror(errno));
+  }
+  fremovexattr(fd, accessList.data());
+  const bool hasList = !valueOf(target, accessList.data()).empty();
+  if (fchmod(fd, existing.st_mode & (hasList ? 0700 : 0777)) != 0) {
+    throw failure("cannot keep the file's permissions: {}", std::strerror(errno));
+  }
+  const std::string names = attributeBytes(
+      [&](char *buffer, std::size_t size) { return listxattr(target.c_str(), buffer, size); });
+  for (const char *name = names.c_str(); *name != '\0'; name += std::strlen(name) + 1) {
+    if (std::string_view(name) != "security.capability") {
+      const std::string value = valueOf(target, name);
+      static_cast<void>(fsetxattr(fd, name, value.data(), value.size(), 0));
+    }
+  }
 }
 
 } // namespace
 
-OutputFile::OutputFile(const std::string &path)
-    : name_(path == "-" ? "standard output" : printable(path)) {
+// Delegates, so that the destructor removes the temporary file where this throws.
+OutputFile::OutputFile(const std::string &path) : OutputFile() {
+  name_ = path == "-" ? "standard output" : printable(path);
   struct stat existing = {};
   if (path == "-") {
     fd_ = STDOUT_FILENO;
@@ -68,36 +123,79 @@ OutputFile::OutputFile(const std::string &path)
 
 void OutputFile::makeFile(const std::string &path) {
   struct stat link = {};
-  if (errno != ENOENT && errno != ENOTDIR) {
+  if (path.empty() || (errno != ENOENT && errno != ENOTDIR)) {
     fail();
   }
   if (lstat(path.c_str(), &link) == 0) {
     throw failure("cannot write {}: it is a symbolic link that leads nowhere", name_);
   }
-  replacedPath_ = path;
-  temporary_ = std::make_unique<TemporaryFile>(path, name_, 0666);
-  fd_ = temporary_->fd();
+  target_ = path;
+  openTemporary(0666);
 }
 
 // Whatever would keep the file from being replaced in the end is found now. A symbolic link stays
 // one when its file is replaced.
 void OutputFile::replaceFile(const std::string &path, const struct stat &existing) {
   std::error_code error;
-  replacedPath_ = fs::canonical(path, error);
+  target_ = fs::canonical(path, error);
   if (error || faccessat(AT_FDCWD, path.c_str(), W_OK, AT_EACCESS) != 0) {
     fail();
   }
-  if (isOthersInStickyDirectory(replacedPath_, existing)) {
+  if (isOthersInStickyDirectory(target_, existing)) {
     throw failure("cannot write {}: it is another user's, in a directory with the sticky bit",
                   name_);
   }
-  temporary_ = std::make_unique<TemporaryFile>(replacedPath_, name_, 0600);
-  fd_ = temporary_->fd();
-  temporary_->copyAttributes(existing);
+  openTemporary(0600);
+  copyAttributes(fd_, target_, existing);
+}
+
+// File systems without unnamed files, and systems without /proc, get a name at once.
+void OutputFile::openTemporary(mode_t mode) {
+  catchEndingSignals();
+  fd_ = open(directoryOf(target_).c_str(), O_TMPFILE | O_RDWR | O_CLOEXEC, mode);
+  if (fd_ >= 0 && access(ownPath(fd_).c_str(), F_OK) == 0) {
+    return;
+  }
+  if (fd_ >= 0) {
+    close(fd_);
+  }
+  takeFreeName([&](const char *free) {
+    return fd_ = open(free, O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, mode);
+  });
+}
+
+// Calls `make` with names beside the target until one is free.
+void OutputFile::takeFreeName(const std::function<int(const char *)> &make) {
+  const SignalsHeldBack held;
+  int made = -1;
+  for (int attempt = 0; made < 0 && attempt < 1000; ++attempt) {
+    temporary_ = fmt::format("{}/.nls2-{}-{}.tmp", directoryOf(target_), getpid(), attempt);
+    made = make(temporary_.c_str());
+    if (made < 0 && errno != EEXIST) {
+      break;
+    }
+  }
+  if (made < 0) {
+    temporary_.clear();
+    throw failure("cannot write {}: no new file in its directory: {}", name_, std::strerror(errno));
+  }
+  *std::find(namesToRemove.begin(), namesToRemove.end(), nullptr) = temporary_.c_str();
+}
+
+void OutputFile::giveUpName() {
+  for (const char *volatile &name : namesToRemove) {
+    name = name == temporary_.c_str() ? nullptr : name;
+  }
+  temporary_.clear();
 }
 
 OutputFile::~OutputFile() {
-  if (!temporary_ && fd_ >= 0 && fd_ != STDOUT_FILENO) {
+  const SignalsHeldBack held;
+  if (!temporary_.empty()) {
+    unlink(temporary_.c_str());
+    giveUpName();
+  }
+  if (fd_ >= 0 && fd_ != STDOUT_FILENO) {
     close(fd_);
   }
 }
@@ -132,12 +230,34 @@ void OutputFile::flush() {
   kept_.clear();
 }
 
+// An unnamed file can take a free name only; the step from there to the target is a rename. A file
+// system may report only at close() that bytes were lost: before the name is taken.
+void OutputFile::publish(bool sync) {
+  const SignalsHeldBack held;
+  if (temporary_.empty()) {
+    takeFreeName([&](const char *free) {
+      return linkat(AT_FDCWD, ownPath(fd_).c_str(), AT_FDCWD, free, AT_SYMLINK_FOLLOW);
+    });
+  }
+  if ((sync && fsync(fd_) != 0) || close(std::exchange(fd_, -1)) != 0 ||
+      std::rename(temporary_.c_str(), target_.c_str()) != 0) {
+    fail();
+  }
+  giveUpName();
+  if (sync) {
+    fd_ = open(directoryOf(target_).c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    if (fd_ < 0 || fsync(fd_) != 0) {
+      fail();
+    }
+  }
+}
+
 // Closing a second descriptor makes a file system report lost bytes, and standard output stays.
 void OutputFile::commit(bool sync) {
   requireMemory(); // what ICU made without it must not take a file's place
   flush();
-  if (temporary_) {
-    temporary_->publish(sync);
+  if (!target_.empty()) {
+    publish(sync);
     return;
   }
   const bool unsynced = sync && fsync(fd_) != 0 && errno != EINVAL && errno != EROFS;
@@ -145,6 +265,13 @@ void OutputFile::commit(bool sync) {
   if (unsynced || (second >= 0 && close(second) != 0)) {
     fail();
   }
+}
+
+void print(std::string_view text) {
+  requireMemory();
+  OutputFile out("-");
+  out.write(text);
+  out.commit();
 }
 
 } // namespace nls2::tool

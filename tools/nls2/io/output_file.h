@@ -1,9 +1,7 @@
 // Where a command writes: standard output, a file that appears when it is complete, or a device.
 #pragma once
 
-#include "io/temporary_file.h"
-
-#include <memory>
+#include <functional>
 #include <string>
 #include <string_view>
 #include <sys/stat.h>
@@ -29,21 +27,27 @@ public:
   void commit(bool sync = false);
 
   // The open file that the bytes go to at once; -1 for a file that is not seen before commit().
-  int directFd() const { return temporary_ ? -1 : fd_; }
-  // The file that commit() replaces; empty for others.
-  const std::string &replacedPath() const { return replacedPath_; }
+  int directFd() const { return target_.empty() ? fd_ : -1; }
   const std::string &name() const { return name_; } // for messages
 
 private:
+  OutputFile() = default;
   void makeFile(const std::string &path);
   void replaceFile(const std::string &path, const struct stat &existing);
+  void openTemporary(mode_t mode);
+  void takeFreeName(const std::function<int(const char *)> &make);
+  void giveUpName();
+  void publish(bool sync);
   [[noreturn]] void fail() const;
 
   std::string name_;
-  std::string replacedPath_;
+  std::string target_;    // the file that commit() makes or replaces; empty for others
+  std::string temporary_; // the name until then, while there is one
   std::string kept_;
-  std::unique_ptr<TemporaryFile> temporary_;
   int fd_ = -1;
 };
+
+// Writes all of the text to standard output at once. Throws Error.
+void print(std::string_view text);
 
 } // namespace nls2::tool

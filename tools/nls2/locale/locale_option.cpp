@@ -146,20 +146,14 @@ std::string localesNear(const std::string &name) {
   return didYouMean(names);
 }
 
-std::vector<Option> localeOptions(LocaleOptions &options, const std::vector<Option> &own) {
-  std::vector<Option> all = {
-      {.name = "locale",
-       .metavar = "LOCALE",
-       .help = "whose rules: a name or language id of `nls2 locales`",
-       .take = [&options](const std::string &text) { options.locale = parseLocale(text); }},
-      {.name = "codepage",
-       .metavar = "PAGE",
-       .help = "code page of all texts; 1208 (UTF-8) by default",
-       .take = [&options](const std::string &text) {
-         options.codepage = parsePage("--codepage", text);
-       }}};
-  all.insert(all.end(), own.begin(), own.end());
-  return all;
+std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own) {
+  const auto takeLocale = [&](const std::string &text) { options.locale = parseLocale(text); };
+  own.insert(
+      own.begin(),
+      {value("locale", "LOCALE", "whose rules: a name or language id of `nls2 locales`",
+             takeLocale),
+       pageValue("codepage", "code page of all texts; 1208 (UTF-8) by default", options.codepage)});
+  return own;
 }
 
 std::string orderLocale(const LocaleOptions &options) {
@@ -167,10 +161,8 @@ std::string orderLocale(const LocaleOptions &options) {
     return *options.locale;
   }
   const auto [variable, name] = environmentLocale();
-  std::string locale = knownLocale(name);
-  if (locale.empty()) {
-    locale = localeOfLanguage(name);
-  }
+  const std::string known = knownLocale(name);
+  std::string locale = known.empty() ? localeOfLanguage(name) : known;
   if (locale.empty()) {
     throw usageError("{}: \"{}\" is not a known locale{}; give --locale", variable, printable(name),
                      localesNear(name));

@@ -20,7 +20,7 @@ struct LocaleOptions {
 std::string localesNear(const std::string &name);
 
 // The two options, and after them a command's own.
-std::vector<Option> localeOptions(LocaleOptions &options, const std::vector<Option> &own);
+std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own);
 
 // The locale whose order of texts counts: of --locale, or of the environment (LC_ALL, LC_COLLATE,
 // LANG), which may also be another locale of a language that localeMap holds. Throws usageError

@@ -1,0 +1,61 @@
+// Signals that end the process: what they remove first, and how to hold them back.
+#pragma once
+
+#include <array>
+#include <csignal>
+#include <unistd.h>
+
+namespace nls2::tool {
+
+// The names of the files that they remove, with room for more than a command ever has. They change
+// only while the signals are held back, and while no other thread of the process could get them in
+// this one's place.
+inline std::array<const char *volatile, 8> namesToRemove{};
+
+// Ends the process as this signal does when nobody handles it, without the files. Safe in a signal
+// handler.
+[[noreturn]] inline void endBySignal(int signal) {
+  for (const char *name : namesToRemove) {
+    if (name != nullptr) {
+      unlink(name);
+    }
+  }
+  std::signal(signal, SIG_DFL);
+  sigset_t set;
+  sigemptyset(&set);
+  sigaddset(&set, signal);
+  pthread_sigmask(SIG_UNBLOCK, &set, nullptr);
+  raise(signal);
+  _exit(128 + signal);
+}
+
+// Those that end a process unless it handles them, and that others send or a clock does. Signals that
+// the caller had ignored, as nohup does, stay ignored.
+inline void catchEndingSignals() {
+  for (const int signal : {SIGHUP, SIGINT, SIGQUIT, SIGTERM, SIGALRM, SIGUSR1, SIGUSR2, SIGXCPU,
+                           SIGPIPE, SIGPOLL, SIGVTALRM, SIGPROF, SIGPWR, SIGSTKFLT}) {
+    struct sigaction action = {};
+    sigaction(signal, nullptr, &action);
+    if (action.sa_handler == SIG_DFL) {
+      action.sa_handler = endBySignal;
+      sigaction(signal, &action, nullptr);
+    }
+  }
+}
+
+class SignalsHeldBack {
+public:
+  SignalsHeldBack() {
+    sigset_t set;
+    sigfillset(&set);
+    pthread_sigmask(SIG_BLOCK, &set, &before_);
+  }
+  ~SignalsHeldBack() { pthread_sigmask(SIG_SETMASK, &before_, nullptr); }
+  SignalsHeldBack(const SignalsHeldBack &) = delete;
+  SignalsHeldBack &operator=(const SignalsHeldBack &) = delete;
+
+private:
+  sigset_t before_;
+};
+
+} // namespace nls2::tool
