@@ -93,6 +93,11 @@ inline std::string printable(std::string_view name) {
   return text;
 }
 
+// What messages call a file; "-" is a standard stream.
+inline std::string shownName(const std::string &path, const char *stream) {
+  return path == "-" ? stream : path.empty() ? "\"\"" : printable(path);
+}
+
 // A message of the command on standard error. Allocates nothing.
 inline void complain(const char *text) noexcept { std::fprintf(stderr, "nls2: %s\n", text); }
 

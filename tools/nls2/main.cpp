@@ -87,7 +87,7 @@ Command generalCommand(const std::string &first) {
   const auto topic = std::make_shared<std::string>();
   return {.operands = {{"COMMAND", "", into(*topic)}}, .run = [topic] {
             const CommandEntry *entry = commandNamed(*topic);
-            if (entry == nullptr && !topic->empty()) {
+            if (entry == nullptr && !topic->empty() && *topic != "help") {
               throw unknownCommand(*topic);
             }
             return print(helpOn(entry)), exitDone;
@@ -148,6 +148,16 @@ void watchMemory() {
       [](const void *, void *block) { std::free(block); }, &status);
 }
 
+// ICU's collation loader follows null pointers when it has run out of memory.
+void endAtBadPointer(int signal) {
+  if (ranOutOfMemory) {
+    constexpr std::string_view message = "nls2: out of memory\n";
+    static_cast<void>(!write(STDERR_FILENO, message.data(), message.size()));
+    _exit(failureCode);
+  }
+  std::signal(signal, SIG_DFL); // the access comes again
+}
+
 // Without memory for an exception the process would be aborted.
 void endWithoutMemory() {
   if (!std::current_exception()) {
@@ -166,6 +176,7 @@ int main(int argc, char **argv) {
   std::signal(SIGXFSZ, SIG_IGN); // a full file is a write error, reported like any other
   std::set_terminate(nls2::tool::endWithoutMemory);
   nls2::tool::watchMemory();
+  std::signal(SIGSEGV, nls2::tool::endAtBadPointer);
   const auto *entry = argc > 1 ? nls2::tool::commandNamed(argv[1]) : nullptr;
   nls2::tool::failureCode = entry != nullptr ? entry->failureCode : nls2::tool::exitFailed;
   return nls2::tool::run(entry, argc, argv);

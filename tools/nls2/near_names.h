@@ -29,14 +29,20 @@ inline std::size_t letterDistance(std::string_view a, std::string_view b) {
   return table[a.size()][b.size()];
 }
 
+inline std::string withoutPunctuation(std::string name) {
+  std::erase_if(name, [](char letter) { return letter == '-' || letter == '_' || letter == ' '; });
+  return name;
+}
+
 // Up to three of the known names that are nearest and differ in few letters.
 inline std::vector<std::string> nearNames(const std::string &unknown,
                                           const std::vector<std::string> &known) {
-  std::size_t nearest = 1 + unknown.size() / 4;
+  const std::string asked = withoutPunctuation(unknown);
+  std::size_t nearest = 1 + asked.size() / 4;
   std::vector<std::string> names;
   for (const std::string &name : known) {
-    const std::size_t letters = letterDistance(unknown, name);
-    if (letters > nearest || letters >= name.size() ||
+    const std::size_t letters = letterDistance(asked, withoutPunctuation(name));
+    if (letters > nearest || 2 * letters >= std::max(asked.size(), name.size()) ||
         std::ranges::find(names, name) != names.end()) {
       continue;
     }

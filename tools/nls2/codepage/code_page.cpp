@@ -100,8 +100,8 @@ std::optional<int32_t> givenNumber(const char *option, const std::string &text) 
 }
 
 Error unknownPage(const char *option, const std::string &text) {
-  return usageError("{}: unknown code page {}{}", option, text.empty() ? "\"\"" : printable(text),
-                    nearPages(text));
+  return usageError("{}: unknown code page {}{}; `nls2 codepages --names` lists names", option,
+                    text.empty() ? "\"\"" : printable(text), nearPages(text));
 }
 
 } // namespace
@@ -149,11 +149,21 @@ std::set<std::string> namesWithNumbers() {
 }
 
 std::string nearPages(const std::string &asked) {
-  if (const auto number = wholeNumber(asked)) {
-    const auto page = windowsPage(fmt::format("windows-{}", *number));
+  if (decimalNumber<int64_t>(asked)) {
+    const auto page = windowsPage("windows-" + asked);
     return page ? didYouMean({std::to_string(*page)}) : "";
   }
-  return didYouMean(nearNames(asked, allPageNames()));
+  std::vector<std::string> known;
+  for (const int32_t number : pagesWithNames) {
+    known.push_back(std::to_string(number));
+  }
+  for (const std::string &name : allPageNames()) {
+    known.push_back(name);
+    if (name.starts_with("ibm-") && decimalNumber<int32_t>(name.substr(4))) {
+      known.push_back(name.substr(4));
+    }
+  }
+  return didYouMean(nearNames(asked, known));
 }
 
 int32_t parsePage(const char *option, const std::string &text) {

@@ -62,7 +62,10 @@ private:
     for (bool isOpen = true; isOpen;) {
       std::string text;
       try {
-        isOpen = read(in ? *in : in.emplace(path), text);
+        if (!in) {
+          out_.requireOther(in.emplace(path));
+        }
+        isOpen = read(*in, text);
       } catch (const Error &error) {
         complain(error.what());
         code = exitUsage;

@@ -83,7 +83,7 @@ std::string cellOf(const ByteMeaning &meaning) {
     return "SP";
   }
   const Display display = displayOf(meaning.text);
-  if (display.text == "." && meaning.text != u".") {
+  if ((display.text == "." && meaning.text != u".") || u_isblank(meaning.text[0])) {
     return "..";
   }
   return display.text +

@@ -86,8 +86,7 @@ private:
     }
   }
 
-  // What the converter has taken without a character, or a character's part, such as a shift, is a
-  // dot.
+  // What the converter has taken without a character, such as a shift, is a dot.
   void decode(const char *byte, bool isLast) {
     std::array<char16_t, 32> units;
     char16_t *end = units.data();
@@ -98,10 +97,11 @@ private:
     const auto pending = static_cast<std::size_t>(ucnv_toUCountPending(page_.converter(), &error));
     const std::size_t unknown = bytes_.size() - cells_.size();
     const std::size_t length = unknown - std::min(pending, unknown);
-    if (end == units.data()) {
+    held_.append(units.data(), end);
+    if (held_.empty()) {
       addDots(length);
-    } else {
-      addCharacter({units.data(), end}, length);
+    } else if (isLast || !U16_IS_LEAD(held_.back())) {
+      addCharacter(std::exchange(held_, {}), length);
     }
   }
 
@@ -115,7 +115,8 @@ private:
       hex.append(i == bytesALine / 2 ? "  " : " ").append(1, digits[byte / 16]);
       hex += digits[byte % 16];
       isCovered = isCovered && cells_[i].empty();
-      text += isCovered ? " " : cells_[i];
+      const bool isCut = i + 1 == bytesALine && i + 1 < cells_.size() && cells_[i + 1].empty();
+      text += isCovered ? " " : isCut ? "." : cells_[i];
     }
     lines_ += fmt::format("{:08x} {:<49}  |{}|\n", offset_, hex, text);
     offset_ += length;
@@ -127,6 +128,7 @@ private:
   uint64_t offset_ = 0;            // of the first byte that is not in a line yet
   std::string bytes_;              // from there
   std::vector<std::string> cells_; // what stands in their columns, as far as it is known
+  std::u16string held_;            // of a character whose second half has not come
   std::string lines_;
 };
 
@@ -134,6 +136,7 @@ int dumpFile(const Arguments &arguments) {
   PageDump dump(CodePage(arguments.page, "--from"));
   InputFile in(arguments.path);
   OutputFile out("-");
+  out.requireOther(in);
   std::string bytes(std::size_t{64} * 1024, '\0');
   int32_t done = 0; // of the record
   while (const std::size_t got = in.read(bytes.data(), bytes.size())) {

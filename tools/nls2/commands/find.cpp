@@ -168,6 +168,7 @@ private:
     try {
       if (!file) {
         file.emplace(path, RecordShape{.page = arguments_.locale.codepage, .isText = false});
+        output_.requireOther(file->input());
       }
       auto line = file->next();
       while (line && !file->apply(*line, isMatch)) {

@@ -38,14 +38,17 @@ struct Arguments {
   std::string a, b;
 };
 
-// Gives every text a key; the keys' bytes compare as the library's comparison orders the texts. For
-// one thread at a time.
+// Gives every text a key; the keys' bytes compare as the library's comparison orders the texts, and for
+// the locale C as their code points do. For one thread at a time.
 class LineOrder {
 public:
   // Throws usageError.
   explicit LineOrder(const Arguments &arguments)
       : decoder_(arguments.locale.codepage), ignoreTrailing_(arguments.ignoreTrailing) {
     const std::string locale = orderLocale(arguments.locale);
+    if (locale == byCodePoint) {
+      return;
+    }
     UErrorCode error = U_ZERO_ERROR;
     collator_.adoptInstead(ucol_open(locale.c_str(), &error));
     if (U_FAILURE(error)) {
@@ -60,6 +63,9 @@ public:
     std::u16string_view text = decoder_.decode(bytes);
     if (ignoreTrailing_) {
       text = withoutBlanks(withoutNulls(text));
+    }
+    if (collator_.isNull()) {
+      return codePointKey(text);
     }
     const int32_t length = ucol_getSortKey(
         collator_.getAlias(), text.data(), static_cast<int32_t>(text.size()),
@@ -77,9 +83,21 @@ public:
   std::string lineFeed() const { return lineFeedOf(decoder_.page(), true); }
 
 private:
+  std::string_view codePointKey(std::u16string_view text) {
+    key_.clear();
+    for (std::size_t i = 0; i < text.size();) {
+      UChar32 character = 0;
+      U16_NEXT(text.data(), i, text.size(), character);
+      for (const int shift : {16, 8, 0}) {
+        key_ += static_cast<char>(character >> shift);
+      }
+    }
+    return key_;
+  }
+
   Decoder decoder_;
   const bool ignoreTrailing_;
-  icu::LocalUCollatorPointer collator_;
+  icu::LocalUCollatorPointer collator_; // none: by code point
   std::string key_ = std::string(256, '\0');
 };
 
@@ -100,7 +118,7 @@ struct KeyedLine {
 
 class Lines {
 public:
-  // Keeps copies of both. A key has no zero byte but its last.
+  // Keeps copies of both.
   void add(std::string_view line, std::string_view key) {
     auto *const bytes = static_cast<char *>(memory_.allocate(key.size() + line.size(), 1));
     std::copy(line.begin(), line.end(), std::copy(key.begin(), key.end(), bytes));

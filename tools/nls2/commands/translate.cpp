@@ -39,7 +39,6 @@ void check(const Arguments &arguments) {
   const bool fills = options.padding == nls2::padding::fill;
   const bool keeps = options.padding == nls2::padding::keep_blanks;
   const bool rejects = options.onError == OnError::reject;
-  const std::string output = options.dryRun ? "" : options.output;
   for (const auto &[isBroken, message] : {
            Rule{!arguments.to && !options.csv, "--to PAGE is missing"},
            Rule{hasLength && arguments.lines, "--record-length and --lines exclude each other"},
@@ -52,12 +51,8 @@ void check(const Arguments &arguments) {
            Rule{options.csv && (fills || keeps || options.outLength != 0),
                 "--csv strips its fields: --fill, --keep-blanks and --out-length make no sense"},
            Rule{fills && options.outLength == 0 && !arguments.fields, "--fill needs --out-length"},
-           Rule{rejects && options.rejects.empty(), "--on-error reject needs --rejects FILE"},
-           Rule{!rejects && !options.rejects.empty(), "--rejects needs --on-error reject"},
-           Rule{rejects && (options.rejects == output || options.rejects == options.report),
-                "--rejects names a file that is written already"},
-           Rule{!options.report.empty() && options.report == output,
-                "--report names a file that is written already"},
+           Rule{rejects && !options.rejects, "--on-error reject needs --rejects FILE"},
+           Rule{!rejects && options.rejects, "--rejects needs --on-error reject"},
        }) {
     if (isBroken) {
       throw usageError("{}", message);

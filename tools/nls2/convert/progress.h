@@ -1,6 +1,8 @@
 // How far a long run is, in one line on standard error.
 #pragma once
 
+#include "io/signals.h"
+
 #include <chrono>
 #include <cstdint>
 #include <cstdio>
@@ -18,7 +20,7 @@ public:
   Progress(std::optional<bool> wanted, std::optional<uint64_t> total)
       : total_(total.value_or(0)), next_(start_ + std::chrono::seconds(wanted == true ? 0 : 1)),
         isShown_(wanted.value_or(isatty(STDERR_FILENO) == 1)) {}
-  ~Progress() { clear(); }
+  ~Progress() { clearProgress(); }
   Progress(const Progress &) = delete;
   Progress &operator=(const Progress &) = delete;
 
@@ -27,20 +29,15 @@ public:
     const auto now = Clock::now();
     if (isShown_ && now >= next_) {
       next_ = now + std::chrono::milliseconds(200);
-      isThere_ = true;
-      std::fprintf(stderr, "%s%s", toLineStart, line(bytes, now - start_).c_str());
-    }
-  }
-  void clear() {
-    if (isThere_) {
-      std::fputs(toLineStart, stderr);
-      isThere_ = false;
+      catchEndingSignals();
+      clearProgress();
+      std::fputs(line(bytes, now - start_).c_str(), stderr);
+      progressIsShown = true;
     }
   }
 
 private:
   using Clock = std::chrono::steady_clock;
-  static constexpr const char *toLineStart = "\r\x1B[K";
 
   std::string line(uint64_t bytes, std::chrono::duration<double> passed) const {
     const double rate = passed.count() > 0 ? static_cast<double>(bytes) / passed.count() : 0;
@@ -59,7 +56,6 @@ private:
   const Clock::time_point start_ = Clock::now();
   Clock::time_point next_; // when the line is due
   const bool isShown_;     // at all
-  bool isThere_ = false;   // now
 };
 
 } // namespace nls2::tool

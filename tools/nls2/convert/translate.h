@@ -45,8 +45,8 @@ struct TranslateOptions {
   uint64_t count = std::numeric_limits<uint64_t>::max();
   std::string input = "-";
   std::string output = "-";
-  std::string rejects; // empty: none
-  std::string report;  // empty: none
+  std::optional<std::string> rejects;
+  std::optional<std::string> report;
 
   const char *unit() const { return recordLength == 0 ? "line" : "record"; }
 };

@@ -25,23 +25,44 @@ struct Piece {
   std::size_t weight() const { return batch.size(); }
 };
 
-// Two descriptors of one regular file. What is read would be lost, or grow without end, where it is
-// written to at the same time.
-bool areSameFile(int first, int second) {
-  struct stat one = {};
-  struct stat two = {};
-  return second >= 0 && fstat(first, &one) == 0 && fstat(second, &two) == 0 &&
-         S_ISREG(one.st_mode) && one.st_dev == two.st_dev && one.st_ino == two.st_ino;
-}
+// Those that are not wanted are null.
+struct Files {
+  InputFile input;
+  const std::unique_ptr<OutputFile> output;
+  const std::unique_ptr<OutputFile> rejects;
+  const std::unique_ptr<OutputFile> report;
 
-std::unique_ptr<OutputFile> openOutput(const std::string &path, const InputFile *input = nullptr) {
-  auto file = path.empty() ? nullptr : std::make_unique<OutputFile>(path);
-  if (file && input != nullptr && areSameFile(input->fd(), file->directFd())) {
-    throw usageError("{} is also {}; give --output, which replaces it at the end", input->name(),
-                     file->name());
+  // Throws Error, also where one would take the place of another. Only the output may replace the
+  // input.
+  explicit Files(const TranslateOptions &options)
+      : input(options.input),
+        output(options.dryRun ? nullptr : std::make_unique<OutputFile>(options.output)),
+        rejects(opened(options.rejects)), report(opened(options.report)) {
+    if (output && output->isDirect() && output->isSame(input.facts())) {
+      throw usageError("{} is also {}; give --output, which replaces it at the end", input.name(),
+                       output->name());
+    }
+    requireOthers("--rejects", rejects.get(), {output.get()});
+    requireOthers("--report", report.get(), {output.get(), rejects.get()});
   }
-  return file;
-}
+
+private:
+  static std::unique_ptr<OutputFile> opened(const std::optional<std::string> &path) {
+    return path ? std::make_unique<OutputFile>(*path) : nullptr;
+  }
+
+  void requireOthers(const char *option, const OutputFile *file,
+                     std::initializer_list<const OutputFile *> others) const {
+    if (file != nullptr && file->isSame(input.facts())) {
+      throw usageError("{} names the input", option);
+    }
+    for (const OutputFile *other : others) {
+      if (file != nullptr && other != nullptr && file->isSame(*other)) {
+        throw usageError("{} names a file that is written already", option);
+      }
+    }
+  }
+};
 
 std::optional<uint64_t> bytesToRead(const InputFile &input, const TranslateOptions &options) {
   const auto left = input.bytesLeft();
@@ -72,14 +93,14 @@ RecordShape shapeOf(const TranslateOptions &options) {
           .mostInBatch = std::max<uint64_t>(usualOutput / (filledLength(options) + 1), 1)};
 }
 
-// The steps of the pipeline, and the files; those that are not wanted are null.
+// The steps of the pipeline.
 class TranslateRun {
 public:
-  TranslateRun(const TranslateOptions &options, const RecordTranslator &translator, Tally &tally)
-      : options_(options), translator_(translator), tally_(tally), input_(options.input),
-        output_(openOutput(options.dryRun ? "" : options.output, &input_)),
-        rejects_(openOutput(options.rejects, &input_)), reader_(input_, shapeOf(options)),
-        progress_(options.progress, bytesToRead(input_, options)) {}
+  TranslateRun(const TranslateOptions &options, const RecordTranslator &translator, Files &files,
+               Tally &tally)
+      : options_(options), translator_(translator), files_(files), tally_(tally),
+        reader_(files.input, shapeOf(options)),
+        progress_(options.progress, bytesToRead(files.input, options)) {}
 
   void run();
 
@@ -87,7 +108,7 @@ public:
   RecordTranslator worker() const { return translator_; }
   void work(RecordTranslator &worker, Piece &piece) const;
   void write(Piece &piece);
-  void interrupt() { input_.interrupt(); }
+  void interrupt() { files_.input.interrupt(); }
 
 private:
   bool translate(RecordTranslator &worker, const Record &record, Piece &piece) const;
@@ -95,10 +116,8 @@ private:
 
   const TranslateOptions &options_;
   const RecordTranslator &translator_;
+  Files &files_;
   Tally &tally_;
-  InputFile input_;
-  const std::unique_ptr<OutputFile> output_;
-  const std::unique_ptr<OutputFile> rejects_;
   RecordReader reader_;
   Progress progress_;
 };
@@ -110,8 +129,8 @@ void TranslateRun::run() {
     summarize();
     throw;
   }
-  progress_.clear();
-  for (OutputFile *file : {output_.get(), rejects_.get()}) {
+  clearProgress();
+  for (OutputFile *file : {files_.output.get(), files_.rejects.get()}) {
     if (file != nullptr) {
       file->commit(options_.sync);
     }
@@ -120,10 +139,10 @@ void TranslateRun::run() {
 }
 
 void TranslateRun::summarize() {
-  progress_.clear();
+  clearProgress();
   const std::string summary = summaryOf(tally_, options_.unit());
   if (!summary.empty()) {
-    complain((input_.name() + ": " + summary).c_str());
+    complain((files_.input.name() + ": " + summary).c_str());
   }
 }
 
@@ -176,17 +195,17 @@ bool TranslateRun::translate(RecordTranslator &worker, const Record &record, Pie
 }
 
 void TranslateRun::write(Piece &piece) {
-  if (output_) {
-    output_->write(piece.output.bytes());
+  if (files_.output) {
+    files_.output->write(piece.output.bytes());
   }
-  if (rejects_) {
-    rejects_->write(piece.rejects.bytes());
+  if (files_.rejects) {
+    files_.rejects->write(piece.rejects.bytes());
   }
   tally_.add(piece.tally);
   progress_.update(tally_.bytesIn);
   if (const auto &problem = piece.tally.failure) {
     const auto [reason, advice] = explain(*problem);
-    throw failure("{}: {}: {}{}", input_.name(), placeOf(*problem, options_.unit()), reason,
+    throw failure("{}: {}: {}{}", files_.input.name(), placeOf(*problem, options_.unit()), reason,
                   advice);
   }
   piece.output.clear(usualOutput);
@@ -197,18 +216,18 @@ void TranslateRun::write(Piece &piece) {
 // The report comes last of all, after a failure too.
 int translateFile(const TranslateOptions &options) {
   const RecordTranslator translator(options);
-  const auto report = openOutput(options.report);
+  Files files(options);
   const auto start = std::chrono::steady_clock::now();
   Tally tally;
   const auto writeReport = [&] {
-    if (report) {
+    if (const auto &report = files.report) {
       const std::chrono::duration<double> passed = std::chrono::steady_clock::now() - start;
       report->write(reportOf(tally, options, passed.count()));
       report->commit(options.sync);
     }
   };
   try {
-    TranslateRun(options, translator, tally).run();
+    TranslateRun(options, translator, files, tally).run();
   } catch (...) {
     writeReport();
     throw;

@@ -19,7 +19,7 @@
 namespace nls2::tool {
 
 InputFile::InputFile(const std::string &path)
-    : name_(path == "-" ? "standard input" : printable(path)),
+    : name_(shownName(path, "standard input")),
       fd_(path == "-" ? STDIN_FILENO : open(path.c_str(), O_RDONLY | O_CLOEXEC)),
       wakeFd_(fd_ < 0 ? -1 : eventfd(0, EFD_CLOEXEC)) {
   if (wakeFd_ < 0) {
@@ -77,14 +77,17 @@ void InputFile::skip(uint64_t bytes) {
   }
 }
 
-std::optional<uint64_t> InputFile::bytesLeft() const {
+struct stat InputFile::facts() const {
   struct stat facts = {};
-  if (fstat(fd_, &facts) != 0 || !S_ISREG(facts.st_mode)) {
-    return {};
-  }
-  const off_t here = lseek(fd_, 0, SEEK_CUR);
+  static_cast<void>(fstat(fd_, &facts));
+  return facts;
+}
+
+std::optional<uint64_t> InputFile::bytesLeft() const {
+  const struct stat file = facts();
+  const off_t here = S_ISREG(file.st_mode) ? lseek(fd_, 0, SEEK_CUR) : -1;
   return here < 0 ? std::nullopt
-                  : std::optional(static_cast<uint64_t>(std::max<off_t>(facts.st_size - here, 0)));
+                  : std::optional(static_cast<uint64_t>(std::max<off_t>(file.st_size - here, 0)));
 }
 
 } // namespace nls2::tool

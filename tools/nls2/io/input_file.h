@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <sys/stat.h>
 
 namespace nls2::tool {
 
@@ -26,7 +27,7 @@ public:
   // The bytes from here to the end, where that is known.
   std::optional<uint64_t> bytesLeft() const;
 
-  int fd() const { return fd_; }
+  struct stat facts() const;                        // all zero where they cannot be had
   const std::string &name() const { return name_; } // for messages
 
 private:

@@ -103,21 +103,36 @@ void copyAttributes(int fd, const std::string &target, const struct stat &existi
 
 // Delegates, so that the destructor removes the temporary file where this throws.
 OutputFile::OutputFile(const std::string &path) : OutputFile() {
-  name_ = path == "-" ? "standard output" : printable(path);
-  struct stat existing = {};
+  name_ = shownName(path, "standard output");
   if (path == "-") {
     fd_ = STDOUT_FILENO;
   } else if (const auto number = descriptorOf(path)) {
     fd_ = fcntl(*number, F_DUPFD_CLOEXEC, 0); // the same open file, its offset included
-  } else if (stat(path.c_str(), &existing) != 0) {
+  } else if (stat(path.c_str(), &file_) != 0) {
     makeFile(path);
-  } else if (S_ISREG(existing.st_mode)) {
-    replaceFile(path, existing);
+  } else if (S_ISREG(file_.st_mode)) {
+    replaceFile(path);
   } else {
     fd_ = open(path.c_str(), O_WRONLY | O_CLOEXEC);
   }
-  if (fd_ < 0) {
+  if (fd_ < 0 || (target_.empty() && fstat(fd_, &file_) != 0)) {
     fail();
+  }
+}
+
+// A terminal or a null device may be several things at once.
+bool OutputFile::isSame(const struct stat &other) const {
+  return file_.st_ino == other.st_ino && file_.st_dev == other.st_dev &&
+         (S_ISREG(file_.st_mode) || S_ISFIFO(file_.st_mode));
+}
+
+bool OutputFile::isSame(const OutputFile &other) const {
+  return isSame(other.file_) || (!target_.empty() && target_ == other.target_);
+}
+
+void OutputFile::requireOther(const InputFile &input) const {
+  if (isSame(input.facts())) {
+    throw failure("cannot read {}: it is also {}", input.name(), name_);
   }
 }
 
@@ -129,24 +144,28 @@ void OutputFile::makeFile(const std::string &path) {
   if (lstat(path.c_str(), &link) == 0) {
     throw failure("cannot write {}: it is a symbolic link that leads nowhere", name_);
   }
-  target_ = path;
+  std::error_code error;
+  target_ = fs::weakly_canonical(fs::absolute(path), error);
+  if (error) {
+    fail();
+  }
   openTemporary(0666);
 }
 
 // Whatever would keep the file from being replaced in the end is found now. A symbolic link stays
 // one when its file is replaced.
-void OutputFile::replaceFile(const std::string &path, const struct stat &existing) {
+void OutputFile::replaceFile(const std::string &path) {
   std::error_code error;
   target_ = fs::canonical(path, error);
   if (error || faccessat(AT_FDCWD, path.c_str(), W_OK, AT_EACCESS) != 0) {
     fail();
   }
-  if (isOthersInStickyDirectory(target_, existing)) {
+  if (isOthersInStickyDirectory(target_, file_)) {
     throw failure("cannot write {}: it is another user's, in a directory with the sticky bit",
                   name_);
   }
   openTemporary(0600);
-  copyAttributes(fd_, target_, existing);
+  copyAttributes(fd_, target_, file_);
 }
 
 // File systems without unnamed files, and systems without /proc, get a name at once.
@@ -177,7 +196,8 @@ void OutputFile::takeFreeName(const std::function<int(const char *)> &make) {
   }
   if (made < 0) {
     temporary_.clear();
-    throw failure("cannot write {}: no new file in its directory: {}", name_, std::strerror(errno));
+    throw failure("cannot write {}: cannot make a file in its directory: {}", name_,
+                  std::strerror(errno));
   }
   *std::find(namesToRemove.begin(), namesToRemove.end(), nullptr) = temporary_.c_str();
 }

@@ -1,6 +1,9 @@
 // Where a command writes: standard output, a file that appears when it is complete, or a device.
 #pragma once
 
+#include "io/input_file.h"
+#include <functional>
+
 #include <functional>
 #include <string>
 #include <string_view>
@@ -26,14 +29,19 @@ public:
   // waits for the disk. Throws Error.
   void commit(bool sync = false);
 
-  // The open file that the bytes go to at once; -1 for a file that is not seen before commit().
-  int directFd() const { return target_.empty() ? fd_ : -1; }
+  // Whether the bytes go to the file at once, and not with commit().
+  bool isDirect() const { return target_.empty(); }
+  // Whether both replace, or write to, the same file.
+  bool isSame(const OutputFile &other) const;
+  bool isSame(const struct stat &other) const;
+  // For one that is direct: what is read would grow without end. Throws Error.
+  void requireOther(const InputFile &input) const;
   const std::string &name() const { return name_; } // for messages
 
 private:
   OutputFile() = default;
   void makeFile(const std::string &path);
-  void replaceFile(const std::string &path, const struct stat &existing);
+  void replaceFile(const std::string &path);
   void openTemporary(mode_t mode);
   void takeFreeName(const std::function<int(const char *)> &make);
   void giveUpName();
@@ -44,6 +52,7 @@ private:
   std::string target_;    // the file that commit() makes or replaces; empty for others
   std::string temporary_; // the name until then, while there is one
   std::string kept_;
+  struct stat file_ = {}; // that was there before; none where the file is new
   int fd_ = -1;
 };
 

@@ -1,7 +1,8 @@
-// Signals that end the process: what they remove first, and how to hold them back.
+// Signals that end the process: what they remove and clear first, and how to hold them back.
 #pragma once
 
 #include <array>
+#include <atomic>
 #include <csignal>
 #include <unistd.h>
 
@@ -12,6 +13,15 @@ namespace nls2::tool {
 // this one's place.
 inline std::array<const char *volatile, 8> namesToRemove{};
 
+inline std::atomic<bool> progressIsShown = false; // a line on the terminal
+
+inline void clearProgress() {
+  constexpr char toLineStart[] = {'\r', '\x1B', '[', 'K'};
+  if (progressIsShown.exchange(false)) {
+    static_cast<void>(!write(STDERR_FILENO, toLineStart, sizeof toLineStart));
+  }
+}
+
 // Ends the process as this signal does when nobody handles it, without the files. Safe in a signal
 // handler.
 [[noreturn]] inline void endBySignal(int signal) {
@@ -20,6 +30,7 @@ inline std::array<const char *volatile, 8> namesToRemove{};
       unlink(name);
     }
   }
+  clearProgress();
   std::signal(signal, SIG_DFL);
   sigset_t set;
   sigemptyset(&set);

@@ -17,8 +17,6 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr const char *byCodePoint = "en_US_POSIX"; // ICU's name of the locale C
-
 // A locale's own name wins over a short name, which may be another locale's own name. A short name
 // means the first record with its id.
 const LocaleMapEntry *recordNamed(const std::string &name) {
@@ -60,7 +58,7 @@ std::string knownLocale(const std::string &name) {
   const std::string plain = withoutSuffixes(name);
   const std::string icu = icuName(name);
   if (plain == "C" || plain == "POSIX" || icu == byCodePoint) {
-    return byCodePoint;
+    return std::string(byCodePoint);
   }
   const LocaleMapEntry *entry = scriptAsked(name).empty() ? recordNamed(plain) : nullptr;
   entry = entry != nullptr ? entry : recordNamed(icu);
@@ -75,10 +73,13 @@ icu::Locale fullLocale(const std::string &name) {
   return locale;
 }
 
-// localeMap has one of the Norwegian languages, with the same order.
+// localeMap has one of the Norwegian languages, with the same order; others had codes before.
 std::string_view languageOf(const icu::Locale &locale) {
   const std::string_view language = locale.getLanguage();
-  return language == "nb" || language == "no" ? "nn" : language;
+  return language == "nb" || language == "no" ? "nn"
+         : language == "iw"                   ? "he"
+         : language == "in"                   ? "id"
+                                              : language;
 }
 
 // The locale of localeMap that suits best among those of a locale's language: of its script before
@@ -164,8 +165,9 @@ std::string orderLocale(const LocaleOptions &options) {
   const std::string known = knownLocale(name);
   std::string locale = known.empty() ? localeOfLanguage(name) : known;
   if (locale.empty()) {
-    throw usageError("{}: \"{}\" is not a known locale{}; give --locale", variable, printable(name),
-                     localesNear(name));
+    throw usageError(
+        "{}: \"{}\" is not a known locale{}; give --locale one of those that `nls2 locales` lists",
+        variable, printable(name), localesNear(name));
   }
   return locale;
 }

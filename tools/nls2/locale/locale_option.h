@@ -11,6 +11,8 @@
 
 namespace nls2::tool {
 
+inline constexpr std::string_view byCodePoint = "en_US_POSIX"; // ICU's name of the locale C
+
 struct LocaleOptions {
   std::optional<std::string> locale; // the name in ICU's spelling of a locale that is known
   int32_t codepage = utf8Page;
@@ -22,7 +24,7 @@ std::string localesNear(const std::string &name);
 // The two options, and after them a command's own.
 std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own);
 
-// The locale whose order of texts counts: of --locale, or of the environment (LC_ALL, LC_COLLATE,
+// The locale whose order of texts counts, byCodePoint for C and POSIX: of --locale, or of the environment (LC_ALL, LC_COLLATE,
 // LANG), which may also be another locale of a language that localeMap holds. Throws usageError
 // where localeMap does not hold the environment's language.
 std::string orderLocale(const LocaleOptions &options);

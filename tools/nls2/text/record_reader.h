@@ -112,6 +112,7 @@ public:
   // The next record, valid until the next call; nothing at the end. The last line need not have its
   // end, the last record must be whole. Throws Error.
   std::optional<Record> next();
+  const InputFile &input() const { return input_; }
 
   // What `use` makes of its text. Throws Error, which says where the record is, for a TextFault.
   template <typename Use>
