@@ -1,6 +1,7 @@
 // nls2: the library's work on files, from the command line.
 
 #include "errors.h"
+#include "icu_memory.h"
 #include "io/output_file.h"
 #include "near_names.h"
 #include "nls2.h"
@@ -16,7 +17,6 @@
 #include <memory>
 #include <new>
 #include <string_view>
-#include <unicode/uclean.h>
 #include <unistd.h>
 
 namespace nls2::tool {
@@ -133,31 +133,6 @@ int run(const CommandEntry *entry, int argc, char **argv) noexcept {
   return failureCode;
 }
 
-// Has to come before any other use of ICU.
-void watchMemory() {
-  static constexpr auto noted = [](void *block) {
-    if (block == nullptr) {
-      ranOutOfMemory = true;
-    }
-    return block;
-  };
-  UErrorCode status = U_ZERO_ERROR;
-  u_setMemoryFunctions(
-      nullptr, [](const void *, std::size_t size) { return noted(std::malloc(size)); },
-      [](const void *, void *block, std::size_t size) { return noted(std::realloc(block, size)); },
-      [](const void *, void *block) { std::free(block); }, &status);
-}
-
-// ICU's collation loader follows null pointers when it has run out of memory.
-void endAtBadPointer(int signal) {
-  if (ranOutOfMemory) {
-    constexpr std::string_view message = "nls2: out of memory\n";
-    static_cast<void>(!write(STDERR_FILENO, message.data(), message.size()));
-    _exit(failureCode);
-  }
-  std::signal(signal, SIG_DFL); // the access comes again
-}
-
 // Without memory for an exception the process would be aborted.
 void endWithoutMemory() {
   if (!std::current_exception()) {
@@ -176,7 +151,6 @@ int main(int argc, char **argv) {
   std::signal(SIGXFSZ, SIG_IGN); // a full file is a write error, reported like any other
   std::set_terminate(nls2::tool::endWithoutMemory);
   nls2::tool::watchMemory();
-  std::signal(SIGSEGV, nls2::tool::endAtBadPointer);
   const auto *entry = argc > 1 ? nls2::tool::commandNamed(argv[1]) : nullptr;
   nls2::tool::failureCode = entry != nullptr ? entry->failureCode : nls2::tool::exitFailed;
   return nls2::tool::run(entry, argc, argv);

@@ -1,0 +1,68 @@
+// ICU's memory. Without memory ICU 72 follows null pointers in its collation loader and waits for
+// itself in the default locale, so it gets some from a reserve, which is enough until the next
+// requireMemory() ends the command.
+#pragma once
+
+#include "errors.h"
+
+#include <algorithm>
+#include <array>
+#include <atomic>
+#include <cstddef>
+#include <cstdlib>
+#include <cstring>
+#include <malloc.h>
+#include <unicode/uclean.h>
+
+namespace nls2::tool {
+
+namespace icu_memory {
+
+alignas(std::max_align_t) inline std::array<char, std::size_t{4} << 20> reserve;
+inline std::atomic<std::size_t> used = 0;
+
+inline bool isReserved(const void *block) {
+  return block >= reserve.data() && block < reserve.data() + reserve.size();
+}
+
+inline void *allocate(std::size_t size) {
+  if (void *block = std::malloc(size)) {
+    return block;
+  }
+  ranOutOfMemory = true;
+  const std::size_t rounded = (size / alignof(std::max_align_t) + 1) * alignof(std::max_align_t);
+  const std::size_t at = used.fetch_add(rounded);
+  return at < reserve.size() && rounded <= reserve.size() - at ? reserve.data() + at : nullptr;
+}
+
+inline void release(void *block) {
+  if (!isReserved(block)) {
+    std::free(block);
+  }
+}
+
+inline void *resize(void *block, std::size_t size) {
+  void *resized = isReserved(block) ? nullptr : std::realloc(block, size);
+  if (resized == nullptr && (resized = allocate(size)) != nullptr && block != nullptr) {
+    const char *bytes = static_cast<char *>(block);
+    const std::size_t most = isReserved(block)
+                                 ? static_cast<std::size_t>(reserve.data() + reserve.size() - bytes)
+                                 : malloc_usable_size(block);
+    std::memcpy(resized, block, std::min(size, most));
+    release(block);
+  }
+  return resized;
+}
+
+} // namespace icu_memory
+
+// Has to come before any other use of ICU.
+inline void watchMemory() {
+  UErrorCode status = U_ZERO_ERROR;
+  u_setMemoryFunctions(
+      nullptr, [](const void *, std::size_t size) { return icu_memory::allocate(size); },
+      [](const void *, void *block, std::size_t size) { return icu_memory::resize(block, size); },
+      [](const void *, void *block) { icu_memory::release(block); }, &status);
+}
+
+} // namespace nls2::tool
