@@ -22,31 +22,18 @@ NLS2_Locale *make() {
   return NLS2_GetLocale(0x03480001, 819, 0, &status);
 }
 
-// Threads that repeat their step until the object goes out of scope.
-class Threads {
-public:
-  Threads(int count, const std::function<void()> &step) {
-    for (int i = 0; i < count; ++i) {
-      threads_.emplace_back([this, step] {
-        while (!stop_) {
-          step();
-        }
-      });
-    }
+// Threads that repeat their step until they go out of scope.
+std::vector<std::jthread> repeat(int count, const std::function<void()> &step) {
+  std::vector<std::jthread> threads;
+  for (int i = 0; i < count; ++i) {
+    threads.emplace_back([step](const std::stop_token &stop) {
+      while (!stop.stop_requested()) {
+        step();
+      }
+    });
   }
-  ~Threads() {
-    stop_ = true;
-    for (std::thread &thread : threads_) {
-      thread.join();
-    }
-  }
-  Threads(const Threads &) = delete;
-  Threads &operator=(const Threads &) = delete;
-
-private:
-  std::atomic<bool> stop_{false};
-  std::vector<std::thread> threads_;
-};
+  return threads;
+}
 
 // Makes some objects, uses them, and gives them back in another order; counts faults. What it asks
 // about a released pointer may be answered either way, since its memory may be another object.
@@ -70,8 +57,8 @@ TEST(Registry, OwnersAndValidatorsDoNotDisturbEachOther) {
     std::atomic<long> faults{0};
     NLS2_Locale *const first = make();
     {
-      const Threads releasing(owners, [&] { liveAndDie(faults); });
-      const Threads validating(4, [&] {
+      const auto releasing = repeat(owners, [&] { liveAndDie(faults); });
+      const auto validating = repeat(4, [&] {
         faults += NLS2_ValidateLocale(first) != 0;
         NLS2_ValidateLocale(nullptr); // walks the whole list
       });
@@ -96,7 +83,7 @@ TEST(Registry, AChildForkedAmidValidationsWorks) {
   for (NLS2_Locale *&object : list) {
     object = make();
   }
-  const Threads validating(3, [&] { NLS2_ValidateLocale(list.back()); });
+  const auto validating = repeat(3, [&] { NLS2_ValidateLocale(list.back()); });
   for (int round = 0; round < 8; ++round) {
     const pid_t child = fork();
     if (child == 0) {
