@@ -68,6 +68,8 @@ TEST(Trace, FollowsTheEnvironment) {
        "50 50 7\n" + head + "Example:31 two lines, -5\n" + head +
            "Example:32 exit -3 \\(0xFFFFFFFD\\)\n" + head + "Example:33 exit\n" + head +
            "Example:34 dump of 3 bytes at 0x[0-9a-f]+: 00 7F FF\n"},
+      {"a cancelled thread ends its line, and others go on", "ZELHOST_TRACE=detail", "cancelled",
+       "10 10 7\n" + head + "Example:50 held back\n" + head + "Example:52 next\n"},
   };
   for (const auto &row : rows) {
     EXPECT_THAT(run(row.environment, row.action), MatchesRegex(row.output)) << row.reason;

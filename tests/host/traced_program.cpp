@@ -8,6 +8,7 @@
 #include <latch>
 #include <string>
 #include <thread>
+#include <unistd.h>
 #include <vector>
 
 namespace {
@@ -45,6 +46,19 @@ int callFromThreads() {
   return 0;
 }
 
+// A thread that is cancelled while it writes a line leaves the stream to the others.
+int callCancelled() {
+  alarm(30); // a stream that stays locked would make the next line wait for ever
+  std::jthread([] {
+    pthread_cancel(pthread_self());
+    TRC1_Printf(&anchor, 50, "held back\n");
+    pthread_testcancel();
+    TRC1_Printf(&anchor, 51, "not cancelled\n");
+  }).join();
+  TRC1_Printf(&anchor, 52, "next\n");
+  return 0;
+}
+
 } // namespace
 
 int main(int, char **argv) {
@@ -52,5 +66,8 @@ int main(int, char **argv) {
   std::printf("%X %X %u\n", flags, anchor.cachedFlags, anchor.cachedSync);
   std::fflush(stdout);
   const std::string action = argv[1];
-  return action == "library" ? callLibrary() : action == "host" ? callHost() : callFromThreads();
+  return action == "library"   ? callLibrary()
+         : action == "host"    ? callHost()
+         : action == "threads" ? callFromThreads()
+                               : callCancelled();
 }
