@@ -6,9 +6,8 @@
 //   calls NAME = value     a function of the library called inside, folded to this line
 //   icu NAME               a call of ICU's; host lock; host unlock
 //   = value, ANSWER        the exit event and the answer; the value alone where they are one
-//   ... LINE               whatever comes before this line
-//   or SETTING: REST       in the trace: the same call under that setting goes on like this
-//   instead,
+//   ... | A DETAIL LINE    whatever comes before that line; at most one in a trace
+//   or SETTING: REST       from here the same call under that setting goes on like this instead,
 //                          its lines joined by blanks
 //
 // Settings: "default" and "codepages" (what ICU says of the process), "made" (locale objects made
