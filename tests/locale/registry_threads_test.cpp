@@ -32,18 +32,25 @@ NLS2_Locale *makeAndValidate() {
   return object;
 }
 
-// Threads that repeat their step until they go out of scope.
-std::vector<std::jthread> repeat(int count, const std::function<void()> &step) {
-  std::vector<std::jthread> threads;
-  for (int i = 0; i < count; ++i) {
-    threads.emplace_back([step](const std::stop_token &stop) {
-      while (!stop.stop_requested()) {
-        step();
-      }
-    });
+// Threads that repeat their step until the object goes out of scope.
+class Threads {
+public:
+  Threads(int count, const std::function<void()> &step) {
+    for (int i = 0; i < count; ++i) {
+      threads_.emplace_back([step](const std::stop_token &stop) {
+        while (!stop.stop_requested()) {
+          step();
+        }
+      });
+    }
   }
-  return threads;
-}
+  ~Threads() { // the first is waited for when all of them stop
+    std::ranges::for_each(threads_, &std::jthread::request_stop);
+  }
+
+private:
+  std::vector<std::jthread> threads_;
+};
 
 // Makes some objects, uses them, and gives them back in another order; counts faults. What it asks
 // about a released pointer may be answered either way, since its memory may be another object.
@@ -65,8 +72,8 @@ TEST(Registry, OwnersAndValidatorsDoNotDisturbEachOther) {
     std::atomic<long> faults{0};
     NLS2_Locale *const first = make();
     {
-      const auto releasing = repeat(owners, [&] { liveAndDie(faults); });
-      const auto validating = repeat(4, [&] {
+      const Threads releasing(owners, [&] { liveAndDie(faults); });
+      const Threads validating(4, [&] {
         faults += NLS2_ValidateLocale(first) != 0;
         NLS2_ValidateLocale(nullptr); // walks the whole list
       });
@@ -89,7 +96,7 @@ bool worksInChild() {
 TEST(Registry, AChildForkedAmidValidationsWorks) {
   std::vector<NLS2_Locale *> list(200); // walks long enough that a fork finds some under way
   std::ranges::generate(list, make);
-  const auto validating = repeat(3, [&] { NLS2_ValidateLocale(list.back()); });
+  const Threads validating(3, [&] { NLS2_ValidateLocale(list.back()); });
   for (int round = 0; round < 8; ++round) {
     const pid_t child = fork();
     if (child == 0) {
