@@ -173,7 +173,7 @@ std::string run(const Functions &functions, const Settings &settings, TraceFlags
       lines = folded(function, recording.lines());
     }
     world = {};
-    if (flags == traceAll) {
+    if (flags == traceAll && !lines.empty()) {
       const bool isValue = "= " + answer.substr(0, answer.find(',')) == lines.back();
       answer = isValue ? "= " + answer : lines.back() + ", " + answer;
       lines.pop_back();
