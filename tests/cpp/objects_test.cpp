@@ -53,9 +53,7 @@ TEST(Languages, HaveNumbersAndNames) {
   EXPECT_FALSE(is_known_locale("en_US" + std::string(127, '.')));
 }
 
-class Locales : public WithDefaultLocale {};
-
-TEST_F(Locales, AreMadeChangedAndGivenBack) {
+TEST(Locales, AreMadeChangedAndGivenBack) {
   EXPECT_EQ(default_locale().name(), "en_US");
   const language_id polish = language_id::from_name("pl_PL");
   locale where = make_locale(polish, code_page(912)); // in both columns of hr_HR
@@ -72,7 +70,7 @@ TEST_F(Locales, AreMadeChangedAndGivenBack) {
   EXPECT_EQ(pLocaleObjectList, nullptr) << "objects left behind";
 }
 
-TEST_F(Locales, ThatAreNotLiveAreRefused) {
+TEST(Locales, ThatAreNotLiveAreRefused) {
   locale none;
   EXPECT_TRUE(!none.is_live() && none.name().empty());
   EXPECT_THROW(none.page(), error);
@@ -85,7 +83,7 @@ TEST_F(Locales, ThatAreNotLiveAreRefused) {
   support::world = {};
 }
 
-TEST_F(Locales, HaveBundlesWithStrings) {
+TEST(Locales, HaveBundlesWithStrings) {
   const locale german = make_locale(language_id::from_name("de_AT"), utf8_page);
   const bundle messages = open_bundle(MESSAGES_DIR, german);
   EXPECT_EQ(messages.string("greeting"), u"Servus");

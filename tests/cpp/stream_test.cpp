@@ -10,7 +10,7 @@ namespace {
 using namespace std::string_literals;
 using namespace nls2;
 
-class Streams : public WithDefaultLocale {
+class Streams : public testing::Test {
 protected:
   ~Streams() override { unlink(path.c_str()); }
   stream open(std::string_view mode, std::string_view encoding = "UTF-8") {

@@ -24,9 +24,7 @@ void expectSpans(const Output &expected, Convert convert) {
   }
 }
 
-class Text : public WithDefaultLocale {};
-
-TEST_F(Text, ConvertsByteForByteInEveryForm) {
+TEST(Text, ConvertsByteForByteInEveryForm) {
   const code_page utf8(1208);
   for (const int number : {37, 930, 1141, 1200, 1204, 1208, 57361, 57363, 57369}) {
     const locale where = in(number);
@@ -55,7 +53,7 @@ TEST_F(Text, ConvertsByteForByteInEveryForm) {
   }
 }
 
-TEST_F(Text, ThatIsTooLongOrHasNoPageIsRefused) {
+TEST(Text, ThatIsTooLongOrHasNoPageIsRefused) {
   const std::string_view bytes("x", 0x80000000U);
   const std::u16string_view units(u"x", 0x80000000U);
   const locale where = in(37);
@@ -69,7 +67,7 @@ TEST_F(Text, ThatIsTooLongOrHasNoPageIsRefused) {
   EXPECT_THROW(translate(code_page(0), code_page(37), "x"), error);
 }
 
-TEST_F(Text, IsComparedByTheRulesOfTheLanguage) {
+TEST(Text, IsComparedByTheRulesOfTheLanguage) {
   using enum trailing_blanks;
   const locale german = in(1208);
   EXPECT_TRUE(compare(german, "\u00E4", "z") < 0 && compare(in(1208, "sv_SE"), "\u00E4", "z") > 0);
@@ -83,7 +81,7 @@ TEST_F(Text, IsComparedByTheRulesOfTheLanguage) {
   EXPECT_EQ(STATUS_OF(compare(in(4711), "b", "a", ignore, error)), 4);
 }
 
-TEST_F(Text, WithANullIsRefusedWhereTheSearchWouldEnd) {
+TEST(Text, WithANullIsRefusedWhereTheSearchWouldEnd) {
   const auto expectStatus = [](int expected, int page, const std::string &text) {
     const locale where = in(page);
     const auto ignore = trailing_blanks::ignore;
@@ -97,7 +95,7 @@ TEST_F(Text, WithANullIsRefusedWhereTheSearchWouldEnd) {
   expectStatus(37, 57366, "a+AAA-b"); // UTF-7: a null without a zero byte
 }
 
-TEST_F(Text, IsFound) {
+TEST(Text, IsFound) {
   using enum letter_case;
   const locale german = in(1208);
   EXPECT_TRUE(contains(german, "Stra\u00DFe", "\u00DF") && contains(german, "", ""));

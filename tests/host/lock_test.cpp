@@ -26,12 +26,9 @@ struct GuardedLock {
 };
 
 void inThreads(int count, const std::function<void()> &work) {
-  std::vector<std::thread> threads;
+  std::vector<std::jthread> threads; // joined at their end
   for (int i = 0; i < count; ++i) {
     threads.emplace_back(work);
-  }
-  for (std::thread &thread : threads) {
-    thread.join();
   }
 }
 
@@ -64,7 +61,7 @@ TEST(Lock, PutsWaitersToSleepAndWakesThemAll) {
   std::atomic<int> entered{0};
   std::atomic<double> mostCpuTime{0};
   SYS1_GetLock(guarded.lock);
-  std::thread holder([&] {
+  const std::jthread holder([&] {
     while (waiting < 4) {
       std::this_thread::yield();
     }
@@ -80,7 +77,6 @@ TEST(Lock, PutsWaitersToSleepAndWakesThemAll) {
     ++entered;
     SYS1_ReleaseLock(guarded.lock);
   });
-  holder.join();
   EXPECT_EQ(entered, 4);
   EXPECT_LT(mostCpuTime.load(), 0.03) << "a waiter spins";
 }

@@ -40,6 +40,8 @@ const std::string head =
 const std::string name = head + "NLS2_MapWindowsNameToCCSID:[0-9]+ ";
 const std::string entry = name + "entry\n";
 const std::string leave = name + "exit 936 \\(0x000003A8\\)\n";
+const std::string off = "0 0 7\n"; // the flags, and those that are stored with the sync word
+const std::string events = "40 40 7\n";
 const std::string locate = name + "Locate matching windows codepage name to windows-936\\.\n";
 const std::string found = name + "Found matching name windows-936 in the table\\.\n";
 
@@ -48,26 +50,26 @@ TEST(Trace, FollowsTheEnvironment) {
     const char *reason;
     std::string environment, action, output;
   } rows[] = {
-      {"off by default", "", "library", ""},
-      {"empty is off", "ZELHOST_TRACE=", "library", ""},
-      {"events alone", "ZELHOST_TRACE=events", "library", entry + leave},
-      {"details alone", "ZELHOST_TRACE=detail", "library", locate + found},
-      {"all", "ZELHOST_TRACE=all", "library", entry + locate + found + leave},
+      {"off by default", "", "library", off},
+      {"empty is off", "ZELHOST_TRACE=", "library", off},
+      {"events alone", "ZELHOST_TRACE=events", "library", events + entry + leave},
+      {"details alone", "ZELHOST_TRACE=detail", "library", "10 10 7\n" + locate + found},
+      {"all", "ZELHOST_TRACE=all", "library", "50 50 7\n" + entry + locate + found + leave},
       {"a wrong request is reported and off", "ZELHOST_TRACE=everything", "library",
-       "zelhost: ZELHOST_TRACE is \"everything\"; it may be events, detail or all\n"},
-      {"a file alone asks for nothing", "ZELHOST_TRACE_FILE=/dev/full", "library", ""},
+       "zelhost: ZELHOST_TRACE is \"everything\"; it may be events, detail or all\n" + off},
+      {"a file alone asks for nothing", "ZELHOST_TRACE_FILE=/dev/full", "library", off},
       {"an empty file name is standard error",
-       "ZELHOST_TRACE=events ZELHOST_TRACE_FILE=", "library", entry + leave},
+       "ZELHOST_TRACE=events ZELHOST_TRACE_FILE=", "library", events + entry + leave},
       {"a file that does not open is reported, and standard error takes its place",
        "ZELHOST_TRACE=events ZELHOST_TRACE_FILE=/nonexistent/t", "library",
        "zelhost: cannot open ZELHOST_TRACE_FILE \"/nonexistent/t\": No such file or directory\n" +
-           entry + leave},
+           events + entry + leave},
       {"one line each: text, signed value, exit without one, dump", "ZELHOST_TRACE=all", "host",
-       head + "Example:31 two lines, -5\n" + head + "Example:32 exit -3 \\(0xFFFFFFFD\\)\n" + head +
-           "Example:33 exit\n" + head + "Example:34 dump of 3 bytes at 0x[0-9a-f]+: 00 7F FF\n"},
-      {"flags when off, stored with the sync word", "", "flags", "0 0 7\n"},
-      {"flags of events", "ZELHOST_TRACE=events", "flags", "40 40 7\n"},
-      {"flags of details", "ZELHOST_TRACE=detail", "flags", "10 10 7\n"},
+       "50 50 7\n" + head + "Example:31 two lines, -5\n" + head +
+           "Example:32 exit -3 \\(0xFFFFFFFD\\)\n" + head + "Example:33 exit\n" + head +
+           "Example:34 dump of 3 bytes at 0x[0-9a-f]+: 00 7F FF\n"},
+      {"a cancelled thread ends its line, and others go on", "ZELHOST_TRACE=detail", "cancelled",
+       "10 10 7\n" + head + "Example:50 held back\n" + head + "Example:52 next\n"},
   };
   for (const auto &row : rows) {
     EXPECT_THAT(run(row.environment, row.action), MatchesRegex(row.output)) << row.reason;
@@ -76,7 +78,7 @@ TEST(Trace, FollowsTheEnvironment) {
 
 TEST(Trace, AppendsToItsFile) {
   std::ofstream(path) << "before\n";
-  EXPECT_EQ(run("ZELHOST_TRACE=events ZELHOST_TRACE_FILE='" + path + "'", "library"), "");
+  EXPECT_EQ(run("ZELHOST_TRACE=events ZELHOST_TRACE_FILE='" + path + "'", "library"), events);
   EXPECT_THAT(contentOfFile(), MatchesRegex("before\n" + entry + leave));
 }
 

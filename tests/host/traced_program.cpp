@@ -1,12 +1,15 @@
-// A program that does what its argument says, for the trace that its environment asks for.
+// A program that prints its trace flags, and does what its argument says: for the trace that its
+// environment asks for.
 
 #include "nls2.h"
 #include "trc1.h"
 
 #include <cstdio>
-#include <cstring>
 #include <latch>
+#include <string>
 #include <thread>
+#include <unistd.h>
+#include <vector>
 
 namespace {
 
@@ -29,46 +32,42 @@ int callHost() {
 }
 
 int callFromThreads() {
-  std::thread threads[8];
   std::latch allAreReady(8);
-  for (std::thread &thread : threads) {
-    const char letter = static_cast<char>('a' + (&thread - threads));
-    thread = std::thread([letter, &allAreReady] {
-      char text[3001] = {};
-      std::memset(text, letter, sizeof text - 1);
+  std::vector<std::jthread> threads;
+  for (const char letter : std::string("abcdefgh")) {
+    threads.emplace_back([letter, &allAreReady] {
+      const std::string text(3000, letter);
       allAreReady.arrive_and_wait();
       for (int i = 0; i < 200; ++i) {
-        TRC1_Printf(&anchor, 40, "%s\n", text);
+        TRC1_Printf(&anchor, 40, "%s\n", text.c_str());
       }
     });
-  }
-  for (std::thread &thread : threads) {
-    thread.join();
   }
   return 0;
 }
 
-// What the library's functions see of the settings.
-int printFlags() {
-  const uint32_t flags = TRC1_Sync(&anchor);
-  std::printf("%X %X %u\n", flags, anchor.cachedFlags, anchor.cachedSync);
+// A thread that is cancelled while it writes a line leaves the stream to the others.
+int callCancelled() {
+  alarm(30); // a stream that stays locked would make the next line wait for ever
+  std::jthread([] {
+    pthread_cancel(pthread_self());
+    TRC1_Printf(&anchor, 50, "held back\n");
+    pthread_testcancel();
+    TRC1_Printf(&anchor, 51, "not cancelled\n");
+  }).join();
+  TRC1_Printf(&anchor, 52, "next\n");
   return 0;
 }
 
 } // namespace
 
-int main(int argc, char **argv) {
-  const struct {
-    const char *name;
-    int (*run)();
-  } actions[] = {{"library", callLibrary},
-                 {"host", callHost},
-                 {"threads", callFromThreads},
-                 {"flags", printFlags}};
-  for (const auto &action : actions) {
-    if (argc == 2 && std::strcmp(argv[1], action.name) == 0) {
-      return action.run();
-    }
-  }
-  return 2;
+int main(int, char **argv) {
+  const uint32_t flags = TRC1_Sync(&anchor);
+  std::printf("%X %X %u\n", flags, anchor.cachedFlags, anchor.cachedSync);
+  std::fflush(stdout);
+  const std::string action = argv[1];
+  return action == "library"   ? callLibrary()
+         : action == "host"    ? callHost()
+         : action == "threads" ? callFromThreads()
+                               : callCancelled();
 }

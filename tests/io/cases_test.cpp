@@ -11,35 +11,25 @@ namespace support {
 
 // A new stream. One called "!" is for the library to close; null is none.
 template <>
-struct Slot<UFILE *> {
+struct Slot<UFILE *> : Given<UFILE *> {
   explicit Slot(Cursor &at)
-      : word(at.words[at.next++]),
-        value(word == "null" ? nullptr : u_fopen("/dev/null", "w", nullptr, "UTF-8")) {
+      : Given{at.words[at.next] == "null" ? nullptr : u_fopen("/dev/null", "w", nullptr, "UTF-8")},
+        owned(at.words[at.next++] == "file" ? value : nullptr) {
     at.words.name(value, "file");
   }
-  UFILE *get() const { return value; }
-  std::string answer() const {
-    word == "file" ? u_fclose(value) : void();
-    return "";
-  }
-  std::string word;
-  UFILE *value;
+  icu::LocalUFILEPointer owned;
 };
 
 // The example bundle of a language; with "!", for the library to close.
 template <>
-struct Slot<UResourceBundle *> {
-  explicit Slot(Cursor &at) : word(at.words[at.next++]) {
+struct Slot<UResourceBundle *> : Given<UResourceBundle *> {
+  explicit Slot(Cursor &at) : Given{nullptr} {
+    const std::string &word = at.words[at.next++];
     UErrorCode error = U_ZERO_ERROR;
     value = ures_open(MESSAGES_DIR, word.c_str() + (word[0] == '!' ? 1 : 0), &error);
+    owned.adoptInstead(word[0] == '!' ? nullptr : value);
   }
-  UResourceBundle *get() const { return value; }
-  std::string answer() const {
-    word[0] != '!' ? ures_close(value) : void();
-    return "";
-  }
-  std::string word;
-  UResourceBundle *value;
+  icu::LocalUResourceBundlePointer owned;
 };
 
 } // namespace support
@@ -50,10 +40,9 @@ using support::shown;
 using support::Words;
 
 std::string openStream(const Words &w) {
-  UFILE *file = NLS2_OpenStream(w.object(0), w.text(1), w.text(2), w.text(3));
-  w.name(file, "file");
-  file == nullptr ? void() : u_fclose(file);
-  return shown(file);
+  const icu::LocalUFILEPointer file(NLS2_OpenStream(w.object(0), w.text(1), w.text(2), w.text(3)));
+  w.name(file.getAlias(), "file");
+  return shown(file.getAlias());
 }
 
 std::string detect(const Words &w) {
@@ -79,13 +68,10 @@ std::string stringByKey(const Words &w) {
   int32_t status = 99;
   const UChar *string = NLS2_GetStringByKey(bundle.get(), w.text(1), &length, &status);
   w.name(string, "string");
-  std::string text = "none";
-  if (string != nullptr) {
-    EXPECT_EQ(string[length], 0);
-    text.clear();
-    icu::UnicodeString(string, length).toUTF8String(text);
-  }
-  return shown(string) + ", " + shown(status) + ", " + text + bundle.answer();
+  std::string text;
+  icu::UnicodeString(string, string == nullptr ? 0 : length).toUTF8String(text);
+  EXPECT_TRUE(string == nullptr || string[length] == 0);
+  return shown(string) + ", " + shown(status) + ", " + (string == nullptr ? "none" : text);
 }
 
 TEST(Io, Cases) {

@@ -1,10 +1,11 @@
-// The registry of locale objects under many threads, and across fork.
+// The registry of locale objects: under many threads, across fork, and what a thread remembers.
 //
 // ZELNLS2_TEST_SECONDS sets how long the threads run, 1 by default. The faults that these tests are
 // for show as a crash or, under the sanitizers, as a report.
 
 #include "nls2.h"
 
+#include <algorithm>
 #include <atomic>
 #include <chrono>
 #include <cstdlib>
@@ -13,6 +14,7 @@
 #include <sys/wait.h>
 #include <thread>
 #include <unistd.h>
+#include <utility>
 #include <vector>
 
 namespace {
@@ -22,39 +24,39 @@ NLS2_Locale *make() {
   return NLS2_GetLocale(0x03480001, 819, 0, &status);
 }
 
+// One that this thread remembers.
+NLS2_Locale *makeAndValidate() {
+  NLS2_Locale *object = make();
+  EXPECT_EQ(NLS2_ValidateLocale(object), 0);
+  EXPECT_EQ(NLS2_ValidateLocale(nullptr), NLS2_ERR_INVALID_LOCALE);
+  return object;
+}
+
 // Threads that repeat their step until the object goes out of scope.
 class Threads {
 public:
   Threads(int count, const std::function<void()> &step) {
     for (int i = 0; i < count; ++i) {
-      threads_.emplace_back([this, step] {
-        while (!stop_) {
+      threads_.emplace_back([step](const std::stop_token &stop) {
+        while (!stop.stop_requested()) {
           step();
         }
       });
     }
   }
-  ~Threads() {
-    stop_ = true;
-    for (std::thread &thread : threads_) {
-      thread.join();
-    }
+  ~Threads() { // the first is waited for when all of them stop
+    std::ranges::for_each(threads_, &std::jthread::request_stop);
   }
-  Threads(const Threads &) = delete;
-  Threads &operator=(const Threads &) = delete;
 
 private:
-  std::atomic<bool> stop_{false};
-  std::vector<std::thread> threads_;
+  std::vector<std::jthread> threads_;
 };
 
 // Makes some objects, uses them, and gives them back in another order; counts faults. What it asks
 // about a released pointer may be answered either way, since its memory may be another object.
 void liveAndDie(std::atomic<long> &faults) {
   NLS2_Locale *objects[5];
-  for (NLS2_Locale *&object : objects) {
-    object = make();
-  }
+  std::ranges::generate(objects, make);
   for (const int i : {2, 0, 4, 1, 3}) {
     int32_t status = 0;
     faults += NLS2_ValidateLocale(objects[i]) != 0;
@@ -93,9 +95,7 @@ bool worksInChild() {
 
 TEST(Registry, AChildForkedAmidValidationsWorks) {
   std::vector<NLS2_Locale *> list(200); // walks long enough that a fork finds some under way
-  for (NLS2_Locale *&object : list) {
-    object = make();
-  }
+  std::ranges::generate(list, make);
   const Threads validating(3, [&] { NLS2_ValidateLocale(list.back()); });
   for (int round = 0; round < 8; ++round) {
     const pid_t child = fork();
@@ -109,6 +109,39 @@ TEST(Registry, AChildForkedAmidValidationsWorks) {
   for (NLS2_Locale *object : list) {
     ASSERT_EQ(NLS2_ReleaseLocale(object), 0);
   }
+}
+
+// In the first two the head of the list stays the same, so that it does not give a removal away.
+TEST(Remembered, IsForgottenWhenAnotherThreadReleasesIt) {
+  NLS2_Locale *const head = make();
+  NLS2_Locale *object = makeAndValidate();
+  std::jthread([object] { EXPECT_EQ(NLS2_ReleaseLocale(object), 0); }).join();
+  EXPECT_EQ(NLS2_ValidateLocale(object), NLS2_ERR_INVALID_LOCALE);
+  EXPECT_EQ(NLS2_ReleaseLocale(head), 0);
+}
+
+// More objects than a thread remembers, each valid until its own release and not after.
+TEST(Remembered, IsEachOfManyUntilItsOwnRelease) {
+  NLS2_Locale *const head = make();
+  std::vector<NLS2_Locale *> objects(9);
+  std::ranges::generate(objects, makeAndValidate);
+  for (std::size_t released = 0; released < objects.size(); ++released) {
+    EXPECT_EQ(NLS2_ReleaseLocale(objects[released]), 0);
+    for (std::size_t i = 0; i < objects.size(); ++i) {
+      EXPECT_EQ(NLS2_ValidateLocale(objects[i]), i <= released ? NLS2_ERR_INVALID_LOCALE : 0)
+          << i << " after the release of " << released;
+    }
+  }
+  EXPECT_EQ(NLS2_ReleaseLocale(head), 0);
+}
+
+TEST(Remembered, IsForgottenWhileTheListIsSetAside) {
+  NLS2_Locale *object = makeAndValidate();
+  NLS2_Locale *list = std::exchange(pLocaleObjectList, nullptr);
+  EXPECT_EQ(NLS2_ValidateLocale(object), NLS2_ERR_INVALID_LOCALE);
+  pLocaleObjectList = list;
+  EXPECT_EQ(NLS2_ValidateLocale(object), 0);
+  EXPECT_EQ(NLS2_ReleaseLocale(object), 0);
 }
 
 } // namespace

@@ -6,9 +6,8 @@
 //   calls NAME = value     a function of the library called inside, folded to this line
 //   icu NAME               a call of ICU's; host lock; host unlock
 //   = value, ANSWER        the exit event and the answer; the value alone where they are one
-//   ... LINE               whatever comes before this line
-//   or SETTING: REST       in the trace: the same call under that setting goes on like this
-//   instead,
+//   ... | A DETAIL LINE    whatever comes before that line; at most one in a trace
+//   or SETTING: REST       from here the same call under that setting goes on like this instead,
 //                          its lines joined by blanks
 //
 // Settings: "default" and "codepages" (what ICU says of the process), "made" (locale objects made
@@ -56,7 +55,7 @@ std::unique_ptr<Unit[]> exact(const std::basic_string<Unit> &text) {
   return block;
 }
 
-using Names = std::vector<std::pair<const void *, std::string>>;
+using Names = std::map<const void *, std::string>;
 
 // The words behind a call's name, from 0.
 class Words {
@@ -75,9 +74,11 @@ public:
   // A, B, C: in the order of the list; null; never, an object that was never live; copy, one of A;
   // or as the word L819 says.
   NLS2_Locale *object(std::size_t i) const;
-  // Gives a pointer its name in the trace.
+  // Gives a pointer its name in the trace, unless it has one.
   void name(const void *pointer, const std::string &name) const {
-    names_.emplace_back(pointer, name);
+    if (pointer != nullptr) {
+      names_.emplace(pointer, name);
+    }
   }
   Names &names() const { return names_; }
 
@@ -92,8 +93,8 @@ private:
 inline std::string shown(const void *pointer) {
   return std::to_string(static_cast<int32_t>(reinterpret_cast<uintptr_t>(pointer)));
 }
-template <class Number, std::enable_if_t<std::is_arithmetic_v<Number>, int> = 0>
-std::string shown(Number number) {
+template <class Number>
+requires std::is_arithmetic_v<Number> std::string shown(Number number) {
   return std::to_string(static_cast<int64_t>(number));
 }
 // Bytes as case files have them: what is not printable ASCII, and the blank, as \xHH or \0.

@@ -13,10 +13,6 @@ namespace support {
 
 namespace {
 
-[[noreturn]] void fail(const std::string &place, const std::string &what) {
-  throw std::runtime_error(place + ": " + what);
-}
-
 template <class Unit>
 void appendUnit(std::string &bytes, std::istream &text) {
   std::string digits(sizeof(Unit) * 2, ' ');
@@ -82,16 +78,6 @@ std::string unescaped(const std::string &escaped) {
   return bytes;
 }
 
-std::string lineOf(const std::string &text, std::size_t number) {
-  std::istringstream lines(text);
-  std::string line;
-  for (; number > 0; --number) {
-    line = "(end)";
-    std::getline(lines, line);
-  }
-  return line;
-}
-
 } // namespace
 
 std::runtime_error CaseLine::error(const std::string &what) const {
@@ -118,12 +104,12 @@ long long CaseLine::number() const {
   throw error("not a number");
 }
 
-std::pair<std::string, CaseLine> CaseLine::firstWord() const {
-  const std::size_t blank = value.find(' ');
-  if (blank == 0 || blank == std::string::npos || blank + 1 == value.size()) {
-    throw error("two values expected");
+std::pair<std::string, CaseLine> CaseLine::split(const std::string &separator) const {
+  const std::size_t at = value.find(separator);
+  if (at == 0 || at == std::string::npos || at + separator.size() == value.size()) {
+    throw error("two values expected, with \"" + separator + "\" between them");
   }
-  return {value.substr(0, blank), {key, value.substr(blank + 1), place}};
+  return {value.substr(0, at), {key, value.substr(at + separator.size()), place}};
 }
 
 std::vector<Case> readCases(const std::string &path, const std::vector<std::string> &keys) {
@@ -132,29 +118,29 @@ std::vector<Case> readCases(const std::string &path, const std::vector<std::stri
   bool inside = false;
   int number = 0;
   for (std::string line; std::getline(file, line);) {
-    const std::string place = path + ":" + std::to_string(++number);
     const std::size_t blank = line.find(' ');
-    const std::string key = line.substr(0, blank);
-    const std::string value = blank == std::string::npos ? "" : line.substr(blank + 1);
+    const CaseLine read{line.substr(0, blank),
+                        blank == std::string::npos ? "" : line.substr(blank + 1),
+                        path + ":" + std::to_string(++number)};
     if (line.empty()) {
       inside = false;
-    } else if (value.empty() && key[0] != '#') {
-      fail(place, "no value: " + line);
-    } else if (key == "==") {
+    } else if (line[0] == '#') {
+      continue;
+    } else if (read.value.empty()) {
+      throw read.error("no value");
+    } else if (read.key == "==") {
       inside = true;
-      cases.push_back({value, place, {}});
-    } else if (key[0] != '#') {
-      if (!inside) {
-        fail(place, "no case begins before: " + line);
-      }
-      if (std::find(keys.begin(), keys.end(), key) == keys.end()) {
-        fail(place, "no such key: " + line);
-      }
-      cases.back().lines.push_back({key, value, place});
+      cases.push_back({read.value, read.place, {}});
+    } else if (!inside) {
+      throw read.error("no case begins before");
+    } else if (std::ranges::find(keys, read.key) == keys.end()) {
+      throw read.error("no such key");
+    } else {
+      cases.back().lines.push_back(read);
     }
   }
   if (cases.empty()) {
-    fail(path, "no cases");
+    throw std::runtime_error(path + ": no cases");
   }
   return cases;
 }
@@ -168,26 +154,9 @@ std::vector<std::string> caseFiles(const std::string &folder) {
   }
   std::sort(files.begin(), files.end());
   if (files.empty()) {
-    fail(folder, "no case files");
+    throw std::runtime_error(folder + ": no case files");
   }
   return files;
-}
-
-std::string difference(const std::string &expected, const std::string &actual,
-                       const std::string &folder, const std::string &name) {
-  if (actual == expected) {
-    return "";
-  }
-  std::string file = name;
-  std::replace_if(
-      file.begin(), file.end(), [](unsigned char c) { return std::isalnum(c) == 0; }, '_');
-  const std::string path = folder + "/" + file + ".actual";
-  std::ofstream(path, std::ios::binary) << actual;
-  const auto differs =
-      std::mismatch(expected.begin(), expected.end(), actual.begin(), actual.end()).first;
-  const auto line = static_cast<std::size_t>(std::count(expected.begin(), differs, '\n')) + 1;
-  return name + ": line " + std::to_string(line) + " is\n  " + lineOf(actual, line) +
-         "\nbut expected is\n  " + lineOf(expected, line) + "\nThe whole text: " + path;
 }
 
 } // namespace support

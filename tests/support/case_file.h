@@ -22,9 +22,11 @@ struct CaseLine {
   // The value with its escapes decoded: \n \t \0 \\ \xHH, \uHHHH and \UHHHHHHHH (a unit in the
   // machine's byte order), \*COUNTc and \*COUNT(TEXT) (that many times).
   std::string bytes() const;
-  // The value as a number, in hex after 0x. The second splits it at its first blank.
+  // The value as a number, in hex after 0x.
   long long number() const;
-  std::pair<std::string, CaseLine> firstWord() const;
+  // The value's two parts before and after the first separator.
+  std::pair<std::string, CaseLine> split(const std::string &separator) const;
+  std::pair<std::string, CaseLine> firstWord() const { return split(" "); }
 };
 
 struct Case {
@@ -37,10 +39,5 @@ std::vector<Case> readCases(const std::string &path, const std::vector<std::stri
 
 // Every *.cases file of a folder in the order of their names; at least one.
 std::vector<std::string> caseFiles(const std::string &folder);
-
-// Empty where the two are alike. Otherwise writes the actual text to `folder`, in a file called as
-// `name`, and returns a message that names it and the first line that differs.
-std::string difference(const std::string &expected, const std::string &actual,
-                       const std::string &folder, const std::string &name);
 
 } // namespace support

@@ -13,13 +13,17 @@ struct Cursor {
   std::size_t next = 0;
 };
 
-// What a parameter gets, and what it adds to the answer. Numbers.
-template <class Parameter>
-struct Slot {
-  explicit Slot(Cursor &at) : value(at.words.number<Parameter>(at.next++)) {}
-  Parameter get() const { return value; }
+// What a parameter gets, and what it adds to the answer.
+template <class Value>
+struct Given {
+  Value value;
+  Value get() const { return value; }
   std::string answer() const { return ""; }
-  Parameter value;
+};
+
+template <class Number>
+struct Slot : Given<Number> {
+  explicit Slot(Cursor &at) : Given<Number>{at.words.number<Number>(at.next++)} {}
 };
 
 template <>
@@ -31,10 +35,8 @@ struct Slot<int32_t *> {
 };
 
 template <>
-struct Slot<const void *> {
-  explicit Slot(Cursor & /*at*/) {}
-  const void *get() const { return nullptr; }
-  std::string answer() const { return ""; }
+struct Slot<const void *> : Given<const void *> {
+  explicit Slot(Cursor & /*at*/) : Given{nullptr} {}
 };
 
 template <class Unit>
@@ -55,11 +57,8 @@ struct Slot<Unit *> : TextSlot<Unit> { // char and UChar, also constant ones
 };
 
 template <>
-struct Slot<NLS2_Locale *> {
-  explicit Slot(Cursor &at) : value(at.words.object(at.next++)) {}
-  NLS2_Locale *get() const { return value; }
-  std::string answer() const { return ""; }
-  NLS2_Locale *value;
+struct Slot<NLS2_Locale *> : Given<NLS2_Locale *> {
+  explicit Slot(Cursor &at) : Given{at.words.object(at.next++)} {}
 };
 template <>
 struct Slot<const NLS2_Locale *> : Slot<NLS2_Locale *> {

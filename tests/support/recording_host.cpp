@@ -113,23 +113,18 @@ void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t line, uint32_t kind, ...) {
 }
 
 void TRC1_Printf(TRC1_EntryBlock *anchor, uint32_t /*line*/, const char *format, ...) {
+  char *line = nullptr;
   va_list arguments;
   va_start(arguments, format);
-  va_list again;
-  va_copy(again, arguments);
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wformat-nonliteral"
-  std::string text(static_cast<size_t>(std::vsnprintf(nullptr, 0, format, again)) + 1, '\0');
-  std::vsnprintf(text.data(), text.size(), format, arguments);
+  const int length = vasprintf(&line, format, arguments);
 #pragma GCC diagnostic pop
-  va_end(again);
   va_end(arguments);
-  text.pop_back();
-  if (text.empty() || text.back() != '\n') {
-    text += "(no newline)\n";
-  }
-  text.pop_back();
-  support::mark(nameOf(anchor) + ": " + text);
+  const std::string text(line, static_cast<std::size_t>(length));
+  std::free(line);
+  support::mark(nameOf(anchor) + ": " +
+                (text.ends_with('\n') ? text.substr(0, text.size() - 1) : text + "(no newline)"));
 }
 
 void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t /*line*/, const void *address, uint32_t length,

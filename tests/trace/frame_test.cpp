@@ -26,9 +26,7 @@ std::vector<std::string> linesOf(uint32_t flags, uint32_t options) {
   const Recording recording(static_cast<support::TraceFlags>(flags));
   EXPECT_EQ(translate(options), options == 0 ? 3 : options == NLS2_STRING_FILL ? 16 : 0);
   std::vector<std::string> lines = recording.lines();
-  lines.erase(std::remove_if(lines.begin(), lines.end(),
-                             [](const std::string &line) { return line.rfind("icu ", 0) == 0; }),
-              lines.end());
+  std::erase_if(lines, [](const std::string &line) { return line.starts_with("icu "); });
   return lines;
 }
 
@@ -88,8 +86,8 @@ TEST(Frame, EachKindOfLineHasItsFlagAndNoFlagChangesAResult) {
   for (const uint32_t options : {0U, uint32_t{NLS2_STRING_FILL}, 1U}) {
     const auto events = linesOf(support::traceEvents, options);
     const auto details = linesOf(support::traceDetail, options);
-    EXPECT_TRUE(std::all_of(events.begin(), events.end(), isEvent));
-    EXPECT_FALSE(details.empty() || std::any_of(details.begin(), details.end(), isEvent));
+    EXPECT_TRUE(std::ranges::all_of(events, isEvent));
+    EXPECT_TRUE(!details.empty() && std::ranges::none_of(details, isEvent));
     EXPECT_EQ(events.size() + details.size(), linesOf(support::traceAll, options).size());
     EXPECT_TRUE(linesOf(~uint32_t{support::traceAll}, options).empty());
   }
