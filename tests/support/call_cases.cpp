@@ -5,8 +5,10 @@
 #include "support/case_file.h"
 #include "support/recording_host.h"
 
+#include <algorithm>
 #include <cctype>
 #include <cstring>
+#include <fstream>
 #include <gtest/gtest.h>
 #include <optional>
 #include <sstream>
@@ -217,7 +219,13 @@ void expectCall(const std::string &expected, const Functions &functions, const S
   if (at != expected.npos && actual.size() + gap.size() > expected.size()) {
     actual.replace(at, actual.size() + gap.size() - expected.size(), gap);
   }
-  EXPECT_EQ(broken(expected), broken(actual)) << place;
+  std::string file = place + ".actual";
+  std::ranges::replace_if(
+      file, [](char c) { return c == '/' || c == ':'; }, '_');
+  if (actual != expected) {
+    std::ofstream(file) << broken(actual);
+  }
+  EXPECT_EQ(broken(expected), broken(actual)) << place << "\nThe whole text: " << file;
 }
 
 void expectPlain(const Functions &functions, Settings settings, const CaseLine &line) {
