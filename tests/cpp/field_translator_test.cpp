@@ -209,6 +209,18 @@ TEST(FieldTranslator, TextThatFillsItsRoomToTheLastByteIsWhole) {
   }
 }
 
+TEST(FieldTranslator, MaxSizeIsEnoughForPairsOfSurrogatesAByteEach) {
+  std::u16string text;
+  while (text.size() < 80) {
+    text += u"\U0001F600";
+  }
+  for (const code_page from : allPages()) {
+    field_translator translator(from, code_page(1200), {.bad = on_bad::replace});
+    const std::string field = encoded(from, text);
+    EXPECT_TRUE(ask(translator, field, translator.max_size(field.size())).result) << from.number();
+  }
+}
+
 TEST(FieldTranslator, SaysWhatFailedAndWhere) {
   constexpr field_policy strip{.padding = padding::strip};
   constexpr field_policy replace{.bad = on_bad::replace};
