@@ -73,8 +73,9 @@ std::optional<int32_t> convertUtf8InCopy(UConverter *to, UConverter *from, const
   std::memset(std::copy_n(ranges.input, size, copy.get()), 0, bytes - size);
   Ranges inCopy{copy.get(), copy.get() + room, copy.get(), copy.get() + size};
   const int32_t distance = convert(to, from, inCopy, error);
-  const bool terminated = !failed(error) && error != U_STRING_NOT_TERMINATED_WARNING;
-  const auto written = static_cast<std::size_t>(inCopy.output - copy.get()) + (terminated ? 1 : 0);
+  // ICU puts a null after the output.
+  const auto written =
+      static_cast<std::size_t>(inCopy.output - copy.get()) + (failed(error) ? 0 : 1);
   std::copy_n(copy.get(), std::min(written, room), ranges.output);
   return distance;
 }
