@@ -1,11 +1,13 @@
 // What the fuzz targets share: code pages to choose from, and a check that ends the run.
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <fuzzer/FuzzedDataProvider.h>
 #include <memory>
+#include <sanitizer/asan_interface.h>
 #include <string>
 
 namespace fuzz {
@@ -51,5 +53,29 @@ std::unique_ptr<Unit[]> exact(const std::basic_string<Unit> &text) {
   std::copy(text.begin(), text.end(), block.get());
   return block;
 }
+
+// An output of exactly `size` units. The library's accesses past it are seen at once; ICU is not
+// instrumented, so what it writes there is seen at the end.
+template <class Unit>
+class Output {
+public:
+  explicit Output(size_t size) : size_(size), units_(std::make_unique<Unit[]>(size + kept)) {
+    std::fill_n(get() + size_, kept, mark);
+    ASAN_POISON_MEMORY_REGION(get() + size_, kept * sizeof(Unit));
+  }
+  ~Output() {
+    ASAN_UNPOISON_MEMORY_REGION(get() + size_, kept * sizeof(Unit));
+    check(std::count(get() + size_, get() + size_ + kept, mark) == kept, "no more is written");
+  }
+  Output(const Output &) = delete;
+  Output &operator=(const Output &) = delete;
+  Unit *get() const { return units_.get(); }
+
+private:
+  static constexpr ptrdiff_t kept = 16;
+  static constexpr Unit mark = 0x5A;
+  size_t size_;
+  std::unique_ptr<Unit[]> units_;
+};
 
 } // namespace fuzz

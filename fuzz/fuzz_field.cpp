@@ -36,7 +36,7 @@ struct Answer {
 // Into a heap block of exactly `room` bytes.
 Answer translated(field_translator &with, const std::string &field, size_t room) {
   const auto source = fuzz::exact(field);
-  const auto block = std::make_unique<char[]>(room);
+  const fuzz::Output<char> block(room);
   const field_result result =
       with.translate(std::span(source.get(), field.size()), std::span(block.get(), room));
   check(result.written <= room, "no more is written than there is room");

@@ -29,8 +29,8 @@ NLS2_Locale *locale(FuzzedDataProvider &input, uint32_t page) {
 
 void decode(const NLS2_Locale *in, const fuzz::Page &page, const char *source, Sizes sizes) {
   const auto units = static_cast<size_t>(sizes.target);
-  const auto target = std::make_unique<UChar[]>(units);
-  const auto bare = std::make_unique<UChar[]>(units);
+  const fuzz::Output<UChar> target(units);
+  const fuzz::Output<UChar> bare(units);
   int32_t status = 0;
   const int32_t length =
       NLS2_toUTF16(in, source, sizes.source, target.get(), sizes.target, &status);
@@ -42,7 +42,7 @@ void decode(const NLS2_Locale *in, const fuzz::Page &page, const char *source, S
   check(length == (U_FAILURE(error) ? 0 : expected), "length of toUTF16");
   check(std::equal(target.get(), target.get() + units, bare.get()), "units of toUTF16");
 
-  const auto bytes = std::make_unique<char[]>(units);
+  const fuzz::Output<char> bytes(units);
   NLS2_toUTF8(in, source, sizes.source, bytes.get(), sizes.target, &status);
   NLS2_fromUTF8(in, bytes.get(), sizes.target, source, sizes.source, &status);
 }
@@ -50,8 +50,8 @@ void decode(const NLS2_Locale *in, const fuzz::Page &page, const char *source, S
 void encode(const NLS2_Locale *in, const fuzz::Page &page, const std::u16string &text,
             int32_t room) {
   const auto source = fuzz::exact(text);
-  const auto target = std::make_unique<char[]>(static_cast<size_t>(room));
-  const auto bare = std::make_unique<char[]>(static_cast<size_t>(room));
+  const fuzz::Output<char> target(static_cast<size_t>(room));
+  const fuzz::Output<char> bare(static_cast<size_t>(room));
   int32_t status = 0;
   const auto units = static_cast<int32_t>(text.size());
   const int32_t length = NLS2_fromUTF16(in, source.get(), room, target.get(), units, &status);
@@ -94,7 +94,8 @@ void inPlace(const NLS2_Locale *in, const std::string &text, int32_t room) {
   const auto size = static_cast<int32_t>(buffer.size());
   int32_t status = 0;
   for (const auto function : {NLS2_StringToUnicode, NLS2_UnicodeToString}) {
-    const auto block = fuzz::exact(buffer);
+    const fuzz::Output<char> block(buffer.size());
+    std::copy(buffer.begin(), buffer.end(), block.get());
     function(in, block.get(), size, block.get(), static_cast<int32_t>(text.size()), &status);
   }
 }
@@ -130,7 +131,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   inPlace(in, one, room);
   names(two);
   const auto terminated = fuzz::exact(std::string(one.c_str()) + '\0');
-  const auto mapped = std::make_unique<char[]>(static_cast<size_t>(room));
+  const fuzz::Output<char> mapped(static_cast<size_t>(room));
   int32_t status = 0;
   NLS2_Strlen(in, terminated.get(), 0, &status);
   check(NLS2_ByteLength(in, terminated.get(), &status) <= 4, "a character's bytes");

@@ -3,8 +3,8 @@
 
 #include "trace/memory.h"
 
+#include <algorithm>
 #include <cstdint>
-#include <cstring>
 #include <unicode/ucnv.h>
 #include <unicode/utf16.h>
 
@@ -13,6 +13,13 @@ namespace nls2::codepage {
 struct Utf16Text {
   trace::Block<UChar> units;
   int32_t length = 0; // in units, without the terminator
+
+  // The units before the first null. Where ICU writes a unit more than it measured, as for a text
+  // that ends within its signature, it leaves out the terminator.
+  int32_t lengthToNull() const {
+    const UChar *begin = units.get();
+    return static_cast<int32_t>(std::find(begin, begin + length + 1, u'\0') - begin);
+  }
 
   // The block that `length` calls for: the units and a terminator.
   uint64_t size() const { return (static_cast<uint64_t>(length) + 1) * sizeof(UChar); }

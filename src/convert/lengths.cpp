@@ -10,7 +10,6 @@
 
 #include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
-#include <unicode/ustring.h>
 
 namespace {
 
@@ -107,7 +106,7 @@ int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t /*i
     *pStatus = error;
     return frame.result(0);
   }
-  return frame.result(u_strlen(text.units.get()));
+  return frame.result(text.lengthToNull());
 }
 
 int32_t NLS2_ByteLength(const NLS2_Locale *pLocale, const char *pCharacter, int32_t *pStatus) {

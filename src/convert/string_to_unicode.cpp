@@ -9,7 +9,12 @@
 #include "trace/status.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
+#include <cstring>
+#include <memory>
+#include <new>
+#include <optional>
 #include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
 
@@ -31,16 +36,61 @@ Pointer limitOf(Pointer start, int32_t length) {
                                    static_cast<std::uintptr_t>(std::intptr_t{length}));
 }
 
+struct Ranges {
+  char *output;
+  char *outputLimit;
+  const char *input;
+  const char *inputLimit;
+};
+
+// The result is how far the output's end is from the input's.
+int32_t convert(UConverter *to, UConverter *from, Ranges &ranges, UErrorCode &error) {
+  ucnv_convertEx(to, from, &ranges.output, ranges.outputLimit, &ranges.input, ranges.inputLimit,
+                 nullptr, nullptr, nullptr, nullptr, true, true, &error);
+  return static_cast<int32_t>(reinterpret_cast<std::intptr_t>(ranges.output) -
+                              reinterpret_cast<std::intptr_t>(ranges.input));
+}
+
+// UTF-8 to UTF-8 in a copy of the source, of which the output before the limit goes back: where
+// bytes that are not valid grow to U+FFFD and the output overtakes the input, ICU writes up to 4
+// bytes past the limit. No result if ICU is to refuse the ranges, or without memory for a copy.
+std::optional<int32_t> convertUtf8InCopy(UConverter *to, UConverter *from, const Ranges &ranges,
+                                         UErrorCode &error) {
+  constexpr std::size_t overrun = 16;
+  constexpr std::uintptr_t longest = INT32_MAX;
+  const auto start = reinterpret_cast<std::uintptr_t>(ranges.input);
+  const auto size = reinterpret_cast<std::uintptr_t>(ranges.inputLimit) - start;
+  const auto given = reinterpret_cast<std::uintptr_t>(ranges.outputLimit) - start;
+  if (size > longest || given > longest) {
+    return std::nullopt;
+  }
+  const std::size_t room = std::min(given, 3 * size + 1); // enough for U+FFFD a byte
+  const std::size_t bytes = std::max(room, size) + overrun;
+  const std::unique_ptr<char[]> copy(new (std::nothrow) char[bytes]);
+  if (!copy) {
+    return std::nullopt;
+  }
+  std::memset(std::copy_n(ranges.input, size, copy.get()), 0, bytes - size);
+  Ranges inCopy{copy.get(), copy.get() + room, copy.get(), copy.get() + size};
+  const int32_t distance = convert(to, from, inCopy, error);
+  // ICU puts a null after the output.
+  const auto written =
+      static_cast<std::size_t>(inCopy.output - copy.get()) + (failed(error) ? 0 : 1);
+  std::copy_n(copy.get(), std::min(written, room), ranges.output);
+  return distance;
+}
+
 // Converts from the source to the source: the output starts where the input does and may go on to
-// dest + dlen. The result is how far the output's end is from the input's.
-int32_t convertInPlace(UConverter *targetConverter, UConverter *sourceConverter, char *dest,
-                       int32_t dlen, const char *src, int32_t slen, UErrorCode &error) {
-  char *output = const_cast<char *>(src);
-  const char *input = src;
-  ucnv_convertEx(targetConverter, sourceConverter, &output, limitOf(dest, dlen), &input,
-                 limitOf(src, slen), nullptr, nullptr, nullptr, nullptr, true, true, &error);
-  return static_cast<int32_t>(reinterpret_cast<std::intptr_t>(output) -
-                              reinterpret_cast<std::intptr_t>(input));
+// dest + dlen.
+int32_t convertInPlace(UConverter *to, UConverter *from, char *dest, int32_t dlen, const char *src,
+                       int32_t slen, UErrorCode &error) {
+  Ranges ranges{const_cast<char *>(src), limitOf(dest, dlen), src, limitOf(src, slen)};
+  if (ucnv_getType(to) == UCNV_UTF8 && ucnv_getType(from) == UCNV_UTF8) {
+    if (const auto distance = convertUtf8InCopy(to, from, ranges, error)) {
+      return *distance;
+    }
+  }
+  return convert(to, from, ranges, error);
 }
 
 } // namespace

@@ -28,7 +28,7 @@ UErrorCode mapCase(Trace trace, const NLS2_Locale *pLocale, const Utf16Text &sou
   UChar *output = mapped.units.get();
   const int32_t capacity = source.length + 1;
   const UChar *input = source.units.get();
-  const int32_t length = u_strlen(input);
+  const int32_t length = source.lengthToNull();
   switch (options) {
   case NLS2_MAP_UPPERCASE:
     u_strToUpper(output, capacity, input, length, pLocale->icuLocale, &error);

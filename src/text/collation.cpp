@@ -13,7 +13,6 @@
 #include <unicode/uchar.h>
 #include <unicode/ucnv.h>
 #include <unicode/ucol.h>
-#include <unicode/ustring.h>
 
 namespace {
 
@@ -106,8 +105,7 @@ bool convertString(Trace trace, LocalUConverterPointer &converter, Utf16Text &te
 
 // Blanks become nulls, which the collator ignores; its lengths stay.
 void trim(Utf16Text &text) {
-  UChar *units = text.units.get();
-  nls2::codepage::clearTrailing(units, u_strlen(units),
+  nls2::codepage::clearTrailing(text.units.get(), text.lengthToNull(),
                                 [](UChar32 character) { return u_isblank(character) != 0; });
 }
 

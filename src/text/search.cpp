@@ -120,7 +120,7 @@ bool convertString2(Search &search, const char *string, int32_t length) {
 UErrorCode toLower(const Search &search, const Utf16Text &source, Utf16Text &lower) {
   std::memset(lower.units.get(), 0, lower.size());
   UErrorCode error = U_ZERO_ERROR;
-  u_strToLower(lower.units.get(), lower.length, source.units.get(), u_strlen(source.units.get()),
+  u_strToLower(lower.units.get(), lower.length, source.units.get(), source.lengthToNull(),
                search.pLocale->icuLocale, &error);
   return error;
 }
@@ -129,7 +129,7 @@ template <Which which>
 bool lowerString(Search &search, const Utf16Text &source, Utf16Text &lower) {
   const Trace trace = search.trace;
   constexpr bool first = which == Which::first;
-  lower.length = u_strlen(source.units.get());
+  lower.length = source.lengthToNull();
   const auto bytes = static_cast<int32_t>(lower.size());
   if constexpr (first) {
     NLS2_TRACE(trace, "Buffer size for string1 to allocate is %d  bytes.", bytes);
@@ -160,6 +160,11 @@ bool lowerString(Search &search, const Utf16Text &source, Utf16Text &lower) {
   return true;
 }
 
+const UChar *firstOf(const Utf16Text &sought, const Utf16Text &text) {
+  return u_strFindFirst(text.units.get(), text.lengthToNull(), sought.units.get(),
+                        sought.lengthToNull());
+}
+
 int32_t answer(Search &search, const UChar *found) {
   if (found == nullptr) {
     NLS2_TRACE(search.trace, "Did not find occurence of string2 in string1.");
@@ -173,7 +178,7 @@ int32_t answer(Search &search, const UChar *found) {
 int32_t find(Search &search, uint32_t options) {
   if ((options & IGNORECASE) == 0) {
     NLS2_TRACE(search.trace, "Locate string2 within string1");
-    return answer(search, u_strstr(search.text1.units.get(), search.text2.units.get()));
+    return answer(search, firstOf(search.text2, search.text1));
   }
   NLS2_TRACE(search.trace, "IGNORECASE option detected");
   if (!lowerString<Which::first>(search, search.text1, search.lower1) ||
@@ -181,7 +186,7 @@ int32_t find(Search &search, uint32_t options) {
     return searchFailed;
   }
   NLS2_TRACE(search.trace, "Look for string2 in string1.");
-  return answer(search, u_strstr(search.lower1.units.get(), search.lower2.units.get()));
+  return answer(search, firstOf(search.lower2, search.lower1));
 }
 
 } // namespace

@@ -1,5 +1,4 @@
-// What NLS2_TranslateString must answer, by the rules of the header over bare ICU: whole texts
-// converted into buffers that are large enough, then cut.
+// What NLS2_TranslateString must answer, by the rules of the header over bare ICU.
 #pragma once
 
 #include <algorithm>
@@ -34,13 +33,17 @@ struct Outcome {
   std::string dest; // the whole buffer
 };
 
+inline icu::LocalUConverterPointer open(const Page &page) {
+  UErrorCode error = U_ZERO_ERROR;
+  return icu::LocalUConverterPointer(ucnv_open(page.icuName, &error));
+}
+
 template <class To, class From, class Convert>
 std::basic_string<To> converted(const Page &page, const std::basic_string<From> &text,
                                 Convert convert) {
   UErrorCode error = U_ZERO_ERROR;
-  const icu::LocalUConverterPointer converter(ucnv_open(page.icuName, &error));
   std::basic_string<To> result(text.size() * 8 + 16, To{0});
-  result.resize(static_cast<size_t>(convert(converter.getAlias(), result.data(),
+  result.resize(static_cast<size_t>(convert(open(page).getAlias(), result.data(),
                                             static_cast<int32_t>(result.size()), text.data(),
                                             static_cast<int32_t>(text.size()), &error)));
   return result;
@@ -52,21 +55,15 @@ inline std::string encode(const Page &page, const std::u16string &text) {
   return converted<char>(page, text, ucnv_fromUChars);
 }
 
-// As much as fits, and a zero byte where there is room for it.
-inline void put(std::string &dest, const std::string &bytes, int32_t room) {
-  const size_t fits = std::min(bytes.size(), static_cast<size_t>(room));
-  dest.replace(0, fits, bytes, 0, fits);
-  if (fits < static_cast<size_t>(room)) {
-    dest[fits] = 0;
-  }
-}
-
 inline Outcome direct(const Request &request, const std::string &source, std::string dest) {
   const std::string bytes = encode(request.dest, decode(request.source, source));
   const auto length = static_cast<int32_t>(bytes.size());
-  put(dest, bytes, request.destLen);
+  std::copy_n(bytes.begin(), std::min(length, request.destLen), dest.begin());
   if (length > request.destLen) {
     return {0, 15, 0, dest};
+  }
+  if (length < request.destLen) {
+    dest[bytes.size()] = 0;
   }
   int32_t result = length;
   if (length < request.destLen && (request.options == 8 || request.sourceLen == -1)) {
@@ -76,57 +73,55 @@ inline Outcome direct(const Request &request, const std::string &source, std::st
   return {result, 0, static_cast<int32_t>(source.size()), dest};
 }
 
-// FILL and TRAILING: `work` holds the text and zero units behind it, save what an inner null cut.
-inline Outcome padded(const Request &request, std::u16string work, size_t textLength, size_t blanks,
-                      int32_t room, int32_t terminator, std::string dest) {
-  size_t units = static_cast<size_t>(room);
-  if ((request.options & 0x100) == 0) {
-    units = std::min(units, textLength + blanks);
-  }
-  for (size_t i = textLength; i < units; ++i) {
-    work[i] = u' ';
-  }
-  std::string bytes = encode(request.dest, work.substr(0, units));
-  put(dest, bytes, room);
-  const auto excess = static_cast<int32_t>(bytes.size()) - room;
-  if (excess > 0) {
-    const int32_t left = static_cast<int32_t>(units) - excess;
-    if (left < -1) {
-      return {0, U_ILLEGAL_ARGUMENT_ERROR, 0, dest};
-    }
-    // ICU takes -1 for a null-terminated text.
-    bytes = encode(request.dest, left < 0 ? work.substr(0, work.find(u'\0'))
-                                          : work.substr(0, static_cast<size_t>(left)));
-    put(dest, bytes, room);
-    if (bytes.size() > static_cast<size_t>(room)) {
-      return {0, 15, 0, dest};
-    }
-  }
-  std::fill_n(dest.begin() + room, terminator, '\0');
-  return {room + terminator, 0, 0, dest};
-}
-
+// Measured and written with the room that the rules give, since ICU may measure a text too short: in
+// ISCII, one that begins with a substitution.
 inline Outcome shaped(const Request &request, const std::string &source, std::string dest) {
-  std::u16string work = decode(request.source, source);
+  const auto from = open(request.source);
+  const auto to = open(request.dest);
+  UErrorCode error = U_ZERO_ERROR;
+  const auto decoded = [&](UChar *units, int32_t room) {
+    error = U_ZERO_ERROR;
+    return ucnv_toUChars(from.getAlias(), units, room, source.data(),
+                         static_cast<int32_t>(source.size()), &error);
+  };
+  const int32_t measured = decoded(nullptr, 0);
+  std::u16string work(static_cast<size_t>(measured), u'\0');
+  decoded(work.data(), measured);
+  if (error > U_ZERO_ERROR) {
+    return {0, error, 0, dest};
+  }
   size_t end = work.size();
-  size_t blanks = 0;
+  int32_t blanks = 0;
   for (; end > 0 && (work[end - 1] == 0 || u_isblank(work[end - 1]) != 0); --end) {
     blanks += work[end - 1] != 0 ? 1 : 0;
   }
-  std::fill(work.begin() + static_cast<std::ptrdiff_t>(end), work.end(), u'\0');
-  work.resize(std::max(work.size(), static_cast<size_t>(request.destLen)) + 1);
-  const std::u16string text = work.substr(0, work.find(u'\0'));
-  const std::string bytes = encode(request.dest, text);
+  work.resize(end);
+  work.resize(static_cast<size_t>(std::max(measured, request.destLen)) + 1);
+  const auto text = static_cast<int32_t>(work.find(u'\0'));
+  const auto put = [&](int32_t units, int32_t room) { // ICU takes -1 for all up to a null
+    error = U_ZERO_ERROR;
+    return ucnv_fromUChars(to.getAlias(), dest.data(), room, work.data(), units, &error);
+  };
   const int32_t terminator = (request.options & 8) != 0 ? request.dest.terminator : 0;
   const int32_t room = request.destLen - terminator;
-  if (static_cast<int32_t>(bytes.size()) > room) {
-    return {0, 15, 0, dest};
+  if (put(text, 0) > room) {
+    return {0, U_BUFFER_OVERFLOW_ERROR, 0, dest};
   }
-  if ((request.options & 0x4000) != 0) {
-    put(dest, bytes, room);
-    return {static_cast<int32_t>(text.size()) + terminator, 0, 0, dest};
+  const bool strip = (request.options & 0x4000) != 0;
+  const int32_t padded = (request.options & 0x100) != 0 ? room : std::min(room, text + blanks);
+  const int32_t units = strip ? text : padded;
+  std::fill(work.begin() + text, work.begin() + std::max(text, units), u' ');
+  const int32_t bytes = put(units, room);
+  if (error == U_BUFFER_OVERFLOW_ERROR && !strip) {
+    put(units - (bytes - room), room);
   }
-  return padded(request, work, text.size(), blanks, room, terminator, dest);
+  if (error > U_ZERO_ERROR) {
+    return {0, error, 0, dest};
+  }
+  if (!strip) {
+    std::fill_n(dest.begin() + room, terminator, '\0');
+  }
+  return {(strip ? text : room) + terminator, 0, 0, dest};
 }
 
 // `dest` is the buffer as it is before the call.

@@ -192,7 +192,14 @@ TEST(FieldTranslator, TableAndGeneralPathAndBareIcuAgree) {
 
 TEST(FieldTranslator, TextThatFillsItsRoomToTheLastByteIsWhole) {
   const std::u16string text = u"Ab \u00E9\u65E5\u672CZ";
+  std::u16string faces; // in SCSU and BOCU-1 a byte each
+  while (faces.size() < 80) {
+    faces += u"\U0001F600";
+  }
   for (const code_page to : allPages()) {
+    field_translator back(to, code_page(1200), {.bad = on_bad::replace});
+    const std::string many = encoded(to, faces);
+    EXPECT_TRUE(ask(back, many, back.max_size(many.size())).result) << to.number();
     const std::string whole = encoded(to, text);
     const std::string field = encoded(code_page(1208), text) + "  ";
     for (const padding padding : {padding::strip, padding::fill, padding::keep_blanks}) {

@@ -32,7 +32,7 @@ inline bool null_is_zero_byte(UConverterType type) noexcept {
 
 // A byte can stand for a supplementary character, or for a sequence.
 inline bool can_grow_in_units(UConverterType type) noexcept {
-  return is_one_of(type, {UCNV_SCSU, UCNV_ISCII, UCNV_SBCS});
+  return is_one_of(type, {UCNV_SCSU, UCNV_BOCU1, UCNV_ISCII, UCNV_SBCS});
 }
 
 // Text may leave a mode open that a blank after it closes.
