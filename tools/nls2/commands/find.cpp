@@ -2,6 +2,7 @@
 
 #include "io/output_file.h"
 #include "locale/locale_option.h"
+#include "nls2/field_translator.hpp"
 #include "options.h"
 #include "text/decoder.h"
 #include "text/record_reader.h"
@@ -38,29 +39,15 @@ bool foldAscii(std::u16string_view text, char16_t *folded) {
   return all < 0x80;
 }
 
-// Whether the page has all of these characters, and not only substitutes for them.
-bool hasAll(const Decoder &decoder, const icu::UnicodeString &text) {
-  const std::string bytes = decoder.encode(text);
-  UErrorCode error = U_ZERO_ERROR;
-  const icu::UnicodeString back(bytes.data(), static_cast<int32_t>(bytes.size()),
-                                decoder.page().converter(), error);
-  return U_SUCCESS(error) && back == text;
-}
-
-// The page may have a pair of characters that it does not have alone, so the whole is tried first.
-void requireCharacters(const Decoder &decoder, const icu::UnicodeString &pattern) {
-  if (hasAll(decoder, pattern)) {
-    return;
+// As a whole: a page may have a pair of characters that it does not have alone.
+void requireCharacters(const std::string &pattern, int32_t page) {
+  field_translator translator(utf8_page, code_page(page), {});
+  std::string encoded;
+  const field_result result = translator.translate(pattern, encoded);
+  if (result.problem == field_problem::not_in_page) {
+    throw usageError("PATTERN: the character U+{:04X} is not in code page {}",
+                     static_cast<uint32_t>(result.code_point), page);
   }
-  const int32_t page = decoder.page().number();
-  for (int32_t at = 0; at < pattern.length(); at = pattern.moveIndex32(at, 1)) {
-    const UChar32 character = pattern.char32At(at);
-    if (!hasAll(decoder, character)) {
-      throw usageError("PATTERN: the character U+{:04X} is not in code page {}",
-                       static_cast<uint32_t>(character), page);
-    }
-  }
-  throw usageError("PATTERN: code page {} does not have all of its characters", page);
 }
 
 std::u16string decodedPattern(const std::string &pattern) {
@@ -76,9 +63,10 @@ class TextSearch {
 public:
   // Throws usageError where the code page lacks a character of the pattern.
   explicit TextSearch(const Arguments &arguments)
-      : decoder_(arguments.locale.codepage), ignoreCase_(arguments.ignoreCase),
-        pattern_(decodedPattern(arguments.pattern)) {
-    requireCharacters(decoder_, {pattern_.data(), static_cast<int32_t>(pattern_.size())});
+      : decoder_(arguments.locale.codepage),
+        encoder_(utf8_page, code_page(arguments.locale.codepage), {.bad = on_bad::replace}),
+        ignoreCase_(arguments.ignoreCase), pattern_(decodedPattern(arguments.pattern)) {
+    requireCharacters(arguments.pattern, arguments.locale.codepage);
     if (ignoreCase_) {
       folding_ =
           hasDotlessI(arguments.locale) ? U_FOLD_CASE_EXCLUDE_SPECIAL_I : U_FOLD_CASE_DEFAULT;
@@ -102,9 +90,10 @@ public:
   std::string lineFeed() const { return lineFeedOf(decoder_.page(), true); }
 
   // UTF-8 as the lines' code page has it.
-  std::string encode(const std::string &utf8) const {
-    const bool isSame = utf8.empty() || decoder_.isUtf8();
-    return isSame ? utf8 : decoder_.encode(icu::UnicodeString::fromUTF8(utf8));
+  std::string encode(const std::string &utf8) {
+    std::string bytes;
+    encoder_.translate(utf8, bytes);
+    return bytes;
   }
 
 private:
@@ -128,6 +117,7 @@ private:
   }
 
   Decoder decoder_;
+  field_translator encoder_;
   const bool ignoreCase_;
   uint32_t folding_ = 0; // U_FOLD_CASE_*
   std::u16string pattern_;

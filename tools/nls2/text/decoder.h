@@ -78,17 +78,6 @@ public:
                             : convert(bytes);
   }
 
-  // A text in the page; characters that the page lacks become its substitution character.
-  std::string encode(const icu::UnicodeString &text) const {
-    const int32_t most =
-        UCNV_GET_MAX_BYTES_FOR_STRING(text.length(), ucnv_getMaxCharSize(page_.converter()));
-    std::string bytes(static_cast<std::size_t>(most), '\0');
-    UErrorCode error = U_ZERO_ERROR;
-    const int32_t length = text.extract(bytes.data(), most, page_.converter(), error);
-    bytes.resize(U_FAILURE(error) ? 0 : static_cast<std::size_t>(length));
-    return bytes;
-  }
-
   bool isUtf8() const { return isUtf8_; }
   const CodePage &page() const { return page_; }
 
