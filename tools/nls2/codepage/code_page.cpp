@@ -7,6 +7,7 @@
 #include "options.h"
 
 #include <algorithm>
+#include <iterator>
 #include <limits>
 #include <set>
 #include <unicode/unistr.h>
@@ -153,16 +154,14 @@ std::string nearPages(const std::string &asked) {
     const auto page = windowsPage("windows-" + asked);
     return page ? didYouMean({std::to_string(*page)}) : "";
   }
-  std::vector<std::string> known;
-  for (const int32_t number : pagesWithNames) {
-    known.push_back(std::to_string(number));
-  }
-  for (const std::string &name : allPageNames()) {
-    known.push_back(name);
-    if (name.starts_with("ibm-") && decimalNumber<int32_t>(name.substr(4))) {
-      known.push_back(name.substr(4));
+  std::vector<std::string> known = allPageNames();
+  for (std::size_t i = 0, names = known.size(); i < names; ++i) {
+    if (known[i].starts_with("ibm-") && decimalNumber<int32_t>(known[i].substr(4))) {
+      known.push_back(known[i].substr(4));
     }
   }
+  std::ranges::transform(pagesWithNames, std::back_inserter(known),
+                         [](int32_t number) { return std::to_string(number); });
   return didYouMean(nearNames(asked, known));
 }
 
