@@ -19,12 +19,12 @@ using nls2::on_bad;
 using nls2::padding;
 
 // Translators live from one input to the next, so that a state left behind shows.
-using Key = std::tuple<int32_t, int32_t, int, size_t, int, bool>;
+using Key = std::tuple<int32_t, int32_t, int, size_t, int, bool, bool>;
 std::map<Key, field_translator> made;
 
 field_translator &translator(code_page from, code_page to, const field_policy &policy) {
   const Key key(from.number(), to.number(), static_cast<int>(policy.padding), policy.width,
-                static_cast<int>(policy.bad), policy.use_table);
+                static_cast<int>(policy.bad), policy.use_table, policy.drop_ignorable);
   return made.try_emplace(key, from, to, policy).first->second;
 }
 
@@ -97,6 +97,7 @@ field_policy policyFrom(FuzzedDataProvider &input) {
   const auto width = input.ConsumeIntegralInRange<size_t>(0, 20);
   policy.width = policy.padding == padding::fill ? width + 1 : width;
   policy.bad = input.ConsumeBool() ? on_bad::stop : on_bad::replace;
+  policy.drop_ignorable = input.ConsumeBool();
   return policy;
 }
 
@@ -135,7 +136,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   }
   checkRoom(fast, answer, field);
   checkRoom(general, answer, field);
-  if (policy.padding == padding::as_is && policy.bad == on_bad::replace && policy.width == 0) {
+  if (policy.padding == padding::as_is && policy.bad == on_bad::replace && policy.width == 0 &&
+      policy.drop_ignorable) {
     checkAgainstC(from, to, answer, field);
   }
   return 0;

@@ -69,6 +69,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   shape.page = fuzz::page(input).number;
   shape.length = input.ConsumeIntegralInRange<size_t>(0, 40);
   shape.isText = input.ConsumeBool();
+  shape.mostInBatch = input.ConsumeIntegralInRange<uint64_t>(1, 4);
   const std::string bytes = input.ConsumeRemainingBytesAsString();
   const File file(bytes);
   try {

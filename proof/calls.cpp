@@ -96,7 +96,7 @@ Outcome find(const NLS2_Locale *in) {
 Outcome mapString(const NLS2_Locale *in) {
   Room room;
   const int32_t result = NLS2_MapString(in, room.bytes, 200, "", 0, NLS2_MAP_LOWERCASE);
-  const bool done = result == 2 || result == 4;
+  const bool done = result == 2; // the length for 819; 4 is a status
   return {done ? 0 : result, 0, done ? room.text(result) : ""};
 }
 

@@ -22,7 +22,7 @@ COMMANDS = [
     (TRANSLATE + ["--strip", "--newline", "lf", "IN", "-o", "OUT"], (1, 2)),
     (TRANSLATE + ["--fields", "1-10,11-20=hex", "--csv", "--sync", "IN", "-o", "OUT"], (1, 2)),
     (TRANSLATE + ["--strip", "--verify", "--report", "REPORT", "IN", "-o", "OUT"], (1, 2)),
-    (["cat", "--encoding", "ibm-37", "IN"], (1, 2)),
+    (["cat", "--encoding", "ibm-37", "IN"], (2,)),
     (["dump", "--from", "37", "IN"], (1, 2)),
     (["codepages", "37", "--json"], (1, 2)),
     (["codepages", "--chart", "37"], (1, 2)),

@@ -42,7 +42,8 @@ Error usageError(fmt::format_string<Arguments...> format, Arguments &&...argumen
   return {exitUsage, fmt::format(format, std::forward<Arguments>(arguments)...)};
 }
 
-// A text that cannot be used. The message goes after the text's place: ", column 3: ..." or ": ...".
+// A text that cannot be used. The message goes after the text's place: ", column 3: ..." or
+// ": ...".
 class TextFault : public Error {
 public:
   explicit TextFault(const std::string &text) : Error(exitFailed, text) {}
@@ -62,8 +63,8 @@ inline void requireSuccess(UErrorCode status, const char *what) {
   }
 }
 
-// Whether a request of ICU's for memory has failed. Some of its functions report that as a name that
-// is unknown, or not at all.
+// Whether a request of ICU's for memory has failed. Some of its functions report that as a name
+// that is unknown, or not at all.
 inline std::atomic<bool> ranOutOfMemory = false;
 
 // Throws std::bad_alloc where one has. To be called before an answer is given.

@@ -1,6 +1,5 @@
-// ICU's memory. Without memory ICU 72 follows null pointers in its collation loader and waits for
-// itself in the default locale, so it gets some from a reserve, which is enough until the next
-// requireMemory() ends the command.
+// ICU's memory. Without memory ICU 72 follows null pointers in its collation loader and deadlocks in
+// the default locale. So it gets a reserve, enough until requireMemory() ends the command.
 #pragma once
 
 #include "errors.h"
@@ -31,8 +30,13 @@ inline void *allocate(std::size_t size) {
   }
   ranOutOfMemory = true;
   const std::size_t rounded = (size / alignof(std::max_align_t) + 1) * alignof(std::max_align_t);
-  const std::size_t at = used.fetch_add(rounded);
-  return at < reserve.size() && rounded <= reserve.size() - at ? reserve.data() + at : nullptr;
+  std::size_t at = used;
+  while (size < reserve.size() && rounded <= reserve.size() - at) {
+    if (used.compare_exchange_weak(at, at + rounded)) {
+      return reserve.data() + at;
+    }
+  }
+  return nullptr;
 }
 
 inline void release(void *block) {
@@ -57,7 +61,7 @@ inline void *resize(void *block, std::size_t size) {
 } // namespace icu_memory
 
 // Has to come before any other use of ICU.
-inline void watchMemory() {
+inline void giveIcuReserve() {
   UErrorCode status = U_ZERO_ERROR;
   u_setMemoryFunctions(
       nullptr, [](const void *, std::size_t size) { return icu_memory::allocate(size); },

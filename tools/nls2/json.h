@@ -14,7 +14,8 @@
 
 namespace nls2::tool {
 
-// A value to be written. Every function throws std::bad_alloc without memory. Copies share the value.
+// A value to be written. Every function throws std::bad_alloc without memory. Copies share the
+// value.
 class Json {
 public:
   Json(std::nullptr_t = nullptr) : Json(json_null()) {}

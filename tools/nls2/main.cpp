@@ -29,7 +29,7 @@ constexpr CommandEntry commands[] = {
     {"codepages", "List code pages by number and by Windows name", codepagesCommand},
     {"detect", "Report the Unicode signatures of files", detectCommand, exitUsage},
     {"dump", "Show a file in hex and as text of a code page", dumpCommand},
-    {"cat", "Write text files in any encoding to standard output as UTF-8", catCommand},
+    {"cat", "Write text files in any encoding to standard output as UTF-8", catCommand, exitUsage},
     {"compare", "Compare two strings by the rules of a language", compareCommand, exitUsage},
     {"sort", "Sort lines or fixed-length records by the rules of a language", sortCommand},
     {"find", "Print the lines in which a text occurs", findCommand, exitUsage}};
@@ -150,7 +150,7 @@ int main(int argc, char **argv) {
   nls2::tool::occupyStandardStreams();
   std::signal(SIGXFSZ, SIG_IGN); // a full file is a write error, reported like any other
   std::set_terminate(nls2::tool::endWithoutMemory);
-  nls2::tool::watchMemory();
+  nls2::tool::giveIcuReserve();
   const auto *entry = argc > 1 ? nls2::tool::commandNamed(argv[1]) : nullptr;
   nls2::tool::failureCode = entry != nullptr ? entry->failureCode : nls2::tool::exitFailed;
   return nls2::tool::run(entry, argc, argv);

@@ -19,7 +19,7 @@ constexpr const char *notes =
     R"(NAME is a code page by number, or a converter name of ICU's: UTF-16, ISO-8859-1, ibm-1141. Line ends
 and nulls stay what they are. UTF-16 and UTF-32 take off a byte-order mark, and do without one (then
 big-endian); with any other name a mark is text, U+FEFF.
-Exit codes: 1 if bytes that are not valid in the encoding were replaced, 2 if a file failed.
+Exit codes: 1 if bytes that are not valid in the encoding were replaced, 2 for any failure.
 )";
 
 struct Arguments {
@@ -117,8 +117,8 @@ private:
 
   void reportReplaced(const std::string &name) const {
     const char *verb = replaced_ == 1 ? " is" : "s are";
-    complain(fmt::format("{}: {} byte sequence{} not valid {}; each was replaced", printable(name),
-                         replaced_, verb, printable(encoding_))
+    complain(fmt::format("{}: {} byte sequence{} not valid {}; each was replaced", name, replaced_,
+                         verb, printable(encoding_))
                  .c_str());
   }
 

@@ -28,8 +28,8 @@ struct Arguments {
   std::vector<std::string> inputs;
 };
 
-// Most lines are ASCII, whose folding is a loop over many units at once. False for other text, of
-// which the output has nothing of use.
+// Most lines are ASCII, whose folding is a loop over many units at once. False if the text is not
+// ASCII; the output is of no use then.
 bool foldAscii(std::u16string_view text, char16_t *folded) {
   char16_t all = 0;
   for (const char16_t unit : text) {
@@ -134,7 +134,7 @@ public:
     for (const std::string &path : inputsOf(arguments_.inputs)) {
       searchFile(path);
     }
-    output_.flush();
+    output_.commit();
     return failed_ ? exitUsage : found_ ? exitDone : exitFailed;
   }
 

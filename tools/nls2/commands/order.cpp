@@ -38,8 +38,8 @@ struct Arguments {
   std::string a, b;
 };
 
-// Gives every text a key; the keys' bytes compare as the library's comparison orders the texts, and for
-// the locale C as their code points do. For one thread at a time.
+// Gives every text a key; the keys' bytes compare as the library's comparison orders the texts, and
+// for the locale C as their code points do. For one thread at a time.
 class LineOrder {
 public:
   // Throws usageError.

@@ -30,6 +30,7 @@ public:
   // Returns when all is written. The first exception of a step ends the run when the pieces before
   // have been written, and comes out here.
   void run() {
+    // One thread more than processors, since one mostly reads or writes.
     const unsigned workers = std::clamp(std::thread::hardware_concurrency(), 1U, mostWorkers);
     std::vector<std::jthread> threads;
     try {

@@ -169,7 +169,7 @@ bool TranslateRun::translate(RecordTranslator &worker, const Record &record, Pie
   std::size_t replaced = 0;
   std::optional<Problem> problem = worker.translate(record.text, piece.output, replaced);
   const bool isRefused = problem.has_value();
-  if (replaced > 0 && !tally.first) {
+  if (!isRefused && replaced > 0 && !tally.first) {
     problem = worker.firstReplaced(record.text);
   }
   if (problem) {
@@ -228,8 +228,12 @@ int translateFile(const TranslateOptions &options) {
   };
   try {
     TranslateRun(options, translator, files, tally).run();
-  } catch (...) {
-    writeReport();
+  } catch (const Error &) {
+    try {
+      writeReport();
+    } catch (const Error &second) {
+      complain(second.what());
+    }
     throw;
   }
   writeReport();

@@ -61,10 +61,11 @@ std::size_t InputFile::read(char *buffer, std::size_t length) {
 void InputFile::skip(uint64_t bytes) {
   constexpr uint64_t farthest = std::numeric_limits<off_t>::max();
   if (const auto left = bytesLeft()) {
-    if (lseek(fd_, static_cast<off_t>(std::min({bytes, *left, farthest})), SEEK_CUR) < 0) {
+    const uint64_t sought = std::min({bytes, *left, farthest});
+    if (lseek(fd_, static_cast<off_t>(sought), SEEK_CUR) < 0) {
       fail();
     }
-    return;
+    bytes -= sought; // a file of /proc has more than it says
   }
   constexpr std::size_t chunk = std::size_t{64} * 1024;
   const auto dropped = std::make_unique_for_overwrite<char[]>(chunk);

@@ -17,8 +17,8 @@ public:
   InputFile(const InputFile &) = delete;
   InputFile &operator=(const InputFile &) = delete;
 
-  // Up to `length` bytes, as many as are there at once; 0 at the end, and where it would wait for
-  // them after interrupt(). Throws Error.
+  // Up to `length` bytes, as many as are there at once; 0 at the end, and after interrupt(). Throws
+  // Error.
   std::size_t read(char *buffer, std::size_t length);
   void interrupt() const;
   // Leaves out the next bytes, by seeking where the file can; fewer where it ends before. Throws

@@ -57,15 +57,16 @@ bool isOthersInStickyDirectory(const std::string &path, const struct stat &exist
          geteuid() != 0 && geteuid() != existing.st_uid && geteuid() != directory.st_uid;
 }
 
-// No attribute, and no list of their names, is longer; empty where it cannot be read.
+// No attribute, and no list of their names, is longer; nothing where it cannot be read.
 template <typename Get>
-std::string attributeBytes(Get get) {
+std::optional<std::string> attributeBytes(Get get) {
   std::string bytes(XATTR_LIST_MAX, '\0');
-  bytes.resize(static_cast<std::size_t>(std::max<ssize_t>(get(bytes.data(), bytes.size()), 0)));
-  return bytes;
+  const ssize_t length = get(bytes.data(), bytes.size());
+  bytes.resize(static_cast<std::size_t>(std::max<ssize_t>(length, 0)));
+  return length >= 0 ? std::optional(bytes) : std::nullopt;
 }
 
-std::string valueOf(const std::string &path, const char *name) {
+std::optional<std::string> valueOf(const std::string &path, const char *name) {
   return attributeBytes(
       [&](char *buffer, std::size_t size) { return getxattr(path.c_str(), name, buffer, size); });
 }
@@ -85,16 +86,18 @@ void copyAttributes(int fd, const std::string &target, const struct stat &existi
     throw failure("cannot keep the file's owner: {}", std::strerror(errno));
   }
   fremovexattr(fd, accessList.data());
-  const bool hasList = !valueOf(target, accessList.data()).empty();
+  const bool hasList = valueOf(target, accessList.data()).has_value();
   if (fchmod(fd, existing.st_mode & (hasList ? 0700 : 0777)) != 0) {
     throw failure("cannot keep the file's permissions: {}", std::strerror(errno));
   }
-  const std::string names = attributeBytes(
+  const auto list = attributeBytes(
       [&](char *buffer, std::size_t size) { return listxattr(target.c_str(), buffer, size); });
+  const std::string names = list.value_or("");
   for (const char *name = names.c_str(); *name != '\0'; name += std::strlen(name) + 1) {
     if (std::string_view(name) != "security.capability") {
-      const std::string value = valueOf(target, name);
-      static_cast<void>(fsetxattr(fd, name, value.data(), value.size(), 0));
+      if (const auto value = valueOf(target, name)) {
+        static_cast<void>(fsetxattr(fd, name, value->data(), value->size(), 0));
+      }
     }
   }
 }
@@ -176,7 +179,7 @@ void OutputFile::openTemporary(mode_t mode) {
     return;
   }
   if (fd_ >= 0) {
-    close(fd_);
+    close(std::exchange(fd_, -1));
   }
   takeFreeName([&](const char *free) {
     return fd_ = open(free, O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC, mode);
@@ -266,7 +269,7 @@ void OutputFile::publish(bool sync) {
   giveUpName();
   if (sync) {
     fd_ = open(directoryOf(target_).c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
-    if (fd_ < 0 || fsync(fd_) != 0) {
+    if (fd_ < 0 || (fsync(fd_) != 0 && errno != EINVAL)) {
       fail();
     }
   }

@@ -2,7 +2,6 @@
 #pragma once
 
 #include "io/input_file.h"
-#include <functional>
 
 #include <functional>
 #include <string>

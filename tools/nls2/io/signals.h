@@ -9,8 +9,7 @@
 namespace nls2::tool {
 
 // The names of the files that they remove, with room for more than a command ever has. They change
-// only while the signals are held back, and while no other thread of the process could get them in
-// this one's place.
+// only while the signals are held back, in a process with one thread.
 inline std::array<const char *volatile, 8> namesToRemove{};
 
 inline std::atomic<bool> progressIsShown = false; // a line on the terminal
@@ -40,8 +39,8 @@ inline void clearProgress() {
   _exit(128 + signal);
 }
 
-// Those that end a process unless it handles them, and that others send or a clock does. Signals that
-// the caller had ignored, as nohup does, stay ignored.
+// Those that end a process unless it handles them, and that others send or a clock does. Signals
+// that the caller had ignored, as nohup does, stay ignored.
 inline void catchEndingSignals() {
   for (const int signal : {SIGHUP, SIGINT, SIGQUIT, SIGTERM, SIGALRM, SIGUSR1, SIGUSR2, SIGXCPU,
                            SIGPIPE, SIGPOLL, SIGVTALRM, SIGPROF, SIGPWR, SIGSTKFLT}) {

@@ -24,9 +24,9 @@ std::string localesNear(const std::string &name);
 // The two options, and after them a command's own.
 std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own);
 
-// The locale whose order of texts counts, byCodePoint for C and POSIX: of --locale, or of the environment (LC_ALL, LC_COLLATE,
-// LANG), which may also be another locale of a language that localeMap holds. Throws usageError
-// where localeMap does not hold the environment's language.
+// The locale whose order of texts counts, byCodePoint for C and POSIX: of --locale, or of the
+// environment (LC_ALL, LC_COLLATE, LANG), which may also be another locale of a language that
+// localeMap holds. Throws usageError where localeMap does not hold the environment's language.
 std::string orderLocale(const LocaleOptions &options);
 
 // Whether i without a dot is a letter of the locale's language. The environment's language may be
