@@ -1,9 +1,9 @@
 /* Preloaded into a program, makes one of its calls fail, or all from one on. Counting begins at
  * main(), so that loaders and libraries start in peace.
  *
- *   FAULT_KIND  heap, open, read, write, close, fsync, rename or link
+ *   FAULT_KIND  heap, icu, open, read, write, close, fsync, rename or link
  *   FAULT_AT    which call fails, from 1; FAULT_ON=1: that one and all that follow
- *   FAULT_HOW   the errno, or 0 for a short count
+ *   FAULT_HOW   the errno, or 0 for a short count; of icu the status
  *   FAULT_LOG   receives "reached" once a fault was injected, and the call of ICU's that crashed
  */
 #define _GNU_SOURCE
@@ -18,6 +18,9 @@
 #include <stdlib.h>
 #include <string.h>
 #include <sys/syscall.h>
+#include <unicode/ucnv.h>
+#include <unicode/ucol.h>
+#include <unicode/ustring.h>
 #include <unistd.h>
 
 void *__libc_malloc(size_t size);
@@ -118,11 +121,12 @@ int posix_memalign(void **block, size_t alignment, size_t size) {
   return *block != NULL ? 0 : ENOMEM;
 }
 
-/* The next definition of a function. */
+/* The next definition of a function; ICU's have a version in their names. */
+#define NAME(function) #function
 #define NEXT(function)                                                                             \
   static __typeof__(&function) original;                                                           \
   if (original == NULL) {                                                                          \
-    original = (__typeof__(&function))dlsym(RTLD_NEXT, #function);                                 \
+    original = (__typeof__(&function))dlsym(RTLD_NEXT, NAME(function));                            \
   }
 
 ssize_t read(int file, void *bytes, size_t count) {
@@ -180,3 +184,33 @@ int linkat(int folder, const char *from, int to_folder, const char *to, int flag
   NEXT(linkat)
   return fails("link") ? -1 : original(folder, from, to_folder, to, flags);
 }
+
+#define ICU(type, name, declared, given, failed)                                                   \
+  type name declared {                                                                             \
+    NEXT(name)                                                                                     \
+    if (U_SUCCESS(*status) && fails("icu")) {                                                      \
+      *status = (UErrorCode)how;                                                                   \
+      return failed;                                                                               \
+    }                                                                                              \
+    return original given;                                                                         \
+  }
+ICU(UConverter *, ucnv_open, (const char *page, UErrorCode *status), (page, status), NULL)
+ICU(UCollator *, ucol_open, (const char *locale, UErrorCode *status), (locale, status), NULL)
+ICU(void, ucnv_toUnicode,
+    (UConverter * from, UChar **target, const UChar *limit, const char **source, const char *end,
+     int32_t *offsets, UBool flush, UErrorCode *status),
+    (from, target, limit, source, end, offsets, flush, status), )
+ICU(void, ucnv_fromUnicode,
+    (UConverter * to, char **target, const char *limit, const UChar **source, const UChar *end,
+     int32_t *offsets, UBool flush, UErrorCode *status),
+    (to, target, limit, source, end, offsets, flush, status), )
+ICU(void, ucnv_convertEx,
+    (UConverter * to, UConverter *from, char **target, const char *limit, const char **source,
+     const char *end, UChar *pivot, UChar **pivotSource, UChar **pivotTarget,
+     const UChar *pivotLimit, UBool reset, UBool flush, UErrorCode *status),
+    (to, from, target, limit, source, end, pivot, pivotSource, pivotTarget, pivotLimit, reset,
+     flush, status), )
+ICU(int32_t, u_strFoldCase,
+    (UChar * to, int32_t room, const UChar *from, int32_t length, uint32_t options,
+     UErrorCode *status),
+    (to, room, from, length, options, status), 0)

@@ -2,8 +2,8 @@
 """Sweeps faults through the nls2 command: tool_faults.py NLS2 SHIM SECONDS
 
 Each command runs on a short input while its 1st, 2nd, ... request to the heap fails, alone and with
-all that follow, and so every open, read, write, close, fsync, rename and link, until a run without a
-fault. A fault must be absorbed (the usual output, exit code and nothing on standard error) or
+all that follow, or a call of ICU's, or an open, read, write, close, fsync, rename or link, until a run
+without a fault. A fault must be absorbed (the usual output, exit code and nothing on standard error) or
 reported: a message, and exit code 1, or 2 where 1 means "no". An output file is whole or not there.
 """
 
@@ -35,6 +35,7 @@ COMMANDS = [
 ]
 IO_FAULTS = [(kind, how) for kind in ("open", "read", "write", "close", "fsync", "rename", "link")
              for how in (errno.EIO, errno.ENOSPC, errno.EINTR)] + [("read", 0), ("write", 0)]
+ICU_FAULTS = [("icu", 7)]  # no memory
 
 
 class Sweep:
@@ -68,6 +69,7 @@ class Sweep:
 
     def sweep(self, command, kind, how, on, until):
         arguments, codes = command
+        codes = (1, 2) if kind == "icu" else codes  # 2: the page that an option names does not open
         name = f"{COMMANDS.index(command)}-{kind}-{how}-{on}"
         usual = self.run(arguments, {}, name)[:3]
         for at in range(1, 100000):
@@ -94,9 +96,10 @@ def main():
         with open(folder + "/text", "w", encoding="utf-8") as file:
             file.write("Zulu\nÄpfel\nazulul\n")
         sweep = Sweep(tool, shim, folder)
-        jobs = [(c, kind, how, on) for kind, how in IO_FAULTS for c in COMMANDS for on in (0, 1)
-                if how != errno.EINTR or not on]
-        jobs += [(c, "heap", errno.ENOMEM, on) for c in COMMANDS for on in (0, 1)]
+        jobs = [(c, "heap", errno.ENOMEM, on) for c in COMMANDS for on in (0, 1)]
+        jobs += [(c, kind, how, 0) for kind, how in ICU_FAULTS for c in COMMANDS]
+        jobs += [(c, kind, how, on) for kind, how in IO_FAULTS for c in COMMANDS for on in (0, 1)
+                 if how != errno.EINTR or not on]
         with ThreadPoolExecutor(os.cpu_count()) as pool:
             list(pool.map(lambda job: sweep.sweep(*job, until), jobs))
     for line in sweep.wrong[:int(os.environ.get("SHOW", "20"))]:

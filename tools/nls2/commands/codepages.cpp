@@ -49,9 +49,11 @@ ByteMeaning meaningOf(UConverter *converter, char byte) {
   ucnv_reset(converter);
   ucnv_toUnicode(converter, &end, units.data() + units.size(), &source, &byte + 1, nullptr, 0,
                  &error);
-  if (U_FAILURE(error)) {
+  if (error == U_INVALID_CHAR_FOUND || error == U_ILLEGAL_CHAR_FOUND ||
+      error == U_ILLEGAL_ESCAPE_SEQUENCE || error == U_UNSUPPORTED_ESCAPE_SEQUENCE) {
     return {"none", "--", {}};
   }
+  requireSuccess(error, "decode");
   if (end != units.data()) {
     return {"character", "", {units.data(), end}};
   }
