@@ -117,10 +117,11 @@ bool convertString2(Search &search, const char *string, int32_t length) {
 
 // The lower-case form gets as many units as its source has and no more, so one that grows fails.
 // The source ends at its first null.
+// `lower` has the length of the source's text.
 UErrorCode toLower(const Search &search, const Utf16Text &source, Utf16Text &lower) {
   std::memset(lower.units.get(), 0, lower.size());
   UErrorCode error = U_ZERO_ERROR;
-  u_strToLower(lower.units.get(), lower.length, source.units.get(), source.lengthToNull(),
+  u_strToLower(lower.units.get(), lower.length, source.units.get(), lower.length,
                search.pLocale->icuLocale, &error);
   return error;
 }
