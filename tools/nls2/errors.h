@@ -67,9 +67,10 @@ inline void requireSuccess(UErrorCode status, const char *what) {
 // that is unknown, or not at all.
 inline std::atomic<bool> ranOutOfMemory = false;
 
-// Throws std::bad_alloc where one has. To be called before an answer is given.
-inline void requireMemory() {
-  if (ranOutOfMemory) {
+// Throws std::bad_alloc where one has, or where the status says so. To be called before an answer is
+// given: what would open must not seem unknown.
+inline void requireMemory(std::error_code status = {}) {
+  if (ranOutOfMemory || status == std::errc::not_enough_memory) {
     throw std::bad_alloc();
   }
 }

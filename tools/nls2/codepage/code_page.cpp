@@ -9,7 +9,6 @@
 #include <algorithm>
 #include <iterator>
 #include <limits>
-#include <new>
 #include <set>
 #include <unicode/unistr.h>
 
@@ -26,10 +25,7 @@ constexpr int32_t fewBytes = 64;
 nls2::converter openNamed(const std::string &name, UErrorCode &status) {
   status = U_ZERO_ERROR;
   nls2::converter opened(name.empty() ? nullptr : ucnv_open(name.c_str(), &status));
-  requireMemory();
-  if (status == U_MEMORY_ALLOCATION_ERROR) {
-    throw std::bad_alloc();
-  }
+  requireMemory(make_status(status));
   return opened;
 }
 
@@ -120,9 +116,7 @@ std::optional<int32_t> pageNumber(const std::string &text) {
 std::optional<std::string> converterOf(int32_t number) {
   std::error_code error;
   std::string name = name_of(nls2::code_page(number), error);
-  if (error == std::errc::not_enough_memory) { // a page that would open must not seem unknown
-    throw std::bad_alloc();
-  }
+  requireMemory(error);
   return error ? std::nullopt : std::optional(std::move(name));
 }
 
@@ -136,10 +130,7 @@ std::optional<std::string> converterOf(const std::string &name) {
 std::optional<int32_t> ccsidOf(const std::string &name) {
   std::error_code error;
   const int32_t number = nls2::code_page::from_name(name, error).number();
-  if (error == std::errc::not_enough_memory) {
-    throw std::bad_alloc();
-  }
-  requireMemory();
+  requireMemory(error);
   return error ? std::nullopt : std::optional(number);
 }
 

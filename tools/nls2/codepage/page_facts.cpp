@@ -6,7 +6,6 @@
 
 #include <algorithm>
 #include <iterator>
-#include <new>
 #include <set>
 
 namespace nls2::tool {
@@ -32,9 +31,7 @@ PageFacts factsOf(int32_t number) {
   PageFacts facts;
   facts.number = number;
   const nls2::converter opened(NLS2_MapCodepageIdToName(number, &facts.twoNulls, &facts.status));
-  if (facts.status == U_MEMORY_ALLOCATION_ERROR) {
-    throw std::bad_alloc(); // a page that would open must not be called one that does not
-  }
+  requireMemory(make_status(facts.status));
   if (opened) {
     facts.opens = true;
     facts.converter = converterOf(number);

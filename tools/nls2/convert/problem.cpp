@@ -2,26 +2,15 @@
 
 #include "convert/problem.h"
 
+#include "codepage/display.h"
 #include "json.h"
 
 #include <array>
-#include <fmt/format.h>
+#include <fmt/core.h>
 
 namespace nls2::tool {
 
 namespace {
-
-// "D0 96"
-std::string hexOf(const Problem &problem) {
-  const auto bytes = problem.found.source_bytes();
-  const std::vector<unsigned char> numbers(bytes.begin(), bytes.end());
-  return fmt::format("{:02X}", fmt::join(numbers, " "));
-}
-
-// "byte FF", "bytes D0 96"
-std::string bytesText(const Problem &problem) {
-  return (problem.found.byte_count == 1 ? "byte " : "bytes ") + hexOf(problem);
-}
 
 std::string codePointText(const Problem &problem) {
   return fmt::format("U+{:04X}", static_cast<uint32_t>(problem.found.code_point));
@@ -46,12 +35,14 @@ Json jsonOf(const Problem &problem) {
                              "not reversible", "short record"};
   const bool hasCharacter =
       problem.kind == ProblemKind::notInPage || problem.kind == ProblemKind::nullInside;
-  return Json::object({{"record", problem.record},
-                       {"byte", problem.byte},
-                       {"column", problem.column + 1},
-                       {"hex", problem.found.byte_count == 0 ? Json() : Json(hexOf(problem))},
-                       {"kind", kinds[static_cast<std::size_t>(problem.kind)]},
-                       {"code_point", hasCharacter ? Json(codePointText(problem)) : Json()}});
+  return Json::object(
+      {{"record", problem.record},
+       {"byte", problem.byte},
+       {"column", problem.column + 1},
+       {"hex",
+        problem.found.byte_count == 0 ? Json() : Json(hexOf(problem.found.source_bytes(), " "))},
+       {"kind", kinds[static_cast<std::size_t>(problem.kind)]},
+       {"code_point", hasCharacter ? Json(codePointText(problem)) : Json()}});
 }
 
 } // namespace
@@ -81,13 +72,12 @@ std::string placeOf(const Problem &problem, std::string_view unit) {
 Explanation explain(const Problem &problem) {
   constexpr std::array limits{"--out-length is", "the width is", "the field has"};
   const nls2::field_result &found = problem.found;
-  const std::string bytes = bytesText(problem);
+  const std::string bytes = bytesText(found.source_bytes());
   const std::string in = fmt::format("code page {}", problem.page);
   switch (problem.kind) {
   case ProblemKind::invalidBytes:
-    return {
-        fmt::format("the {} {} not valid in {}", bytes, found.byte_count == 1 ? "is" : "are", in),
-        "; is that page right? --on-error replace puts a substitution character"};
+    return {notValidText(found.source_bytes(), problem.page),
+            "; is that page right? --on-error replace puts a substitution character"};
   case ProblemKind::notInPage:
     return {fmt::format("the character {}{} is not in {}", codePointText(problem),
                         found.byte_count > 0 ? " (" + bytes + ")" : "", in),

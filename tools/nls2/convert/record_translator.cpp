@@ -3,6 +3,7 @@
 #include "convert/record_translator.h"
 
 #include "codepage/code_page.h"
+#include "codepage/display.h"
 #include "errors.h"
 
 #include <algorithm>
@@ -21,17 +22,6 @@ nls2::field_translator makeTranslator(int32_t from, int32_t to, const nls2::fiel
     throw std::bad_alloc();
   }
   return made;
-}
-
-std::string digitsOf(std::string_view bytes) {
-  constexpr std::string_view digits = "0123456789ABCDEF";
-  std::string text;
-  text.reserve(2 * bytes.size());
-  for (const char byte : bytes) {
-    text += digits[static_cast<unsigned char>(byte) >> 4];
-    text += digits[byte & 15];
-  }
-  return text;
 }
 
 // Quotes the last `length` bytes, a field in UTF-8, as RFC 4180 does where that is needed.
@@ -110,7 +100,7 @@ std::optional<Problem> OutputField::translate(std::string_view record, ByteBuffe
     return {};
   }
   if (spec_.kind == FieldSpec::Kind::hex) {
-    field = digits_ = digitsOf(field);
+    field = digits_ = hexOf(field);
   }
   const std::span<char> room = out.room(forward_->max_size(field.size()));
   const nls2::field_result result = forward_->translate(field, room);

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "codepage/code_page.h"
+#include "codepage/display.h"
 #include "errors.h"
 
 #include <algorithm>
@@ -108,13 +109,8 @@ private:
     UErrorCode error = U_ZERO_ERROR;
     ucnv_getInvalidChars(page_.converter(), bytes, &count, &error);
     const auto length = std::min(static_cast<std::size_t>(U_FAILURE(error) ? 0 : count), consumed);
-    std::string hex;
-    for (const char byte : std::string_view(bytes, length)) {
-      hex += fmt::format(" {:02X}", static_cast<unsigned char>(byte));
-    }
-    return TextFault(fmt::format(", column {}: the byte{}{} {} not valid in code page {}",
-                                 consumed - length + 1, length == 1 ? "" : "s", hex,
-                                 length == 1 ? "is" : "are", page_.number()));
+    return TextFault(fmt::format(", column {}: {}", consumed - length + 1,
+                                 notValidText({bytes, length}, page_.number())));
   }
 
   const CodePage page_;
