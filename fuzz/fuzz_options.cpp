@@ -1,8 +1,8 @@
 // The command line of nls2: the parser over every command's tables, and the list of --fields.
 
+#include "base/options.h"
 #include "checks.h"
-#include "convert/translate.h"
-#include "options.h"
+#include "convert/translate_options.h"
 
 #include <getopt.h>
 #include <vector>

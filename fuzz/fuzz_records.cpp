@@ -1,8 +1,8 @@
 // The readers of records and of lines: whatever is in a file, all of it comes back, in order, cut
 // where it must be.
 
+#include "base/errors.h"
 #include "checks.h"
-#include "errors.h"
 #include "text/record_reader.h"
 
 #include <fcntl.h>

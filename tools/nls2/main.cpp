@@ -1,11 +1,11 @@
 // nls2: the library's work on files, from the command line.
 
-#include "errors.h"
-#include "icu_memory.h"
+#include "base/errors.h"
+#include "base/icu_memory.h"
+#include "base/near_names.h"
+#include "base/options.h"
 #include "io/output_file.h"
-#include "near_names.h"
 #include "nls2.h"
-#include "options.h"
 
 #include <algorithm>
 #include <csignal>

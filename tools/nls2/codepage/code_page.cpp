@@ -2,9 +2,10 @@
 
 #include "codepage/code_page.h"
 
-#include "errors.h"
-#include "near_names.h"
-#include "options.h"
+#include "base/errors.h"
+#include "base/icu_memory.h"
+#include "base/near_names.h"
+#include "base/options.h"
 
 #include <algorithm>
 #include <iterator>

@@ -2,8 +2,8 @@
 // opened once and answers how it writes characters.
 #pragma once
 
+#include "base/options.h"
 #include "nls2/code_page.hpp"
-#include "options.h"
 
 #include <array>
 #include <cstdint>

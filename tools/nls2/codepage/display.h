@@ -1,4 +1,4 @@
-// Bytes and characters for people: hex digits, what prints, and how many columns it takes.
+// Characters for people: what prints, and how many columns it takes.
 #pragma once
 
 #include <cstdint>
@@ -9,29 +9,6 @@
 #include <unicode/unistr.h>
 
 namespace nls2::tool {
-
-// "D096", with something between the bytes "D0 96".
-inline std::string hexOf(std::string_view bytes, std::string_view between = "") {
-  constexpr std::string_view digits = "0123456789ABCDEF";
-  std::string text;
-  text.reserve((2 + between.size()) * bytes.size());
-  for (const char byte : bytes) {
-    text += text.empty() ? "" : between;
-    text += digits[static_cast<unsigned char>(byte) >> 4];
-    text += digits[byte & 15];
-  }
-  return text;
-}
-
-// "byte FF", "bytes D0 96"
-inline std::string bytesText(std::string_view bytes) {
-  return (bytes.size() == 1 ? "byte " : "bytes ") + hexOf(bytes, " ");
-}
-
-inline std::string notValidText(std::string_view bytes, int32_t page) {
-  return fmt::format("the {} {} not valid in code page {}", bytesText(bytes),
-                     bytes.size() == 1 ? "is" : "are", page);
-}
 
 struct Display {
   std::string text; // UTF-8; a dot in place of what does not print

@@ -1,9 +1,9 @@
 // nls2 cat: text files in any encoding as UTF-8 on standard output.
 
+#include "base/options.h"
 #include "codepage/code_page.h"
 #include "io/input_file.h"
 #include "io/output_file.h"
-#include "options.h"
 
 #include <algorithm>
 #include <array>

@@ -1,11 +1,11 @@
 // nls2 codepages: the library's numbers and names of code pages, what is known of one, its chart,
 // and where two differ.
 
+#include "base/options.h"
 #include "codepage/code_page.h"
 #include "codepage/display.h"
-#include "codepage/page_facts.h"
+#include "codepage/page_lookup.h"
 #include "io/output_file.h"
-#include "options.h"
 
 #include <algorithm>
 #include <fmt/format.h>

@@ -1,10 +1,10 @@
 // nls2 detect: which Unicode signatures files begin with.
 
+#include "base/json.h"
+#include "base/options.h"
 #include "io/input_file.h"
 #include "io/output_file.h"
-#include "json.h"
 #include "nls2.h"
-#include "options.h"
 
 #include <algorithm>
 #include <memory>

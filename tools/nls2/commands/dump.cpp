@@ -1,10 +1,10 @@
 // nls2 dump: a file in hex and, side by side, as text of a code page.
 
+#include "base/options.h"
 #include "codepage/code_page.h"
 #include "codepage/display.h"
 #include "io/input_file.h"
 #include "io/output_file.h"
-#include "options.h"
 
 #include <algorithm>
 #include <memory>

@@ -1,9 +1,10 @@
 // nls2 find: the lines in which a text occurs.
 
+#include "base/icu_memory.h"
+#include "base/options.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
 #include "nls2/field_translator.hpp"
-#include "options.h"
 #include "text/decoder.h"
 #include "text/record_reader.h"
 

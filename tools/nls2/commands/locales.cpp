@@ -1,10 +1,10 @@
 // nls2 locales: the library's table of locales, or its records of one name or number.
 
-#include "codepage/page_facts.h"
+#include "base/options.h"
+#include "codepage/page_lookup.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
 #include "nls2/language.hpp"
-#include "options.h"
 
 #include <functional>
 #include <memory>

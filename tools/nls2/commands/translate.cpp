@@ -1,8 +1,8 @@
 // nls2 translate: its options and its help.
 
-#include "convert/translate.h"
+#include "base/options.h"
 #include "codepage/code_page.h"
-#include "options.h"
+#include "convert/translate_options.h"
 
 #include <algorithm>
 #include <fmt/format.h>

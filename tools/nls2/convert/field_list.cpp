@@ -1,8 +1,8 @@
 // The list of --fields.
 
+#include "base/options.h"
 #include "codepage/code_page.h"
-#include "convert/translate.h"
-#include "options.h"
+#include "convert/translate_options.h"
 
 #include <string_view>
 

@@ -2,8 +2,8 @@
 
 #include "convert/problem.h"
 
-#include "codepage/display.h"
-#include "json.h"
+#include "base/json.h"
+#include "base/printable.h"
 
 #include <array>
 #include <fmt/core.h>

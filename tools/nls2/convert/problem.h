@@ -1,7 +1,7 @@
 // What keeps a record from being translated, and how that and a whole run are reported.
 #pragma once
 
-#include "convert/translate.h"
+#include "convert/translate_options.h"
 
 #include <string>
 #include <string_view>

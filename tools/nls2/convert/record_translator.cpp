@@ -2,9 +2,9 @@
 
 #include "convert/record_translator.h"
 
+#include "base/errors.h"
+#include "base/printable.h"
 #include "codepage/code_page.h"
-#include "codepage/display.h"
-#include "errors.h"
 
 #include <algorithm>
 #include <array>

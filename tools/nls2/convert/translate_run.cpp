@@ -1,9 +1,9 @@
 // The work of `nls2 translate`: a file of records, from input to output.
 
+#include "base/errors.h"
 #include "convert/pipeline.h"
 #include "convert/progress.h"
 #include "convert/record_translator.h"
-#include "errors.h"
 #include "io/input_file.h"
 #include "io/output_file.h"
 #include "text/record_reader.h"

@@ -2,7 +2,8 @@
 
 #include "io/input_file.h"
 
-#include "errors.h"
+#include "base/errors.h"
+#include "base/printable.h"
 
 #include <algorithm>
 #include <array>

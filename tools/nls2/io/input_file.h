@@ -6,6 +6,7 @@
 #include <optional>
 #include <string>
 #include <sys/stat.h>
+#include <vector>
 
 namespace nls2::tool {
 
@@ -37,5 +38,10 @@ private:
   const int fd_;
   const int wakeFd_; // becomes readable for good
 };
+
+// The paths of a command that reads standard input where it is given none.
+inline std::vector<std::string> inputsOf(const std::vector<std::string> &given) {
+  return given.empty() ? std::vector<std::string>{"-"} : given;
+}
 
 } // namespace nls2::tool

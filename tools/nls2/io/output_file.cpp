@@ -2,9 +2,10 @@
 
 #include "io/output_file.h"
 
-#include "errors.h"
+#include "base/errors.h"
+#include "base/icu_memory.h"
+#include "base/options.h"
 #include "io/signals.h"
-#include "options.h"
 
 #include <algorithm>
 #include <cerrno>

@@ -2,8 +2,8 @@
 
 #include "locale/locale_option.h"
 
-#include "errors.h"
-#include "near_names.h"
+#include "base/errors.h"
+#include "base/near_names.h"
 #include "nls2/language.hpp"
 
 #include <algorithm>

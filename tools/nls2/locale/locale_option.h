@@ -1,8 +1,8 @@
 // The options --locale and --codepage, and the locale that a command follows without --locale.
 #pragma once
 
+#include "base/options.h"
 #include "codepage/code_page.h"
-#include "options.h"
 
 #include <cstdint>
 #include <optional>

@@ -1,9 +1,9 @@
 // Texts of a code page as UTF-16.
 #pragma once
 
+#include "base/errors.h"
+#include "base/printable.h"
 #include "codepage/code_page.h"
-#include "codepage/display.h"
-#include "errors.h"
 
 #include <algorithm>
 #include <cstdint>
@@ -117,10 +117,5 @@ private:
   const bool isUtf8_;
   std::u16string units_;
 };
-
-// The paths of a command that reads standard input where it is given none.
-inline std::vector<std::string> inputsOf(const std::vector<std::string> &given) {
-  return given.empty() ? std::vector<std::string>{"-"} : given;
-}
 
 } // namespace nls2::tool

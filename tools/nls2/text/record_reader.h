@@ -1,8 +1,8 @@
 // Records of one length, or lines, read in batches of many or one by one.
 #pragma once
 
+#include "base/errors.h"
 #include "codepage/code_page.h"
-#include "errors.h"
 #include "io/byte_buffer.h"
 #include "io/input_file.h"
 

@@ -1,7 +1,8 @@
 // What the library and ICU make of code pages.
 
-#include "codepage/page_facts.h"
+#include "codepage/page_lookup.h"
 
+#include "base/icu_memory.h"
 #include "codepage/code_page.h"
 
 #include <algorithm>

@@ -2,8 +2,6 @@
 // the default locale. So it gets a reserve, enough until requireMemory() ends the command.
 #pragma once
 
-#include "errors.h"
-
 #include <algorithm>
 #include <array>
 #include <atomic>
@@ -11,9 +9,23 @@
 #include <cstdlib>
 #include <cstring>
 #include <malloc.h>
+#include <new>
+#include <system_error>
 #include <unicode/uclean.h>
 
 namespace nls2::tool {
+
+// Whether a request of ICU's for memory has failed. Some of its functions report that as a name
+// that is unknown, or not at all.
+inline std::atomic<bool> ranOutOfMemory = false;
+
+// Throws std::bad_alloc where one has, or where the status says so. To be called before an answer is
+// given: what would open must not seem unknown.
+inline void requireMemory(std::error_code status = {}) {
+  if (ranOutOfMemory || status == std::errc::not_enough_memory) {
+    throw std::bad_alloc();
+  }
+}
 
 namespace icu_memory {
 

@@ -3,14 +3,12 @@
 
 #include "nls2/error.hpp"
 
-#include <atomic>
 #include <cstdint>
 #include <cstdio>
 #include <fmt/core.h>
 #include <new>
 #include <stdexcept>
 #include <string>
-#include <string_view>
 #include <unicode/utypes.h>
 #include <utility>
 
@@ -61,43 +59,6 @@ inline void requireSuccess(UErrorCode status, const char *what) {
   if (U_FAILURE(status)) {
     throw failure("cannot {}: {}", what, statusText(status));
   }
-}
-
-// Whether a request of ICU's for memory has failed. Some of its functions report that as a name
-// that is unknown, or not at all.
-inline std::atomic<bool> ranOutOfMemory = false;
-
-// Throws std::bad_alloc where one has, or where the status says so. To be called before an answer is
-// given: what would open must not seem unknown.
-inline void requireMemory(std::error_code status = {}) {
-  if (ranOutOfMemory || status == std::errc::not_enough_memory) {
-    throw std::bad_alloc();
-  }
-}
-
-// A file name for a message: its control characters are escaped, U+0080 to U+009F too.
-inline std::string printable(std::string_view name) {
-  std::string text;
-  for (std::size_t i = 0; i < name.size(); ++i) {
-    const auto byte = static_cast<unsigned char>(name[i]);
-    const auto next = static_cast<unsigned char>(i + 1 < name.size() ? name[i + 1] : '\0');
-    if (byte == '\n') {
-      text += "\\n";
-    } else if (byte < 0x20 || byte == 0x7F) {
-      text += fmt::format("\\x{:02X}", byte);
-    } else if (byte == 0xC2 && (next & 0xE0) == 0x80) {
-      text += fmt::format("\\xC2\\x{:02X}", next);
-      ++i;
-    } else {
-      text += name[i];
-    }
-  }
-  return text;
-}
-
-// What messages call a file; "-" is a standard stream.
-inline std::string shownName(const std::string &path, const char *stream) {
-  return path == "-" ? stream : path.empty() ? "\"\"" : printable(path);
 }
 
 // A message of the command on standard error. Allocates nothing.

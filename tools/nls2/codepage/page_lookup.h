@@ -1,7 +1,7 @@
 // What the library and ICU make of code pages.
 #pragma once
 
-#include "json.h"
+#include "base/json.h"
 
 #include <cstdint>
 #include <string>

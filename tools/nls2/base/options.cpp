@@ -1,8 +1,8 @@
 // The command line: the parser of options and operands, and --help.
 
-#include "options.h"
+#include "base/options.h"
 
-#include "near_names.h"
+#include "base/near_names.h"
 
 #include <algorithm>
 #include <charconv>

@@ -1,7 +1,8 @@
 // The command line: the commands as tables of options and operands, and the parser that reads them.
 #pragma once
 
-#include "errors.h"
+#include "base/errors.h"
+#include "base/printable.h"
 
 #include <charconv>
 #include <cstddef>

@@ -1,0 +1,59 @@
+// Names and bytes as messages show them.
+#pragma once
+
+#include <cstdint>
+#include <fmt/core.h>
+#include <string>
+#include <string_view>
+
+namespace nls2::tool {
+
+// A file name for a message: its control characters are escaped, U+0080 to U+009F too.
+inline std::string printable(std::string_view name) {
+  std::string text;
+  for (std::size_t i = 0; i < name.size(); ++i) {
+    const auto byte = static_cast<unsigned char>(name[i]);
+    const auto next = static_cast<unsigned char>(i + 1 < name.size() ? name[i + 1] : '\0');
+    if (byte == '\n') {
+      text += "\\n";
+    } else if (byte < 0x20 || byte == 0x7F) {
+      text += fmt::format("\\x{:02X}", byte);
+    } else if (byte == 0xC2 && (next & 0xE0) == 0x80) {
+      text += fmt::format("\\xC2\\x{:02X}", next);
+      ++i;
+    } else {
+      text += name[i];
+    }
+  }
+  return text;
+}
+
+// What messages call a file; "-" is a standard stream.
+inline std::string shownName(const std::string &path, const char *stream) {
+  return path == "-" ? stream : path.empty() ? "\"\"" : printable(path);
+}
+
+// "D096", with something between the bytes "D0 96".
+inline std::string hexOf(std::string_view bytes, std::string_view between = "") {
+  constexpr std::string_view digits = "0123456789ABCDEF";
+  std::string text;
+  text.reserve((2 + between.size()) * bytes.size());
+  for (const char byte : bytes) {
+    text += text.empty() ? "" : between;
+    text += digits[static_cast<unsigned char>(byte) >> 4];
+    text += digits[byte & 15];
+  }
+  return text;
+}
+
+// "byte FF", "bytes D0 96"
+inline std::string bytesText(std::string_view bytes) {
+  return (bytes.size() == 1 ? "byte " : "bytes ") + hexOf(bytes, " ");
+}
+
+inline std::string notValidText(std::string_view bytes, int32_t page) {
+  return fmt::format("the {} {} not valid in code page {}", bytesText(bytes),
+                     bytes.size() == 1 ? "is" : "are", page);
+}
+
+} // namespace nls2::tool

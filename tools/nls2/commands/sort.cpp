@@ -1,0 +1,107 @@
+// nls2 sort: lines or records in the order of a language.
+
+#include "base/options.h"
+#include "io/output_file.h"
+#include "text/record_reader.h"
+#include "text/text_order.h"
+
+#include <cstring>
+#include <endian.h>
+#include <memory>
+#include <memory_resource>
+
+namespace nls2::tool {
+
+namespace {
+
+constexpr const char *notes =
+    R"(The order counts case, accents and punctuation; lines that it holds equal stay in the order of the
+input. Lines end in U+000A as the code page writes it; a last line without it gets one. A line whose
+bytes are not valid in the code page is an error, and nothing is written then. All lines are held in
+memory. OUT may be one of the FILEs.
+)";
+
+struct Arguments {
+  OrderOptions order;
+  std::size_t recordLength = 0;
+  std::vector<std::string> inputs;
+  std::string output = "-";
+};
+
+// A line with its sort key. Most comparisons need the first bytes of the keys only, and those are
+// beside each other.
+struct KeyedLine {
+  uint64_t prefix;   // of the key, in an order that compares as its bytes do
+  const char *bytes; // the key, and after it the line
+  uint32_t keyLength;
+  uint32_t lineLength;
+
+  std::string_view key() const { return {bytes, keyLength}; }
+  std::string_view line() const { return {bytes + keyLength, lineLength}; }
+  bool operator<(const KeyedLine &other) const {
+    return prefix != other.prefix ? prefix < other.prefix : key() < other.key();
+  }
+};
+
+class Lines {
+public:
+  // Keeps copies of both.
+  void add(std::string_view line, std::string_view key) {
+    auto *const bytes = static_cast<char *>(memory_.allocate(key.size() + line.size(), 1));
+    std::copy(line.begin(), line.end(), std::copy(key.begin(), key.end(), bytes));
+    uint64_t prefix = 0;
+    std::memcpy(&prefix, key.data(), std::min(key.size(), sizeof prefix));
+    lines_.push_back({be64toh(prefix), bytes, static_cast<uint32_t>(key.size()),
+                      static_cast<uint32_t>(line.size())});
+  }
+
+  // Lines with equal keys are in the order in which they were added.
+  const std::vector<KeyedLine> &sorted() {
+    std::stable_sort(lines_.begin(), lines_.end());
+    return lines_;
+  }
+
+private:
+  std::pmr::monotonic_buffer_resource memory_{std::size_t{1} << 20};
+  std::vector<KeyedLine> lines_;
+};
+
+int sortFiles(const Arguments &arguments) {
+  TextOrder order(arguments.order);
+  const auto keyOf = [&](std::string_view text) { return order.keyOf(text); };
+  const std::string terminator = arguments.recordLength == 0 ? order.lineFeed() : "";
+  Lines lines;
+  for (const std::string &path : inputsOf(arguments.inputs)) {
+    RecordFile file(path, {.length = arguments.recordLength,
+                           .page = arguments.order.locale.codepage,
+                           .isText = false});
+    while (const auto line = file.next()) {
+      lines.add(line->text, file.apply(*line, keyOf));
+    }
+  }
+  OutputFile output(arguments.output);
+  for (const KeyedLine &each : lines.sorted()) {
+    output.put(each.line());
+    output.put(terminator);
+  }
+  output.commit();
+  return exitDone;
+}
+
+} // namespace
+
+Command sortCommand() {
+  const auto arguments = std::make_shared<Arguments>();
+  return {.operands = {{"FILE", "files to read; standard input if - or not given",
+                        into(arguments->inputs), 0, Operand::anyNumber}},
+          .options = orderOptions(
+              arguments->order,
+              {numberValue("record-length", "N", "sort records of N bytes instead of lines",
+                           arguments->recordLength, 1, 1 << 30),
+               value("output", "OUT", "file to write; standard output if - or not given",
+                     into(arguments->output), 'o')}),
+          .notes = notes,
+          .run = [arguments] { return sortFiles(*arguments); }};
+}
+
+} // namespace nls2::tool
