@@ -1,5 +1,23 @@
-# What all our libraries have in common: the names that they export, the version in their file names,
+# What all our libraries have in common: the names that they export, the version in their file names, and
 # hardened code. A library joins with harden() and export_symbols().
+
+include(CheckCXXCompilerFlag)
+check_cxx_compiler_flag(-fcf-protection ZELNLS2_HAS_CF_PROTECTION) # x86
+check_cxx_compiler_flag(-mbranch-protection=standard ZELNLS2_HAS_BRANCH_PROTECTION) # ARM
+
+# Release builds only: sanitizers replace the same functions, and a debugger is better off without.
+function(harden)
+  foreach(target IN LISTS ARGN)
+    target_compile_options(
+      ${target}
+      PRIVATE $<$<CONFIG:Release>:-fstack-protector-strong>
+              $<$<CONFIG:Release>:-U_FORTIFY_SOURCE>
+              $<$<CONFIG:Release>:-D_FORTIFY_SOURCE=2>
+              $<$<AND:$<CONFIG:Release>,$<BOOL:${ZELNLS2_HAS_CF_PROTECTION}>>:-fcf-protection>
+              $<$<AND:$<CONFIG:Release>,$<BOOL:${ZELNLS2_HAS_BRANCH_PROTECTION}>>:-mbranch-protection=standard>)
+    target_link_options(${target} PRIVATE $<$<CONFIG:Release>:-Wl,-z,relro,-z,now>)
+  endforeach()
+endfunction()
 
 # The Debian package of a library: libzelnls2-0, libzelhost0.
 function(runtime_package variable target)
