@@ -90,7 +90,7 @@ Command generalCommand(const std::string &first) {
             if (entry == nullptr && !topic->empty() && *topic != "help") {
               throw unknownCommand(*topic);
             }
-            return print(helpOn(entry)), exitDone;
+            return print(helpOn(entry));
           }};
 }
 
@@ -100,9 +100,9 @@ int runCommand(const CommandEntry *entry, int argc, char **argv) {
   const Command command = entry != nullptr ? entry->make() : generalCommand(first);
   switch (parse(command, argc - own, argv + own)) {
   case Request::help:
-    return print(helpOn(entry)), exitDone;
+    return print(helpOn(entry));
   case Request::version:
-    return print(fmt::format("{}\n", NLS2_BuildStamp())), exitDone;
+    return print(fmt::format("{}\n", NLS2_BuildStamp()));
   default:
     return command.run();
   }

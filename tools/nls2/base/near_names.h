@@ -8,11 +8,13 @@
 
 namespace nls2::tool {
 
+inline char lowerCase(char letter) {
+  return static_cast<char>(letter + (letter >= 'A' && letter <= 'Z' ? 'a' - 'A' : 0));
+}
+
 // Letters to insert, drop, change, or swap with the next; case does not count.
 inline std::size_t letterDistance(std::string_view a, std::string_view b) {
-  const auto alike = [](char x, char y) {
-    return x == y || (((x ^ y) == 0x20) && (x | 0x20) >= 'a' && (x | 0x20) <= 'z');
-  };
+  const auto alike = [](char x, char y) { return lowerCase(x) == lowerCase(y); };
   std::vector table(a.size() + 1, std::vector<std::size_t>(b.size() + 1));
   for (std::size_t i = 0; i <= a.size(); ++i) {
     for (std::size_t j = 0; j <= b.size(); ++j) {
@@ -29,20 +31,14 @@ inline std::size_t letterDistance(std::string_view a, std::string_view b) {
   return table[a.size()][b.size()];
 }
 
-inline std::string withoutPunctuation(std::string name) {
-  std::erase_if(name, [](char letter) { return letter == '-' || letter == '_' || letter == ' '; });
-  return name;
-}
-
 // Up to three of the known names that are nearest and differ in few letters.
 inline std::vector<std::string> nearNames(const std::string &unknown,
                                           const std::vector<std::string> &known) {
-  const std::string asked = withoutPunctuation(unknown);
-  std::size_t nearest = 1 + asked.size() / 4;
+  std::size_t nearest = 1 + unknown.size() / 4;
   std::vector<std::string> names;
   for (const std::string &name : known) {
-    const std::size_t letters = letterDistance(asked, withoutPunctuation(name));
-    if (letters > nearest || 2 * letters >= std::max(asked.size(), name.size()) ||
+    const std::size_t letters = letterDistance(unknown, name);
+    if (letters > nearest || 2 * letters >= std::max(unknown.size(), name.size()) ||
         std::ranges::find(names, name) != names.end()) {
       continue;
     }

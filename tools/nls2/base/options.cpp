@@ -5,7 +5,6 @@
 #include "base/near_names.h"
 
 #include <algorithm>
-#include <charconv>
 #include <getopt.h>
 #include <utility>
 
@@ -94,7 +93,9 @@ void checkOperands(const Command &command, int count, char **operands) {
   auto left = static_cast<std::size_t>(count);
   const Operand *missing = nullptr;
   for (const Operand &operand : command.operands) {
-    missing = missing == nullptr && left < operand.least ? &operand : missing;
+    if (missing == nullptr && left < operand.least) {
+      missing = &operand;
+    }
     left -= std::min(left, operand.most);
   }
   if (left > 0) {
@@ -174,15 +175,6 @@ std::string helpOf(const CommandEntry &entry, const Command &command) {
   }
   text += optionLine(helpOption) + optionLine(versionOption) + "\n";
   return text + command.notes + "See nls2(1).\n";
-}
-
-std::optional<uint32_t> wholeNumber(const std::string &text) {
-  const bool hexadecimal = text.starts_with("0x") || text.starts_with("0X");
-  const char *start = text.data() + (hexadecimal ? 2 : 0);
-  const char *end = text.data() + text.size();
-  uint32_t number = 0;
-  const auto [stop, error] = std::from_chars(start, end, number, hexadecimal ? 16 : 10);
-  return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
 }
 
 } // namespace nls2::tool

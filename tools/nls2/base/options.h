@@ -91,26 +91,27 @@ Request parse(const Command &command, int argc, char **argv);
 std::string helpOf(const CommandEntry &entry, const Command &command);
 std::string helpLine(const std::string &what, const char *help);
 
-// Nothing where the text is not a decimal number of that type, to its end.
-template <typename Number>
-std::optional<Number> decimalNumber(std::string_view text) {
+// A number, decimal (never octal) or 0x...; nothing if the text is anything else.
+template <typename Number = uint32_t>
+std::optional<Number> wholeNumber(std::string_view text) {
+  const bool isHex = text.starts_with("0x") || text.starts_with("0X");
+  text.remove_prefix(isHex ? 2 : 0);
   Number number = 0;
   const char *end = text.data() + text.size();
-  const auto [stop, error] = std::from_chars(text.data(), end, number);
+  const auto [stop, error] = std::from_chars(text.data(), end, number, isHex ? 16 : 10);
   return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
 }
 
-// Values. `option` is what messages name.
+// Throws usageError, which names the option.
 template <typename Number>
 Number parseNumber(const char *option, const std::string &text, Number least, Number most) {
-  const auto number = decimalNumber<Number>(text);
+  const auto number = wholeNumber<Number>(text);
   if (!number || *number < least || *number > most) {
     throw usageError("{}: \"{}\" is not a number from {} to {}", option, printable(text), least,
                      most);
   }
   return *number;
 }
-std::optional<uint32_t> wholeNumber(const std::string &text); // decimal or 0x...; never octal
 
 template <typename Number>
 Option numberValue(const char *name, const char *metavar, const char *help, Number &number,

@@ -8,16 +8,12 @@
 #include "base/options.h"
 
 #include <algorithm>
-#include <iterator>
-#include <limits>
 #include <set>
 #include <unicode/unistr.h>
 
 namespace nls2::tool {
 
 namespace {
-
-constexpr int32_t mostNumber = std::numeric_limits<int32_t>::max();
 
 // Enough for some characters of any page, with its signature and its shifts.
 constexpr int32_t fewBytes = 64;
@@ -92,27 +88,12 @@ std::vector<std::string> allPageNames() {
   return names;
 }
 
-// The number that an option's text is; nothing where it is a name. Throws usageError.
-std::optional<int32_t> givenNumber(const char *option, const std::string &text) {
-  const std::string digits = text.substr(text.starts_with("-") ? 1 : 0);
-  if (!digits.empty() && digits.find_first_not_of("0123456789") == std::string::npos) {
-    return parseNumber(option, text, std::numeric_limits<int32_t>::min(), mostNumber);
-  }
-  return pageNumber(text); // 0x...
-}
-
 Error unknownPage(const char *option, const std::string &text) {
   return usageError("{}: unknown code page {}{}; `nls2 codepages --names` lists names", option,
                     text.empty() ? "\"\"" : printable(text), nearPages(text));
 }
 
 } // namespace
-
-std::optional<int32_t> pageNumber(const std::string &text) {
-  const auto number = wholeNumber(text);
-  return number && *number <= mostNumber ? std::optional(static_cast<int32_t>(*number))
-                                         : std::nullopt;
-}
 
 std::optional<std::string> converterOf(int32_t number) {
   std::error_code error;
@@ -152,25 +133,18 @@ std::set<std::string> namesWithNumbers() {
 }
 
 std::string nearPages(const std::string &asked) {
-  if (decimalNumber<int64_t>(asked)) {
-    const auto page = windowsPage("windows-" + asked);
-    return page ? didYouMean({std::to_string(*page)}) : "";
+  if (!wholeNumber<int32_t>(asked)) {
+    return didYouMean(nearNames(asked, allPageNames()));
   }
-  std::vector<std::string> known = allPageNames();
-  for (std::size_t i = 0, names = known.size(); i < names; ++i) {
-    if (known[i].starts_with("ibm-") && decimalNumber<int32_t>(known[i].substr(4))) {
-      known.push_back(known[i].substr(4));
-    }
-  }
-  std::ranges::transform(pagesWithNames, std::back_inserter(known),
-                         [](int32_t number) { return std::to_string(number); });
-  return didYouMean(nearNames(asked, known));
+  const auto page = windowsPage("windows-" + asked);
+  return page ? didYouMean({std::to_string(*page)}) : "";
 }
 
 int32_t parsePage(const char *option, const std::string &text) {
-  auto number = givenNumber(option, text);
-  number = number ? number : numberOf(text);
-  if (number) {
+  if (const auto number = wholeNumber<int32_t>(text)) {
+    return *number;
+  }
+  if (const auto number = numberOf(text)) {
     return *number;
   }
   if (const auto meanings = meaningsOf(text); !meanings.empty()) {
@@ -186,7 +160,7 @@ int32_t parsePage(const char *option, const std::string &text) {
 }
 
 converter openEncoding(const char *option, const std::string &text) {
-  if (const auto number = givenNumber(option, text)) {
+  if (const auto number = wholeNumber<int32_t>(text)) {
     return CodePage(*number, option).take();
   }
   UErrorCode error = U_ZERO_ERROR;

@@ -21,9 +21,6 @@ inline constexpr std::array<int32_t, 25> pagesWithNames{
     874,   932,   936,   949,   950,   1200,  1208,  57352, 57355, 57356, 57357, 57358, 57359,
     57360, 57361, 57362, 57363, 57365, 57366, 57367, 57368, 57369, 57370, 57371, 57372};
 
-// The number that the text is, where the library may open it.
-std::optional<int32_t> pageNumber(const std::string &text);
-
 // ICU's canonical name of what the library opens for a number, or ICU for a name; nothing where it
 // does not open, or has no name.
 std::optional<std::string> converterOf(int32_t number);

@@ -102,7 +102,8 @@ std::vector<int32_t> numbersOf(const std::string &name) {
     add(static_cast<int32_t>(windows));
   }
   for (const std::string prefix : prefixes) {
-    const auto inside = pageNumber(name.starts_with(prefix) ? name.substr(prefix.size()) : "");
+    const auto inside =
+        wholeNumber<int32_t>(name.starts_with(prefix) ? name.substr(prefix.size()) : "");
     add(inside && converterOf(*inside) ? inside : std::nullopt);
   }
   if (const auto converter = converterOf(name); numbers.empty() && converter) {
@@ -155,18 +156,17 @@ Answer describePage(int32_t number) {
 
 Answer lookUpPage(const std::string &asked) {
   std::string name = asked;
-  if (const auto given = wholeNumber(asked)) {
-    const auto number = pageNumber(asked);
-    const auto *listed = std::ranges::find(pagesWithNames, number);
-    if (number && (listed != pagesWithNames.end() || converterOf(*number))) {
+  if (const auto number = wholeNumber<int32_t>(asked)) {
+    if (std::ranges::find(pagesWithNames, *number) != pagesWithNames.end() ||
+        converterOf(*number)) {
       return describe({*number}, namesOf(*number));
     }
-    name = fmt::format("windows-{}", *given);
+    name = fmt::format("windows-{}", *number);
     if (!windowsPage(name)) {
       throw failure(
           "code page {} is unknown: it is not one of the library's numbers, and ICU has no "
           "converter for it as a CCSID",
-          *given);
+          *number);
     }
   }
   const auto numbers = name.empty() ? std::vector<int32_t>() : numbersOf(name);

@@ -175,9 +175,7 @@ Command codepagesCommand() {
                            into(arguments->asNames)),
                       flag("json", "write JSON", into(arguments->asJson))},
           .notes = notes,
-          .run = [arguments] {
-            return print(answer(*arguments).rendered(arguments->asJson)), exitDone;
-          }};
+          .run = [arguments] { return print(answer(*arguments).rendered(arguments->asJson)); }};
 }
 
 } // namespace nls2::tool

@@ -53,7 +53,7 @@ std::pair<const char *, Records> lookUp(const std::string &asked) {
   }
   throw failure("no locale has the {} {}{}; `nls2 locales` lists them all",
                 number ? "language id or code page" : "locale name or short name", printable(asked),
-                number ? "" : localesNear(asked));
+                number ? "" : localeNear(asked));
 }
 
 // The records' code pages, each once.
@@ -114,9 +114,7 @@ Command localesCommand() {
                     into(arguments->asked)}},
       .options = {flag("json", "write JSON", into(arguments->asJson))},
       .notes = notes,
-      .run = [arguments] {
-        return print(answer(arguments->asked).rendered(arguments->asJson)), exitDone;
-      }};
+      .run = [arguments] { return print(answer(arguments->asked).rendered(arguments->asJson)); }};
 }
 
 } // namespace nls2::tool

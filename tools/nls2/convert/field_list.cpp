@@ -12,11 +12,6 @@ namespace {
 
 constexpr std::size_t longest = std::size_t{1} << 30;
 
-std::optional<std::size_t> lengthIn(std::string_view text) {
-  const auto number = decimalNumber<std::size_t>(text);
-  return number && *number <= longest ? number : std::nullopt;
-}
-
 // Cuts off what follows the separator; nothing where there is none.
 std::optional<std::string_view> cut(std::string_view &text, char separator) {
   const std::size_t at = text.find(separator);
@@ -41,8 +36,9 @@ FieldSpec parseField(std::string_view piece, const TranslateOptions &options) {
   FieldSpec field;
   field.from = options.from;
   if (width) {
-    field.width = lengthIn(*width).value_or(0);
-    require(field.width != 0, "the width must be a number from 1 to 1073741824");
+    field.width = wholeNumber<std::size_t>(*width).value_or(0);
+    require(field.width != 0 && field.width <= longest,
+            "the width must be a number from 1 to 1073741824");
   }
   if (kind == "raw" || kind == "hex") {
     field.kind = kind == "raw" ? FieldSpec::Kind::raw : FieldSpec::Kind::hex;
@@ -51,8 +47,8 @@ FieldSpec parseField(std::string_view piece, const TranslateOptions &options) {
     field.from = parsePage(who.c_str(), std::string(*kind));
     const CodePage opens(field.from, who.c_str());
   }
-  const auto first = lengthIn(piece);
-  const auto end = last ? lengthIn(*last) : std::nullopt;
+  const auto first = wholeNumber<std::size_t>(piece);
+  const auto end = wholeNumber<std::size_t>(last.value_or(""));
   require(first && end, "a field is START-END[=KIND][:WIDTH]");
   require(*first != 0, "bytes are counted from 1");
   require(*end >= *first, "the range is empty");

@@ -7,16 +7,16 @@
 #include "base/options.h"
 #include "io/signals.h"
 
+#include <acl/libacl.h>
 #include <algorithm>
+#include <attr/libattr.h>
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
 #include <fcntl.h>
 #include <filesystem>
-#include <linux/limits.h>
 #include <poll.h>
 #include <sys/stat.h>
-#include <sys/xattr.h>
 #include <unistd.h>
 #include <utility>
 
@@ -33,18 +33,15 @@ std::string directoryOf(const std::string &path) {
   return parent.empty() ? "." : parent.string();
 }
 
-// The number in /proc/self/fd/NUMBER, to which /dev/stdout, /dev/fd/NUMBER and links of users lead.
-// What lies behind that number is not looked at.
-std::optional<int> descriptorOf(fs::path path) {
-  const std::string ours = fmt::format("/proc/{}/", getpid());
-  std::error_code error;
-  for (int links = 0; links < 40 && !error; ++links) {
-    const fs::path directory = directoryOf(path);
-    const std::string real = fs::canonical(directory, error);
-    if (real.starts_with(ours) && real.ends_with("/fd")) {
-      return decimalNumber<int>(path.filename().native());
+// The number that a name of an open descriptor gives.
+std::optional<int> descriptorOf(std::string_view path) {
+  if (path == "/dev/stdout" || path == "/dev/stderr") {
+    return path == "/dev/stdout" ? STDOUT_FILENO : STDERR_FILENO;
+  }
+  for (const std::string_view directory : {"/dev/fd/", "/proc/self/fd/"}) {
+    if (path.starts_with(directory)) {
+      return wholeNumber<int>(path.substr(directory.size()));
     }
-    path = directory / fs::read_symlink(path, error);
   }
   return {};
 }
@@ -58,48 +55,26 @@ bool isOthersInStickyDirectory(const std::string &path, const struct stat &exist
          geteuid() != 0 && geteuid() != existing.st_uid && geteuid() != directory.st_uid;
 }
 
-// No attribute, and no list of their names, is longer; nothing where it cannot be read.
-template <typename Get>
-std::optional<std::string> attributeBytes(Get get) {
-  std::string bytes(XATTR_LIST_MAX, '\0');
-  const ssize_t length = get(bytes.data(), bytes.size());
-  bytes.resize(static_cast<std::size_t>(std::max<ssize_t>(length, 0)));
-  return length >= 0 ? std::optional(bytes) : std::nullopt;
-}
-
-std::optional<std::string> valueOf(const std::string &path, const char *name) {
-  return attributeBytes(
-      [&](char *buffer, std::size_t size) { return getxattr(path.c_str(), name, buffer, size); });
-}
-
-// The owner first, since a change of owner takes mode bits away. Only the superuser may give a file
-// away; its group may still be one of the caller's.
-//
-// Where an access list is, the mode's group bits are its mask, which may allow more than the list
-// allows the group. A file that cannot have the list is therefore the owner's alone. A list that
-// the directory gave to the new file goes where the old one had none.
-//
-// Capabilities are for the program that the old file was. Others that cannot be set are left out.
-void copyAttributes(int fd, const std::string &target, const struct stat &existing) {
-  constexpr std::string_view accessList = "system.posix_acl_access";
+// The owner first, because a change of owner clears mode bits. Only the superuser may give a file
+// away, but its group may still be one of the caller's. Capabilities are not copied, since the
+// contents change. Attributes that cannot be read or set are skipped.
+void copyAttributes(int fd, const std::string &path, const std::string &target,
+                    const struct stat &existing) {
   if (fchown(fd, existing.st_uid, existing.st_gid) != 0 &&
       fchown(fd, static_cast<uid_t>(-1), existing.st_gid) != 0 && errno != EPERM) {
     throw failure("cannot keep the file's owner: {}", std::strerror(errno));
   }
-  fremovexattr(fd, accessList.data());
-  const bool hasList = valueOf(target, accessList.data()).has_value();
-  if (fchmod(fd, existing.st_mode & (hasList ? 0700 : 0777)) != 0) {
+  if (perm_copy_file(target.c_str(), path.c_str(), nullptr) != 0) {
     throw failure("cannot keep the file's permissions: {}", std::strerror(errno));
   }
-  const auto list = attributeBytes(
-      [&](char *buffer, std::size_t size) { return listxattr(target.c_str(), buffer, size); });
-  const std::string names = list.value_or("");
-  for (const char *name = names.c_str(); *name != '\0'; name += std::strlen(name) + 1) {
-    if (std::string_view(name) != "security.capability") {
-      if (const auto value = valueOf(target, name)) {
-        static_cast<void>(fsetxattr(fd, name, value->data(), value->size(), 0));
-      }
-    }
+  const int old = open(target.c_str(), O_RDONLY | O_CLOEXEC);
+  if (old >= 0) {
+    const auto isWanted = [](const char *name, error_context *context) {
+      return static_cast<int>(attr_copy_check_permissions(name, context) != 0 &&
+                              std::strcmp(name, "security.capability") != 0);
+    };
+    attr_copy_fd(target.c_str(), old, path.c_str(), fd, isWanted, nullptr);
+    close(old);
   }
 }
 
@@ -169,7 +144,7 @@ void OutputFile::replaceFile(const std::string &path) {
                   name_);
   }
   openTemporary(0600);
-  copyAttributes(fd_, target_, file_);
+  copyAttributes(fd_, temporary_.empty() ? ownPath(fd_) : temporary_, target_, file_);
 }
 
 // File systems without unnamed files, and systems without /proc, get a name at once.
@@ -291,11 +266,12 @@ void OutputFile::commit(bool sync) {
   }
 }
 
-void print(std::string_view text) {
+int print(std::string_view text) {
   requireMemory();
   OutputFile out("-");
   out.write(text);
   out.commit();
+  return exitDone;
 }
 
 } // namespace nls2::tool

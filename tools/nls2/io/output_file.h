@@ -55,7 +55,7 @@ private:
   int fd_ = -1;
 };
 
-// Writes all of the text to standard output at once. Throws Error.
-void print(std::string_view text);
+// Writes all of the text to standard output at once, and returns exitDone. Throws Error.
+int print(std::string_view text);
 
 } // namespace nls2::tool

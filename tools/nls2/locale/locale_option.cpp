@@ -8,7 +8,6 @@
 
 #include <algorithm>
 #include <cstdlib>
-#include <set>
 #include <string_view>
 #include <unicode/locid.h>
 #include <utility>
@@ -115,7 +114,7 @@ std::string parseLocale(const std::string &text) {
   if (known.empty()) {
     throw usageError("--locale: \"{}\" is not a known locale{}; `nls2 locales` lists names and "
                      "language ids",
-                     printable(text), localesNear(text));
+                     printable(text), localeNear(text));
   }
   return known;
 }
@@ -132,19 +131,9 @@ std::pair<const char *, std::string> environmentLocale() {
 
 } // namespace
 
-// The language's locale first, then names of similar spelling.
-std::string localesNear(const std::string &name) {
-  std::set<std::string> known;
-  for (const LocaleMapEntry &entry : locale_records()) {
-    known.insert({entry.localeName, entry.shortName});
-  }
-  std::vector<std::string> names =
-      nearNames(withoutSuffixes(name), std::vector(known.begin(), known.end()));
-  if (const std::string ofLanguage = localeOfLanguage(name); !ofLanguage.empty()) {
-    std::erase(names, ofLanguage);
-    names.insert(names.begin(), ofLanguage);
-  }
-  return didYouMean(names);
+std::string localeNear(const std::string &name) {
+  const std::string ofLanguage = localeOfLanguage(name);
+  return ofLanguage.empty() ? "" : didYouMean({ofLanguage});
 }
 
 std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own) {
@@ -167,7 +156,7 @@ std::string orderLocale(const LocaleOptions &options) {
   if (locale.empty()) {
     throw usageError(
         "{}: \"{}\" is not a known locale{}; give --locale one of those that `nls2 locales` lists",
-        variable, printable(name), localesNear(name));
+        variable, printable(name), localeNear(name));
   }
   return locale;
 }

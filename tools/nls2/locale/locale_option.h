@@ -19,7 +19,7 @@ struct LocaleOptions {
 };
 
 // " (did you mean de_DE?)" for a name that is not in the table.
-std::string localesNear(const std::string &name);
+std::string localeNear(const std::string &name);
 
 // The two options, and after them a command's own.
 std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own);

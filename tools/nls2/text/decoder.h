@@ -71,12 +71,16 @@ public:
       std::copy(bytes.begin(), bytes.end(), units_.begin());
       return {units_.data(), bytes.size()};
     }
-    UErrorCode error = isUtf8_ ? U_ZERO_ERROR : U_UNSUPPORTED_ERROR; // which makes it do nothing
-    int32_t length = 0;
-    u_strFromUTF8(units_.data(), static_cast<int32_t>(units_.size()), &length, bytes.data(),
-                  static_cast<int32_t>(bytes.size()), &error);
-    return U_SUCCESS(error) ? std::u16string_view(units_.data(), static_cast<std::size_t>(length))
-                            : convert(bytes);
+    if (isUtf8_) {
+      UErrorCode error = U_ZERO_ERROR;
+      int32_t length = 0;
+      u_strFromUTF8(units_.data(), static_cast<int32_t>(units_.size()), &length, bytes.data(),
+                    static_cast<int32_t>(bytes.size()), &error);
+      if (U_SUCCESS(error)) {
+        return {units_.data(), static_cast<std::size_t>(length)};
+      }
+    }
+    return convert(bytes);
   }
 
   bool isUtf8() const { return isUtf8_; }
