@@ -117,7 +117,7 @@ enum {
 typedef struct NLS2F_PageFacts {
   uint32_t size;
   int32_t number;       /* a number that opens the same table: ICU's CCSID if it does, else the
-                           least of the library's own; 0 if none does */
+                           least that does; 0 if none does */
   int32_t kind;         /* NLS2F_PAGE_... */
   int32_t hasStates;    /* 1: what a byte means depends on those before it (shifts, modes) */
   int32_t hasSignature; /* 1: a text begins with a byte-order mark */
