@@ -6,15 +6,14 @@
 #include "nls2.h"
 #include "trace/bounded_text.h"
 #include "trace/frame.h"
+#include "trace/memory.h"
 #include "trace/status.h"
 
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <cstdlib>
 #include <cstring>
-#include <memory>
-#include <new>
-#include <optional>
 #include <unicode/localpointer.h>
 #include <unicode/ucnv.h>
 
@@ -28,69 +27,60 @@ using nls2::trace::low32;
 
 constexpr const char *utf8 = "utf-8";
 
-// What a length says need not lie in the buffer it belongs to, so no pointer arithmetic here: ICU
-// compares the addresses and refuses what does not fit.
+std::uintptr_t addressOf(const void *pointer) { return reinterpret_cast<std::uintptr_t>(pointer); }
+
+// A length may reach beyond its buffer, so this adds addresses: ICU compares them and refuses what
+// does not fit.
 template <class Pointer>
 Pointer limitOf(Pointer start, int32_t length) {
-  return reinterpret_cast<Pointer>(reinterpret_cast<std::uintptr_t>(start) +
-                                   static_cast<std::uintptr_t>(std::intptr_t{length}));
+  return reinterpret_cast<Pointer>(addressOf(start) + static_cast<std::uintptr_t>(length));
 }
 
-struct Ranges {
-  char *output;
-  char *outputLimit;
-  const char *input;
-  const char *inputLimit;
-};
-
-// The result is how far the output's end is from the input's.
-int32_t convert(UConverter *to, UConverter *from, Ranges &ranges, UErrorCode &error) {
-  ucnv_convertEx(to, from, &ranges.output, ranges.outputLimit, &ranges.input, ranges.inputLimit,
-                 nullptr, nullptr, nullptr, nullptr, true, true, &error);
-  return static_cast<int32_t>(reinterpret_cast<std::intptr_t>(ranges.output) -
-                              reinterpret_cast<std::intptr_t>(ranges.input));
-}
-
-// UTF-8 to UTF-8 in a copy of the source, of which the output before the limit goes back: where
-// bytes that are not valid grow to U+FFFD and the output overtakes the input, ICU writes up to 4
-// bytes past the limit. No result if ICU is to refuse the ranges, or without memory for a copy.
-std::optional<int32_t> convertUtf8InCopy(UConverter *to, UConverter *from, const Ranges &ranges,
-                                         UErrorCode &error) {
-  constexpr std::size_t overrun = 16;
-  constexpr std::uintptr_t longest = INT32_MAX;
-  const auto start = reinterpret_cast<std::uintptr_t>(ranges.input);
-  const auto size = reinterpret_cast<std::uintptr_t>(ranges.inputLimit) - start;
-  const auto given = reinterpret_cast<std::uintptr_t>(ranges.outputLimit) - start;
-  if (size > longest || given > longest) {
-    return std::nullopt;
-  }
-  const std::size_t room = std::min(given, 3 * size + 1); // enough for U+FFFD a byte
-  const std::size_t bytes = std::max(room, size) + overrun;
-  const std::unique_ptr<char[]> copy(new (std::nothrow) char[bytes]);
-  if (!copy) {
-    return std::nullopt;
-  }
-  std::memset(std::copy_n(ranges.input, size, copy.get()), 0, bytes - size);
-  Ranges inCopy{copy.get(), copy.get() + room, copy.get(), copy.get() + size};
-  const int32_t distance = convert(to, from, inCopy, error);
-  // ICU puts a null after the output.
-  const auto written =
-      static_cast<std::size_t>(inCopy.output - copy.get()) + (failed(error) ? 0 : 1);
-  std::copy_n(copy.get(), std::min(written, room), ranges.output);
-  return distance;
+// How long a range is; negative if ICU refuses it.
+int64_t rangeLength(const char *start, const char *limit) {
+  const bool refused = start == nullptr || addressOf(limit) < addressOf(start) ||
+                       addressOf(limit) - addressOf(start) > INT32_MAX;
+  return refused ? -1 : static_cast<int64_t>(addressOf(limit) - addressOf(start));
 }
 
 // Converts from the source to the source: the output starts where the input does and may go on to
-// dest + dlen.
+// dest + dlen. The result is how far the output's end is from the input's.
+//
+// From UTF-8 to UTF-8 ICU works in a copy, of which the output goes back: as invalid bytes grow to
+// U+FFFD, the output overtakes the input, and ICU writes up to 4 bytes past the limit. Without
+// memory for a copy it works in the caller's buffer.
 int32_t convertInPlace(UConverter *to, UConverter *from, char *dest, int32_t dlen, const char *src,
                        int32_t slen, UErrorCode &error) {
-  Ranges ranges{const_cast<char *>(src), limitOf(dest, dlen), src, limitOf(src, slen)};
-  if (ucnv_getType(to) == UCNV_UTF8 && ucnv_getType(from) == UCNV_UTF8) {
-    if (const auto distance = convertUtf8InCopy(to, from, ranges, error)) {
-      return *distance;
-    }
+  constexpr int64_t overrun = 16;
+  char *const begin = const_cast<char *>(src);
+  char *output = begin;
+  char *outputLimit = limitOf(dest, dlen);
+  const char *input = src;
+  const char *inputLimit = limitOf(src, slen);
+  int64_t room = rangeLength(begin, outputLimit);
+  // No byte makes less than a byte of output, so what the room cannot hold need not be copied.
+  const int64_t size = std::min(rangeLength(src, inputLimit), room + overrun);
+  nls2::trace::Block<char> copy;
+  if (room >= 0 && size >= 0 && ucnv_getType(to) == UCNV_UTF8 && ucnv_getType(from) == UCNV_UTF8) {
+    room = std::min(room, 3 * size + 1); // enough for U+FFFD a byte
+    copy.reset(
+        static_cast<char *>(std::malloc(static_cast<std::size_t>(std::max(room, size) + overrun))));
   }
-  return convert(to, from, ranges, error);
+  if (copy) {
+    std::memcpy(copy.get(), src, static_cast<std::size_t>(size));
+    output = copy.get();
+    outputLimit = output + room;
+    input = output;
+    inputLimit = output + size;
+  }
+  ucnv_convertEx(to, from, &output, outputLimit, &input, inputLimit, nullptr, nullptr, nullptr,
+                 nullptr, true, true, &error);
+  if (copy) {
+    // ICU puts a null after the output.
+    const int64_t written = output - copy.get() + (failed(error) ? 0 : 1);
+    std::memcpy(begin, copy.get(), static_cast<std::size_t>(std::min(written, room)));
+  }
+  return static_cast<int32_t>(addressOf(output) - addressOf(input));
 }
 
 } // namespace

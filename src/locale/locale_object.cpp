@@ -69,12 +69,13 @@ NLS2_Locale *NLS2_allocateLocale(int32_t *pStatus) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_allocateLocale");
   Frame frame(anchor);
   *pStatus = U_ZERO_ERROR;
-  auto *pLocale = static_cast<NLS2_Locale *>(std::calloc(1, sizeof(NLS2_Locale)));
+  auto *pLocale = static_cast<NLS2_Locale *>(std::malloc(sizeof(NLS2_Locale)));
   if (pLocale == nullptr) {
     NLS2_TRACE(frame, "Error allocating memory");
     *pStatus = NLS2_ERR_NO_MEMORY;
     return nullptr;
   }
+  std::memset(pLocale, 0, sizeof *pLocale);
   NLS2_TRACE(frame, "Preparing to initialize Locale structure.");
   const int32_t status = NLS2_initLocaleObject(pLocale);
   if (failed(status)) {

@@ -15,7 +15,8 @@ std::string inPlace(const Words &w) {
   int32_t status = 99;
   const int32_t result =
       function(w.object(0), w.text(1) + w.number(3), w.number(4), w.text(1), w.number(2), &status);
-  return shown(result) + ", " + shown(status) + ", " + shown(std::string(w.text(1), w[1].size()));
+  const std::string text = w.text(1) ? std::string(w.text(1), w[1].size()) : "null";
+  return shown(result) + ", " + shown(status) + ", " + shown(text);
 }
 
 // The lengths of all first bytes, where one differs from that of the byte before.

@@ -47,6 +47,7 @@ void apply(Settings &settings, const std::string &key, const std::string &value)
     Fault fault{key, 0};
     int error = fault.error;
     words >> fault.nth >> error;
+    fault.nth = value == "object" ? static_cast<long>(sizeof(NLS2_Locale)) : fault.nth;
     fault.error = static_cast<UErrorCode>(words.fail() ? fault.error : error);
     settings.world.faults.push_back(fault);
   }

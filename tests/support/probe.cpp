@@ -3,7 +3,6 @@
 
 #include "support/probe.h"
 
-#include "nls2.h"
 #include "support/recording_host.h"
 
 #include <algorithm>
@@ -157,7 +156,6 @@ extern "C" const char *ucnv_getDefaultName() {
 // Under their other names: dlsym may allocate itself.
 // NOLINTBEGIN(bugprone-reserved-identifier,readability-identifier-naming)
 extern "C" void *__libc_malloc(std::size_t size) noexcept;
-extern "C" void *__libc_calloc(std::size_t count, std::size_t size) noexcept;
 extern "C" void *__libc_realloc(void *block, std::size_t size) noexcept;
 extern "C" void __libc_free(void *block) noexcept;
 // NOLINTEND(bugprone-reserved-identifier,readability-identifier-naming)
@@ -171,11 +169,6 @@ static bool refuses(const char *function, std::size_t size) {
 
 HEAP void *malloc(std::size_t size) noexcept {
   return refuses("malloc", size) ? nullptr : __libc_malloc(size);
-}
-
-HEAP void *calloc(std::size_t count, std::size_t size) noexcept {
-  const bool refused = size == sizeof(NLS2_Locale) && refuses("calloc", count);
-  return refused ? nullptr : __libc_calloc(count, size);
 }
 
 HEAP void *realloc(void *block, std::size_t size) noexcept {

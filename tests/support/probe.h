@@ -25,7 +25,7 @@ constexpr std::size_t canaries = 8;
 #endif
 
 // The nth call of a function of ICU's fails with `error`. Of the heap's functions, "realloc" and
-// "malloc" fail for every block of n bytes, "calloc" for locale objects.
+// "malloc" fail for every block of n bytes; "object" stands for those of a locale object.
 struct Fault {
   std::string function;
   long nth;
