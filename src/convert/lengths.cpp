@@ -65,8 +65,9 @@ int32_t NLS2_ConversionRatio(const NLS2_Locale *pDestinationLocale,
     *pStatus = status;
     return frame.result(1);
   }
-  const int32_t ratio =
-      ratioOf(ucnv_getMaxCharSize(destination.getAlias()), ucnv_getMaxCharSize(source.getAlias()));
+  const int32_t destSize = ucnv_getMaxCharSize(destination.getAlias());
+  const int32_t sourceSize = ucnv_getMaxCharSize(source.getAlias());
+  const int32_t ratio = ratioOf(destSize, sourceSize);
   NLS2_TRACE(frame, "Computed ratio is %d.", ratio);
   return frame.result(ratio > 0 ? ratio : 1);
 }
