@@ -6,10 +6,10 @@
 
 #include <stdio.h>
 
-/* Says what failed, if it did. */
+/* Reports what failed, if it did. */
 static int failed(const char *what, int32_t status) {
   if (status > 0) {
-    fprintf(stderr, "%s: %s (%d)\n", what, u_errorName((UErrorCode)status), (int)status);
+    fprintf(stderr, "%s: %s (%d)\n", what, nls2_status_name(status), (int)status);
   }
   return status > 0;
 }

@@ -16,8 +16,8 @@
  *     exceptions) and the library's language number in the lower 16. localeMap holds them all.
  *  5. A status is a signed 32-bit word: 0 is success, a positive value a failure, a negative value
  *     an ICU warning and therefore a success. Values 32 and 36 to 39 are this library's
- *     (NLS2_ERR_*), all others are ICU's UErrorCode, passed on unchanged; u_errorName() names
- *     those.
+ *     (NLS2_ERR_*), all others are ICU's UErrorCode, passed on unchanged. nls2_status_name() names
+ *     both.
  *  6. A status comes back in one of two ways: stored through a last argument pStatus, with a result
  *     of 0 or null on failure; or as the result itself. NLS2_Findstr alone has no status: its
  *     result is the answer, or -1.
@@ -68,6 +68,33 @@ enum {
   NLS2_ERR_INVALID_LOCALE = 38,    /* no live locale object, or no locale record matches */
   NLS2_ERR_LANGUAGE_NOT_FOUND = 39 /* a language id that localeMap does not hold */
 };
+
+/* The name of a status: "NLS2_ERR_NO_MEMORY", or what ICU calls it (u_errorName): "U_ZERO_ERROR" for
+ * 0, "[BOGUS UErrorCode]" for a number that ICU does not know. */
+static inline const char *nls2_status_name(int32_t status) {
+  switch (status) {
+  case NLS2_ERR_NO_MEMORY:
+    return "NLS2_ERR_NO_MEMORY";
+  case NLS2_ERR_INVALID_OPTION:
+    return "NLS2_ERR_INVALID_OPTION";
+  case NLS2_ERR_INVALID_PARAMETER:
+    return "NLS2_ERR_INVALID_PARAMETER";
+  case NLS2_ERR_INVALID_LOCALE:
+    return "NLS2_ERR_INVALID_LOCALE";
+  case NLS2_ERR_LANGUAGE_NOT_FOUND:
+    return "NLS2_ERR_LANGUAGE_NOT_FOUND";
+  default:
+    break;
+  }
+  if (status < U_ERROR_WARNING_START || status > 0x1FFFF) { /* more than a UErrorCode can hold */
+    return "[BOGUS UErrorCode]";
+  }
+#ifdef __cplusplus
+  return u_errorName(static_cast<UErrorCode>(status));
+#else
+  return u_errorName((UErrorCode)status);
+#endif
+}
 
 /* ---- Locales --------------------------------------------------------------------------------- */
 

@@ -46,6 +46,9 @@ static void callLocales(uint32_t germany) {
   char name[132];
   int32_t status = -1;
   CHECK(NLS2_GetLocaleMapEntry(germany) == &localeMap[21]);
+  CHECK(strcmp(nls2_status_name(NLS2_ERR_INVALID_OPTION), "NLS2_ERR_INVALID_OPTION") == 0);
+  CHECK(strcmp(nls2_status_name(-128), "U_USING_FALLBACK_WARNING") == 0);
+  CHECK(strcmp(nls2_status_name(INT32_MIN), nls2_status_name(INT32_MAX)) == 0);
   CHECK(localeMap[NLS2_LOCALE_MAP_RECORDS - 1].languageId == NLS2_LANGUAGE_ID_END);
   CHECK(NLS2_LanguageIDFromShortPosixName("de_DE", &status) == germany && status == 0);
   CHECK(NLS2_GetLanguageName(germany, name, sizeof name) == 0 && strcmp(name, "de") == 0);
