@@ -16,14 +16,15 @@
  *     of `out` unspecified, unless "partial output" is noted.
  *  4. Lengths, offsets and rooms are bytes, as int64_t. Texts carry a length, and a null is a
  *     character like any other; only names are null-terminated. A length below 0 is a failure.
- *  5. A pointer may be null only where its comment says so, and where its length or room is 0.
- *     Null anywhere else is NLS2_ERR_INVALID_PARAMETER; so is a struct whose `size` is too small.
+ *  5. A pointer may be null only where its comment says so, and where its length or room is 0; a
+ *     `problem` always. Null elsewhere is NLS2_ERR_INVALID_PARAMETER; so is a struct whose `size`
+ *     is too small.
  *  6. A struct that the caller fills begins with `size`, its own sizeof, so that later versions can
  *     add to its end. Set the rest to 0 first.
  *  7. Handles belong to the caller, who closes them; closing null does nothing. A page may be
  *     closed before what was opened with it.
- *  8. Threads. Pages can be used by any number of threads at once; every other handle by one thread
- *     at a time. Clone a translator for each thread.
+ *  8. Threads. Pages, layouts and writers can be used by any number of threads at once; other
+ *     handles by one thread at a time. Clone a translator for each thread.
  *  9. Input and output must not overlap.
  * 10. Every function may fail with NLS2_ERR_NO_MEMORY (32) unless its comment says that it does not
  *     allocate, and with NLS2_ERR_INVALID_PARAMETER (37) as above. The comments list the others.
@@ -44,19 +45,30 @@ enum { NLS2F_ERR_FIELD = 40 /* the text is the problem: see NLS2F_Problem */ };
 
 /* Kinds of problems. */
 enum {
-  NLS2F_INVALID_BYTES = 1, /* bytes that are not valid in the source page */
-  NLS2F_NOT_IN_PAGE = 2,   /* a character that the destination page lacks */
-  NLS2F_NO_ROOM = 3,       /* the output takes more than its room, or its text more than `width` */
-  NLS2F_EMBEDDED_NULL = 4, /* U+0000 inside the text of a padded field */
-  NLS2F_NO_EXACT_FILL = 5, /* no number of blanks makes the field `width` bytes long */
-  NLS2F_TOO_LONG = 6       /* the field has more than 2,147,483,647 bytes */
+  NLS2F_INVALID_BYTES = 1,  /* bytes that are not valid in the source page */
+  NLS2F_NOT_IN_PAGE = 2,    /* a character that the destination page lacks */
+  NLS2F_NO_ROOM = 3,        /* the output takes more than its room, or its text more than `width` */
+  NLS2F_EMBEDDED_NULL = 4,  /* U+0000 inside the text of a padded field */
+  NLS2F_NO_EXACT_FILL = 5,  /* no number of blanks makes the field `width` bytes long */
+  NLS2F_TOO_LONG = 6,       /* the field has more than 2,147,483,647 bytes */
+  NLS2F_INVALID_NUMBER = 7, /* bytes or text that are not a number of this kind */
+  NLS2F_NEGATIVE = 8,       /* a negative number in a field without a sign */
+  NLS2F_TOO_LARGE = 9,      /* a number with more digits than its place has */
+  NLS2F_TOO_PRECISE = 10,   /* a number with more decimals than its field has */
+  NLS2F_CUT_SHORT = 11,     /* the input ends inside a record */
+  NLS2F_INVALID_PREFIX = 12,  /* a length that cannot be, or bytes 3 and 4 are not zero */
+  NLS2F_SPANNED = 13,         /* the prefix of a part of a spanned record */
+  NLS2F_INVALID_CSV = 14,     /* a quote, or what follows one, in the wrong place */
+  NLS2F_RECORD_TOO_LONG = 15, /* a record is longer than its format can hold */
+  NLS2F_INVALID_LAYOUT = 16,
+  NLS2F_INVALID_FORMAT = 17
 };
 
 /* What is wrong, and where. */
 typedef struct NLS2F_Problem {
   uint32_t size;
   int32_t kind;
-  int64_t record; /* of a column: the row, from 0; else 0 */
+  int64_t record; /* of a column the row, of a layout the line, else the record; from 0 */
   int64_t offset; /* in the field: the first byte of the character, or of the invalid sequence as
                          ICU delimits it, after a shift before it. Of the first character that does
                          not fit; the field's length if only blanks or a last shift do not fit */
@@ -73,6 +85,8 @@ typedef struct NLS2F_Problem {
  *                        If it is more than the policy's width, the text alone takes that many
  *                        bytes, and more room does not help
  *   NLS2F_NO_EXACT_FILL  the next shorter width that blanks can fill exactly
+ *   NLS2F_CUT_SHORT, NLS2F_RECORD_TOO_LONG  the record's length, 0 if unknown; the format's limit
+ *   NLS2F_INVALID_PREFIX, NLS2F_INVALID_LAYOUT, NLS2F_INVALID_FORMAT  a code for the words
  *   other kinds          0
  *
  * A field with several problems reports one. Under NLS2F_STOP invalid bytes come first, or a
@@ -138,11 +152,11 @@ NLS2_API int32_t NLS2F_PageAt(int64_t index, const char **name);
  * and all space separators). Except with AS_IS, the blanks and nulls (U+0000) at the end are cut
  * off first; what remains is the text, and a null inside it is NLS2F_EMBEDDED_NULL. */
 enum {
-  NLS2F_AS_IS = 0, /* the field as it is, blanks and nulls too */
-  NLS2F_STRIP = 1, /* the text alone */
-  NLS2F_FILL = 2,  /* the text and U+0020 up to exactly `width` bytes */
-  NLS2F_KEEP_BLANKS =
-      3 /* the text and one U+0020 for each blank cut off, as many as fit in `width` */
+  NLS2F_AS_IS = 0,      /* the field as it is, blanks and nulls too */
+  NLS2F_STRIP = 1,      /* the text alone */
+  NLS2F_FILL = 2,       /* the text and U+0020 up to exactly `width` bytes */
+  NLS2F_KEEP_BLANKS = 3 /* the text and one U+0020 for each blank cut off, as many as fit in
+                           `width` */
 };
 
 /* What to do with bytes that are not valid in the source page, and with characters that the
@@ -192,7 +206,6 @@ NLS2_API int32_t NLS2F_MaxSize(const NLS2F_Translator *translator, int64_t lengt
  *   written   the bytes of the output
  *   replaced  each invalid sequence and each character that the page lacks, once; or null. A
  *             U+001A of the source does not count
- *   problem   or null
  *
  * Does not allocate for fields of up to 2,048 bytes, nor for longer ones once it has met one as
  * long. Status: NLS2F_ERR_FIELD. */
@@ -219,9 +232,8 @@ typedef struct NLS2F_Column {
   int64_t room;
   void *offsets; /* rows + 1: row i is the bytes from offsets[i] to before offsets[i + 1]; the first
                     is 0 */
-  uint8_t
-      *good; /* (rows + 7) / 8 bytes, or null. Bit i % 8 of byte i / 8, least bit first: 1 if row
-                    i is good; bits of its byte after the last row done are 0 */
+  uint8_t *good; /* (rows + 7) / 8 bytes, or null. Bit i % 8 of byte i / 8, least bit first: 1 if
+                    row i is good; bits of its byte after the last row done are 0 */
 
   /* Results, set by every call that returns 0 or NLS2F_ERR_FIELD. */
   int64_t done;     /* rows whose bytes, offsets and bits are final */
@@ -238,8 +250,6 @@ typedef struct NLS2F_Column {
  * and the rows before it are done (partial output). Go on there with new buffers: fields + done *
  * stride, rows - done. Does not allocate where NLS2F_Translate does not.
  *
- *   problem  or null
- *
  * Status: 0, NLS2F_ERR_FIELD, or NLS2_ERR_INVALID_PARAMETER also for other offsetBits. */
 NLS2_API int32_t NLS2F_TranslateColumn(NLS2F_Translator *translator, NLS2F_Column *column,
                                        NLS2F_Problem *problem);
@@ -251,7 +261,7 @@ NLS2_API int32_t NLS2F_TranslateColumn(NLS2F_Translator *translator, NLS2F_Colum
  *   read      the bytes of the piece that were used: all on success
  *   written   the bytes of the output
  *   replaced  in this call; or null
- *   problem   or null. `offset` counts from the beginning of the text, `needed` is 0
+ *   problem   `offset` counts from the beginning of the text, `needed` is 0
  *
  * Status:
  *   0   done; the end of the piece may be kept back until more is known
@@ -294,13 +304,142 @@ NLS2_API int32_t NLS2F_SortKey(NLS2F_Collator *collator, const void *text, int64
                                void *key, int64_t room, int64_t *keyLength);
 
 /* Where a pattern first occurs in a text, unit for unit in UTF-16 as for NLS2_Findstr, but nulls
- * are characters, and a text may grow in lower case. An empty pattern occurs at 0.
- *
- *   position, found  the first byte of the occurrence and its length in bytes, with shifts inside
- *                    it; -1 and 0 if there is none */
+ * are characters, and a text may grow in lower case. An empty pattern occurs at 0. *found is the
+ * length of the occurrence in bytes, with shifts inside it; -1 and 0 if there is none. */
 NLS2_API int32_t NLS2F_Find(NLS2F_Collator *collator, const void *text, int64_t length,
                             const void *pattern, int64_t patternLength, int64_t *position,
                             int64_t *found);
+
+/* ---- Layouts and numbers --------------------------------------------------------------------- */
+
+/* Kinds of fields. */
+enum {
+  NLS2F_TEXT = 0,
+  NLS2F_RAW = 1,
+  NLS2F_HEX = 2,
+  NLS2F_PACKED = 3, /* 1 to 16 bytes: digits of four bits, then a sign: C, A, E, F are positive, D,
+                       B negative; written C, D */
+  NLS2F_ZONED = 4,  /* 1 to 31 digits, a byte each. The last one's upper four bits are the sign, as
+                      above; in ASCII 3 is positive, 7 negative */
+  NLS2F_BINARY = 5  /* 1, 2, 4 or 8 bytes, two's complement, big-endian */
+};
+enum {                         /* options of numbers */
+       NLS2F_UNSIGNED = 1,     /* no sign: written F, in ASCII 3; BINARY begins at 0 */
+       NLS2F_BLANK_EMPTY = 2,  /* only blanks, or only nulls except in BINARY, are an empty text */
+       NLS2F_SIGN_LEADING = 4, /* ZONED: the sign is at the first digit, or before it */
+       NLS2F_SIGN_SEPARATE = 8 /* ZONED: the sign is one more byte, + or - */
+};
+
+/* One field of a record: from a layout, or filled by the caller. */
+typedef struct NLS2F_Field {
+  uint32_t size;
+  int32_t kind;                     /* NLS2F_TEXT ... */
+  int32_t scale;                    /* of a number: digits after the point, 0 to 31 */
+  uint32_t options;                 /* of a number: NLS2F_UNSIGNED ... */
+  int64_t first, length;            /* bytes; the record's first is 0 */
+  uint8_t zero, plus, minus, blank; /* as the record's page has them */
+  const char *name;                 /* the layout's, as is `page`; empty if it has none */
+  const char *page;                 /* name of a page of the text's own, or null */
+} NLS2F_Field;
+
+typedef struct NLS2F_Layout NLS2F_Layout;
+enum { NLS2F_LAYOUT_SHORT = 1, NLS2F_LAYOUT_WRITES = 2 }; /* options */
+
+/* Opens a layout: UTF-8, a line a field, # begins a comment. Bytes count from 1; a length alone
+ * begins after the field before. KIND: text (if none), raw, hex, packed, zoned, binary, page:NAME.
+ * OPTION: unsigned, blank=empty, sign=trailing|leading[-separate].
+ *
+ *   NAME FIRST-LAST|LENGTH [KIND[.SCALE]] [OPTION]...      balance 13-17 packed.2 blank=empty
+ *   with NLS2F_LAYOUT_SHORT                                1-12;13-17=packed.2:blank=empty
+ *
+ * With NLS2F_LAYOUT_WRITES fields must not overlap. `page` is that of the records; zoned numbers
+ * need digits F0 to F9 or 30 to 39. Of a problem `record` is the line and `offset` the byte in it,
+ * both from 0. Status: NLS2F_ERR_FIELD; NLS2_ERR_INVALID_OPTION (36). */
+NLS2_API int32_t NLS2F_OpenLayout(const char *text, int64_t length, const NLS2F_Page *page,
+                                  uint32_t options, NLS2F_Layout **layout, NLS2F_Problem *problem);
+NLS2_API void NLS2F_CloseLayout(NLS2F_Layout *layout);
+
+/* The number of fields, and the length of a record that holds them. A field, from 0. */
+NLS2_API int32_t NLS2F_LayoutSize(const NLS2F_Layout *layout, int64_t *fields, int64_t *length);
+NLS2_API int32_t NLS2F_LayoutField(const NLS2F_Layout *layout, int64_t index, NLS2F_Field *field);
+
+/* The number in the field's `bytes` as text, "-123.45": ASCII, `scale` decimals, at least one digit
+ * before the point, no plus; -0 is 0. 34 bytes hold every number. And back: blanks and tabs around
+ * it, a plus and fewer decimals are allowed; nothing is rounded or cut. Do not allocate. Status:
+ * NLS2F_ERR_FIELD; 36 for a field that is no number, or whose kind has no such length or options. */
+NLS2_API int32_t NLS2F_NumberToText(const NLS2F_Field *field, const void *bytes, char *text,
+                                    int64_t room, int64_t *written, NLS2F_Problem *problem);
+NLS2_API int32_t NLS2F_TextToNumber(const NLS2F_Field *field, const char *text, int64_t length,
+                                    void *bytes, NLS2F_Problem *problem);
+
+/* A column of numbers, as NLS2F_TranslateColumn makes one of texts; its `length` is not used. With
+ * offsetBits 0 it is int64_t values in `out`, without the point (12.30 is 1230), and no offsets. An
+ * empty text is then 0 and its bit 0, not in `failed`; without `good` it is an invalid number. */
+NLS2_API int32_t NLS2F_NumberColumn(const NLS2F_Field *field, NLS2F_Column *column,
+                                    NLS2F_Problem *problem);
+
+/* ---- Records --------------------------------------------------------------------------------- */
+
+typedef struct NLS2F_Span {
+  int64_t offset, length;
+} NLS2F_Span;
+typedef struct NLS2F_Reader NLS2F_Reader;
+typedef struct NLS2F_Writer NLS2F_Writer;
+
+/* Opens a reader, or a writer. Formats:
+ *
+ *   fixed:N                   N bytes each; shorter ones are filled with the page's blank
+ *   lines[:lf|:crlf|:nel]     read: to LF, CR LF or NEL, or the input's end, after a byte-order
+ *                             mark; written: with LF; with a suffix with that end alone
+ *   prefixed[:data][:little]  two bytes of length, two zero bytes, the record; the length counts
+ *                             all, with `data` the record alone; big-endian, or `little`
+ *   blocked                   only read: blocks, with a prefix too, of prefixed records
+ *   csv, csv:crlf             UTF-8, RFC 4180; reads both ends, and a mark, either way
+ *   joined                    only written: one record after another
+ *
+ * Lines and the writer of fixed:N need a page, else it may be null. Status: NLS2F_ERR_FIELD, also
+ * for lines in a page in which their ends depend on the text before them, and for lines written in
+ * a page with a signature; the problem's `offset` is that in the format. */
+NLS2_API int32_t NLS2F_OpenReader(const char *format, const NLS2F_Page *page, NLS2F_Reader **reader,
+                                  NLS2F_Problem *problem);
+NLS2_API int32_t NLS2F_OpenWriter(const char *format, const NLS2F_Page *page, NLS2F_Writer **writer,
+                                  NLS2F_Problem *problem);
+NLS2_API void NLS2F_CloseReader(NLS2F_Reader *reader);
+NLS2_API void NLS2F_CloseWriter(NLS2F_Writer *writer);
+
+/* Finds the records in a piece of the input. The next piece begins with what was not read, and is
+ * longer if nothing was; `last` is 1 for the last one. The records are the same for all pieces.
+ * `records` are places in the piece, without line ends and prefixes; `read` is the end of the last
+ * one. Does not allocate. Status: NLS2F_ERR_FIELD if there is a problem and no record before it;
+ * the problem's `record` and `offset` count from the beginning of the input. */
+NLS2_API int32_t NLS2F_ReadRecords(NLS2F_Reader *reader, const void *piece, int64_t length,
+                                   int32_t last, int64_t *read, NLS2F_Span *records,
+                                   int64_t capacity, int64_t *count, NLS2F_Problem *problem);
+
+/* ICU's name of the text's page, after the first record: for lines in UTF-16 and UTF-32 the mark's,
+ * such as "UTF-16LE"; for csv UTF-8; empty without a page. */
+NLS2_API int32_t NLS2F_ReaderPage(const NLS2F_Reader *reader, const char **name);
+
+/* Copies a field of records to fields + i * field->length, for a column. Bytes that a record lacks
+ * become field->blank. Does not allocate. */
+NLS2_API int32_t NLS2F_GatherFields(const NLS2F_Field *field, const void *bytes,
+                                    const NLS2F_Span *records, int64_t count, void *fields);
+
+/* Writes records. Also after a problem *written bytes are right, of *done records (partial output);
+ * its `record` is the index of the span. Does not allocate. Status: NLS2F_ERR_FIELD. */
+NLS2_API int32_t NLS2F_WriteRecords(const NLS2F_Writer *writer, const void *bytes,
+                                    const NLS2F_Span *records, int64_t count, void *out,
+                                    int64_t room, int64_t *written, int64_t *done,
+                                    NLS2F_Problem *problem);
+
+/* A record of csv, without its end, to its fields and back. SplitCsv takes quotes off: the fields
+ * are places in `out`, which has `length` bytes. With more than `capacity` the status is 15
+ * (U_BUFFER_OVERFLOW_ERROR), and *count right. JoinCsv puts quotes where they are needed; one empty
+ * field is "". Status: NLS2F_ERR_FIELD. Neither allocates. */
+NLS2_API int32_t NLS2F_SplitCsv(const void *record, int64_t length, void *out, NLS2F_Span *fields,
+                                int64_t capacity, int64_t *count, NLS2F_Problem *problem);
+NLS2_API int32_t NLS2F_JoinCsv(const void *bytes, const NLS2F_Span *fields, int64_t count,
+                               void *out, int64_t room, int64_t *written, NLS2F_Problem *problem);
 
 #ifdef __cplusplus
 }
