@@ -97,7 +97,7 @@ void runCase(const support::Case &each) {
     return; // a sanitizer or an emulator must come first, and takes much address space
   }
 #endif
-  ASSERT_TRUE(run.out.empty() || run.has.empty()) << "out and has exclude each other";
+  ASSERT_TRUE(run.out.empty() || run.has.empty()) << "out and has cannot be combined";
   const TempDir dir;
   for (const auto &[name, bytes] : run.before) {
     writeFile(dir.path(name), bytes);

@@ -1,4 +1,4 @@
-// nls2: the library's work on files, from the command line.
+// The command nls2: finds the command to run, and turns failures into messages and exit codes.
 
 #include "base/errors.h"
 #include "base/icu_memory.h"
@@ -24,20 +24,20 @@ namespace nls2::tool {
 namespace {
 
 constexpr CommandEntry commands[] = {
-    {"translate", "Translate fixed-length records to another code page", translateCommand},
+    {"translate", "Translate records or lines to another code page", translateCommand},
     {"locales", "List the locales that the library knows", localesCommand},
-    {"codepages", "List code pages by number and by Windows name", codepagesCommand},
+    {"codepages", "Show code pages, their names and their charts", codepagesCommand},
     {"detect", "Report the Unicode signatures of files", detectCommand, exitUsage},
     {"dump", "Show a file in hex and as text of a code page", dumpCommand},
     {"cat", "Write text files in any encoding to standard output as UTF-8", catCommand, exitUsage},
     {"compare", "Compare two strings by the rules of a language", compareCommand, exitUsage},
     {"sort", "Sort lines or fixed-length records by the rules of a language", sortCommand},
-    {"find", "Print the lines in which a text occurs", findCommand, exitUsage}};
+    {"find", "Print the lines that contain a text", findCommand, exitUsage}};
 
-int failureCode = exitFailed; // of the command
+int failureCode = exitFailed; // of the command that runs
 
-// A standard stream that the caller closed must not become a file opened here: its descriptor is
-// taken by an open file that can only fail.
+// If the caller closed a standard stream, opens something in its place that fails, so that a file
+// opened later does not become that stream.
 void occupyStandardStreams() {
   for (const int fd : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
     if (fcntl(fd, F_GETFD) < 0) {
@@ -65,18 +65,18 @@ std::string generalHelp() {
   for (const CommandEntry &entry : commands) {
     text += helpLine(entry.name, entry.summary);
   }
-  return text + helpLine("help [COMMAND]", "Print this help, or that of a command") +
-         helpLine("-h, --help", "Print this help, or a command's after its name") +
-         helpLine("--version", "Print how the library was built") +
-         "\nExit codes: 0 done, 1 a record or a file failed, 2 the command line is wrong. Of detect,\n"
-         "compare and find, which answer a question: 0 yes, 1 no, 2 trouble.\nSee nls2(1).\n";
+  return text + helpLine("help [COMMAND]", "Print this help, or the help of a command") +
+         helpLine("-h, --help", "The same; after a command, its help") +
+         helpLine("--version", "Print the library's build stamp") +
+         "\nExit codes: 0 success, 1 a record or file failed, 2 wrong usage. For detect, compare and\n"
+         "find, which answer a question: 0 yes, 1 no, 2 error.\nSee nls2(1).\n";
 }
 
 std::string helpOn(const CommandEntry *entry) {
   return entry != nullptr ? helpOf(*entry, entry->make()) : generalHelp();
 }
 
-// `nls2 help`, options without a command, or nothing at all.
+// Runs `nls2 help`; reports options without a command and unknown commands.
 Command generalCommand(const std::string &first) {
   if (first.starts_with("-")) {
     return {.run = []() -> int { throw usageError("COMMAND is missing"); }};
@@ -96,7 +96,7 @@ Command generalCommand(const std::string &first) {
 
 int runCommand(const CommandEntry *entry, int argc, char **argv) {
   const std::string first = argc > 1 ? argv[1] : "-";
-  const int own = first.starts_with("-") ? 0 : 1; // words before the command's own
+  const int own = first.starts_with("-") ? 0 : 1; // words that belong to nls2 itself
   const Command command = entry != nullptr ? entry->make() : generalCommand(first);
   switch (parse(command, argc - own, argv + own)) {
   case Request::help:
@@ -108,8 +108,8 @@ int runCommand(const CommandEntry *entry, int argc, char **argv) {
   }
 }
 
-// The one place where failures become messages and exit codes. What ICU reports without memory is
-// not to be believed.
+// Turns failures into messages and exit codes. After a failed allocation ICU's reports cannot be
+// trusted.
 int run(const CommandEntry *entry, int argc, char **argv) noexcept {
   try {
     try {
@@ -133,7 +133,7 @@ int run(const CommandEntry *entry, int argc, char **argv) noexcept {
   return failureCode;
 }
 
-// Without memory for an exception the process would be aborted.
+// Without this the process would abort if there is no memory even for an exception.
 void endWithoutMemory() {
   if (!std::current_exception()) {
     complain("out of memory");
@@ -148,7 +148,7 @@ void endWithoutMemory() {
 
 int main(int argc, char **argv) {
   nls2::tool::occupyStandardStreams();
-  std::signal(SIGXFSZ, SIG_IGN); // a full file is a write error, reported like any other
+  std::signal(SIGXFSZ, SIG_IGN); // a file that is too large is then a write error like any other
   std::set_terminate(nls2::tool::endWithoutMemory);
   nls2::tool::giveIcuReserve();
   const auto *entry = argc > 1 ? nls2::tool::commandNamed(argv[1]) : nullptr;

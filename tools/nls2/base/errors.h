@@ -1,4 +1,4 @@
-// How a command gives up: one exception, with an exit code and a message for standard error.
+// How a command fails: with one exception that has an exit code and a message.
 #pragma once
 
 #include "nls2/error.hpp"
@@ -14,10 +14,10 @@
 
 namespace nls2::tool {
 
-// Of a command that answers a question, 1 is "no", and a failure ends it with 2 as well.
+// For a command that answers a question, 1 means "no" and every failure ends it with 2.
 enum ExitCode : int { exitDone = 0, exitFailed = 1, exitUsage = 2 };
 
-// Ends a command. Code exitFailed becomes 2 where the command answers a question.
+// Ends a command. exitFailed becomes 2 if the command answers a question.
 class Error : public std::runtime_error {
 public:
   Error(ExitCode code, const std::string &text) : std::runtime_error(text), code_(code) {}
@@ -28,30 +28,29 @@ private:
   ExitCode code_;
 };
 
-// What went wrong while the work was done: throw failure("...", ...).
+// The work failed: throw failure("...", ...).
 template <typename... Arguments>
 Error failure(fmt::format_string<Arguments...> format, Arguments &&...arguments) {
   return {exitFailed, fmt::format(format, std::forward<Arguments>(arguments)...)};
 }
 
-// What the command line asks for cannot be: throw usageError("...", ...). main adds where to look.
+// The command line is wrong: throw usageError("...", ...). main appends "see nls2 ... --help".
 template <typename... Arguments>
 Error usageError(fmt::format_string<Arguments...> format, Arguments &&...arguments) {
   return {exitUsage, fmt::format(format, std::forward<Arguments>(arguments)...)};
 }
 
-// A text that cannot be used. The message goes after the text's place: ", column 3: ..." or
-// ": ...".
+// A text that cannot be used. The caller puts the place of the text before the message, which
+// begins with ", column 3: " or ": ".
 class TextFault : public Error {
 public:
   explicit TextFault(const std::string &text) : Error(exitFailed, text) {}
 };
 
-// A status of the library or of ICU in words.
+// The message of a status of the library or of ICU.
 inline std::string statusText(int32_t status) { return category().message(status); }
 
-// Throws where ICU failed: std::bad_alloc without memory, else Error, which says what could not be
-// done.
+// If ICU failed, throws std::bad_alloc (no memory) or an Error "cannot " + `what`.
 inline void requireSuccess(UErrorCode status, const char *what) {
   if (status == U_MEMORY_ALLOCATION_ERROR) {
     throw std::bad_alloc();
@@ -61,7 +60,7 @@ inline void requireSuccess(UErrorCode status, const char *what) {
   }
 }
 
-// A message of the command on standard error. Allocates nothing.
+// Writes a message to standard error. Allocates nothing.
 inline void complain(const char *text) noexcept { std::fprintf(stderr, "nls2: %s\n", text); }
 
 } // namespace nls2::tool

@@ -1,5 +1,6 @@
-// ICU's memory. Without memory ICU 72 follows null pointers in its collation loader and deadlocks in
-// the default locale. So it gets a reserve, enough until requireMemory() ends the command.
+// A memory reserve for ICU. When an allocation fails, ICU 72 follows null pointers in its collation
+// loader and deadlocks in its default locale. The reserve lets it go on until requireMemory() ends
+// the command.
 #pragma once
 
 #include <algorithm>
@@ -15,12 +16,12 @@
 
 namespace nls2::tool {
 
-// Whether a request of ICU's for memory has failed. Some of its functions report that as a name
-// that is unknown, or not at all.
+// Whether an allocation of ICU's has failed. Some of its functions report that as an unknown name,
+// or not at all.
 inline std::atomic<bool> ranOutOfMemory = false;
 
-// Throws std::bad_alloc where one has, or where the status says so. To be called before an answer is
-// given: what would open must not seem unknown.
+// Throws std::bad_alloc if one has, or if the status says so. Call it before reporting an answer:
+// without memory a known page seems unknown.
 inline void requireMemory(std::error_code status = {}) {
   if (ranOutOfMemory || status == std::errc::not_enough_memory) {
     throw std::bad_alloc();
@@ -72,7 +73,7 @@ inline void *resize(void *block, std::size_t size) {
 
 } // namespace icu_memory
 
-// Has to come before any other use of ICU.
+// Call it before any other use of ICU.
 inline void giveIcuReserve() {
   UErrorCode status = U_ZERO_ERROR;
   u_setMemoryFunctions(

@@ -1,4 +1,4 @@
-// What commands find, as text and as JSON by libjansson.
+// Answers of commands, as text and as JSON (by libjansson).
 #pragma once
 
 #include <concepts>
@@ -14,8 +14,7 @@
 
 namespace nls2::tool {
 
-// A value to be written. Every function throws std::bad_alloc without memory. Copies share the
-// value.
+// A JSON value. Copies share it. Every function throws std::bad_alloc if memory runs out.
 class Json {
 public:
   Json(std::nullptr_t = nullptr) : Json(json_null()) {}
@@ -27,7 +26,7 @@ public:
   template <typename Value>
   Json(const std::optional<Value> &value) : Json(value ? Json(*value) : Json()) {}
 
-  // Bytes that are not valid UTF-8 become U+FFFD.
+  // Invalid UTF-8 becomes U+FFFD.
   Json(std::string_view text) {
     const auto units =
         icu::UnicodeString::fromUTF8({text.data(), static_cast<int32_t>(text.size())});
@@ -37,7 +36,7 @@ public:
     *this = Json(json_stringn(valid.data(), valid.size()));
   }
 
-  // Members are written in the order in which they were set.
+  // Members keep the order in which they were set.
   static Json object(std::initializer_list<std::pair<const char *, Json>> members = {}) {
     Json object(json_object());
     for (const auto &[key, value] : members) {
@@ -62,7 +61,7 @@ public:
     require(json_array_append(value_.get(), value.value_.get()) == 0);
   }
 
-  // Indented by two blanks, and ended by a newline.
+  // Indented by two blanks, with a newline at the end.
   std::string text() const {
     constexpr std::size_t style = JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9);
     std::string text(json_dumpb(value_.get(), nullptr, 0, style), '\0');

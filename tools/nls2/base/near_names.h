@@ -1,4 +1,4 @@
-// Names near to one that is unknown.
+// Suggestions for a name that is unknown.
 #pragma once
 
 #include <algorithm>
@@ -12,7 +12,7 @@ inline char lowerCase(char letter) {
   return static_cast<char>(letter + (letter >= 'A' && letter <= 'Z' ? 'a' - 'A' : 0));
 }
 
-// Letters to insert, drop, change, or swap with the next; case does not count.
+// How many letters must be inserted, dropped, changed or swapped with the next. Ignores case.
 inline std::size_t letterDistance(std::string_view a, std::string_view b) {
   const auto alike = [](char x, char y) { return lowerCase(x) == lowerCase(y); };
   std::vector table(a.size() + 1, std::vector<std::size_t>(b.size() + 1));
@@ -31,7 +31,7 @@ inline std::size_t letterDistance(std::string_view a, std::string_view b) {
   return table[a.size()][b.size()];
 }
 
-// Up to three of the known names that are nearest and differ in few letters.
+// Up to three of the known names: the nearest, if they differ in few letters.
 inline std::vector<std::string> nearNames(const std::string &unknown,
                                           const std::vector<std::string> &known) {
   std::size_t nearest = 1 + unknown.size() / 4;
@@ -53,7 +53,7 @@ inline std::vector<std::string> nearNames(const std::string &unknown,
   return names;
 }
 
-// " (did you mean a, b or c?)" for the end of a message; empty without names.
+// " (did you mean a, b or c?)" for the end of a message; empty if there are no names.
 inline std::string didYouMean(const std::vector<std::string> &names) {
   std::string text;
   for (std::size_t i = 0; i < names.size(); ++i) {

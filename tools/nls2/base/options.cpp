@@ -1,4 +1,4 @@
-// The command line: the parser of options and operands, and --help.
+// Parses options and operands, and writes --help.
 
 #include "base/options.h"
 
@@ -12,15 +12,15 @@ namespace nls2::tool {
 
 namespace {
 
-// What getopt_long returns for the long option at an index of the table; letters come as they are.
+// getopt_long returns this plus the index of a long option, and a short option as its letter.
 constexpr int firstLong = 256;
 
 const Option helpOption = flag("help", "print this help", {}, 'h');
-const Option versionOption = flag("version", "print how the library was built", {});
+const Option versionOption = flag("version", "print the library's build stamp", {});
 
 using Given = std::vector<std::pair<const Option *, std::string>>;
 
-// The tables of a command as getopt_long wants them.
+// The options of a command in the form that getopt_long needs.
 class Getopt {
 public:
   explicit Getopt(const Command &command) {
@@ -32,7 +32,7 @@ public:
     long_.push_back({});
   }
 
-  // The next option with its value; null when only operands are left. Throws usageError.
+  // The next option, its value in optarg; null when only operands are left. Throws usageError.
   const Option *next(int argc, char **argv) {
     switch (const int code = getopt_long(argc, argv, letters_.c_str(), long_.data(), nullptr)) {
     case -1:
@@ -64,7 +64,8 @@ private:
     return **std::ranges::find(options_, code, &Option::letter);
   }
 
-  // A letter, or a long option, of which `word` is the argument.
+  // `code` is the unknown letter, or the long option that got a value it does not take; 0 for an
+  // unknown long option. `word` is the argument.
   Error unknown(int code, const std::string &word) const {
     if (code >= firstLong) {
       return usageError("--{} takes no value", optionOf(code).name);
@@ -86,7 +87,7 @@ private:
 
   std::vector<const Option *> options_;
   std::vector<option> long_;
-  std::string letters_ = ":"; // a missing value is a fault of its own
+  std::string letters_ = ":"; // so that getopt_long tells a missing value from an unknown option
 };
 
 void checkOperands(const Command &command, int count, char **operands) {

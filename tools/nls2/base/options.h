@@ -1,4 +1,4 @@
-// The command line: the commands as tables of options and operands, and the parser that reads them.
+// The command line: tables of options and operands, and their parser.
 #pragma once
 
 #include "base/errors.h"
@@ -17,16 +17,16 @@
 
 namespace nls2::tool {
 
-// What receives the value of an option or operand. It may throw usageError, after the whole command
-// line was found complete.
+// Takes the value of an option or operand. May throw usageError; is called only after all required
+// options and operands were found.
 using Take = std::function<void(const std::string &)>;
 
 struct Option {
-  const char *name;    // without its two dashes
-  const char *metavar; // of the value; null for a flag, whose `take` gets an empty text
+  const char *name;    // without the two dashes
+  const char *metavar; // of the value; null for a flag, whose `take` gets ""
   const char *help;
   Take take;
-  char letter = '\0'; // of the short form; none by default
+  char letter = '\0'; // of the short form, if it has one
   bool isRequired = false;
 };
 
@@ -44,7 +44,7 @@ inline Option required(Option option) {
   return option;
 }
 
-// Arguments that are not options, taken in the order of the table.
+// Arguments that are not options, in the order of the table.
 struct Operand {
   static constexpr std::size_t anyNumber = std::numeric_limits<std::size_t>::max();
 
@@ -72,7 +72,7 @@ Command localesCommand();
 Command sortCommand();
 Command translateCommand();
 
-// What stands in the list of commands.
+// An entry in the list of commands.
 struct CommandEntry {
   const char *name;
   const char *summary;
@@ -80,18 +80,18 @@ struct CommandEntry {
   ExitCode failureCode = exitFailed; // 2 for a command whose 1 means "no"
 };
 
-// What a command line asks for.
+// What the command line requests.
 enum class Request { work, help, version };
 
-// Hands the arguments (argv[0] is the command's own name) to the command's tables. Throws
-// usageError for the first fault: an unknown option, a missing value, an operand too many or too
-// few, a missing option, and then values in the order in which they were given.
+// Parses the arguments (argv[0] is the command's name) and hands the values to the tables. Throws
+// usageError for the first error found: unknown options and missing values, then the number of
+// operands, then missing options, then the values in the order given.
 Request parse(const Command &command, int argc, char **argv);
 
 std::string helpOf(const CommandEntry &entry, const Command &command);
 std::string helpLine(const std::string &what, const char *help);
 
-// A number, decimal (never octal) or 0x...; nothing if the text is anything else.
+// Reads a decimal number (never octal) or 0x...; nothing if the text is anything else.
 template <typename Number = uint32_t>
 std::optional<Number> wholeNumber(std::string_view text) {
   const bool isHex = text.starts_with("0x") || text.starts_with("0X");
@@ -102,7 +102,7 @@ std::optional<Number> wholeNumber(std::string_view text) {
   return error == std::errc() && stop == end ? std::optional(number) : std::nullopt;
 }
 
-// Throws usageError, which names the option.
+// Throws usageError with the name of the option.
 template <typename Number>
 Number parseNumber(const char *option, const std::string &text, Number least, Number most) {
   const auto number = wholeNumber<Number>(text);
@@ -121,7 +121,7 @@ Option numberValue(const char *name, const char *metavar, const char *help, Numb
   });
 }
 
-// Keeps the value as a text or an optional one, appends it to a list, or sets a flag.
+// Stores the value, appends it to a list, or sets a flag.
 template <class Value>
 Take into(Value &value) {
   return [&value](const std::string &text) {

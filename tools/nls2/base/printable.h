@@ -8,7 +8,7 @@
 
 namespace nls2::tool {
 
-// A file name for a message: its control characters are escaped, U+0080 to U+009F too.
+// A file name for a message, with control characters (also U+0080 to U+009F) escaped.
 inline std::string printable(std::string_view name) {
   std::string text;
   for (std::size_t i = 0; i < name.size(); ++i) {
@@ -28,12 +28,12 @@ inline std::string printable(std::string_view name) {
   return text;
 }
 
-// What messages call a file; "-" is a standard stream.
+// The name of a file in messages; "-" is a standard stream.
 inline std::string shownName(const std::string &path, const char *stream) {
   return path == "-" ? stream : path.empty() ? "\"\"" : printable(path);
 }
 
-// "D096", with something between the bytes "D0 96".
+// "D096"; with a separator of " " "D0 96".
 inline std::string hexOf(std::string_view bytes, std::string_view between = "") {
   constexpr std::string_view digits = "0123456789ABCDEF";
   std::string text;

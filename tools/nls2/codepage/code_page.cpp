@@ -1,4 +1,4 @@
-// Code pages as the commands see them.
+// Looks up and opens code pages for the commands.
 
 #include "codepage/code_page.h"
 
@@ -15,10 +15,10 @@ namespace nls2::tool {
 
 namespace {
 
-// Enough for some characters of any page, with its signature and its shifts.
+// Room for a few characters of any page, with its signature and shifts.
 constexpr int32_t fewBytes = 64;
 
-// Null where ICU does not know the name. An empty one would be its default converter.
+// Null if ICU does not know the name. (ICU would open its default converter for an empty name.)
 nls2::converter openNamed(const std::string &name, UErrorCode &status) {
   status = U_ZERO_ERROR;
   nls2::converter opened(name.empty() ? nullptr : ucnv_open(name.c_str(), &status));
@@ -36,8 +36,8 @@ std::vector<std::string> aliasesOf(const char *converter) {
   return aliases;
 }
 
-// The converters of ICU's that have this name, where it means several tables; else none. ICU warns
-// of names that several standards use, too.
+// ICU's converters that have this name, if there are several; else none. ICU also warns about names
+// that several standards use for one table.
 std::vector<std::string> meaningsOf(const std::string &name) {
   UErrorCode status = U_ZERO_ERROR;
   openNamed(name, status);
@@ -54,8 +54,8 @@ std::vector<std::string> meaningsOf(const std::string &name) {
   return meanings.size() > 1 ? meanings : std::vector<std::string>();
 }
 
-// The number that opens what ICU opens for the name: that of the library's Windows name, else the
-// CCSID or one of the numbers with names. Nothing where the name means several tables.
+// The number that opens the same converter as the name: that of the Windows name, else the CCSID or
+// a number that nls2.h lists. Nothing if the name is the name of several tables.
 std::optional<int32_t> numberOf(const std::string &name) {
   const auto windows = windowsPage(name);
   const auto converter = converterOf(name);
@@ -75,7 +75,7 @@ std::optional<int32_t> numberOf(const std::string &name) {
   return found != pagesWithNames.end() ? std::optional(*found) : std::nullopt;
 }
 
-// ICU's converters with their aliases, and the library's Windows names.
+// All names and aliases of ICU's converters, and the library's Windows names.
 std::vector<std::string> allPageNames() {
   std::vector<std::string> names;
   for (int32_t i = 0; i < ucnv_countAvailable(); ++i) {
@@ -89,7 +89,7 @@ std::vector<std::string> allPageNames() {
 }
 
 Error unknownPage(const char *option, const std::string &text) {
-  return usageError("{}: unknown code page {}{}; `nls2 codepages --names` lists names", option,
+  return usageError("{}: unknown code page {}{}; `nls2 codepages --names` lists the names", option,
                     text.empty() ? "\"\"" : printable(text), nearPages(text));
 }
 
@@ -148,12 +148,12 @@ int32_t parsePage(const char *option, const std::string &text) {
     return *number;
   }
   if (const auto meanings = meaningsOf(text); !meanings.empty()) {
-    throw usageError("{}: {} means several tables{}", option, printable(text),
+    throw usageError("{}: {} is the name of several tables{}", option, printable(text),
                      didYouMean(meanings));
   }
   if (converterOf(text)) {
-    throw usageError("{}: code page {} has no number in the library; `nls2 codepages` lists "
-                     "numbers",
+    throw usageError("{}: the library has no number for code page {}; `nls2 codepages` lists "
+                     "the numbers",
                      option, printable(text));
   }
   throw unknownPage(option, text);
@@ -174,12 +174,13 @@ CodePage::CodePage(int32_t number, const char *option) : number_(number) {
   std::error_code error;
   converter_ = open_converter(nls2::code_page(number), error);
   if (!converter_) {
-    throw usageError("{}: code page {} does not open: {}{}; `nls2 codepages` lists numbers", option,
-                     number, error.message(), nearPages(std::to_string(number)));
+    throw usageError("{}: code page {} does not open: {}{}; `nls2 codepages` lists the numbers",
+                     option, number, error.message(), nearPages(std::to_string(number)));
   }
 }
 
-// The second of two equal characters carries no signature, and what is left is the first one's.
+// Encodes the character once and twice: only the first can carry a signature, so the difference is
+// the character alone.
 std::optional<EncodedCharacter> CodePage::encoded(char16_t character) const {
   const auto encode = [this](const icu::UnicodeString &text) {
     std::string bytes(fewBytes, '\0');

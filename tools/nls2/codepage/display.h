@@ -1,4 +1,4 @@
-// Characters for people: what prints, and how many columns it takes.
+// How characters are displayed: what prints, and how many columns it takes.
 #pragma once
 
 #include <cstdint>
@@ -11,11 +11,11 @@
 namespace nls2::tool {
 
 struct Display {
-  std::string text; // UTF-8; a dot in place of what does not print
+  std::string text; // UTF-8; a dot for each character that does not print
   int columns = 0;
 };
 
-// A line separator would break the line, as a control character does.
+// Line separators would break the line, as control characters do.
 inline bool prints(UChar32 character) {
   return u_isprint(character) != 0 &&
          (U_MASK(u_charType(character)) & (U_GC_ZL_MASK | U_GC_ZP_MASK)) == 0;
@@ -29,7 +29,7 @@ inline int columnsOf(UChar32 character) {
   return width == U_EA_WIDE || width == U_EA_FULLWIDTH ? 2 : 1;
 }
 
-// What a piece of text, mostly one character, looks like.
+// A text, usually one character, for display.
 inline Display displayOf(std::u16string_view text) {
   Display display;
   for (std::size_t i = 0; i < text.size();) {
@@ -42,7 +42,7 @@ inline Display displayOf(std::u16string_view text) {
   return display;
 }
 
-// "U+00A2"; of several characters "U+304B U+309A".
+// "U+00A2", or "U+304B U+309A" for several characters.
 inline std::string codePointsOf(std::u16string_view text) {
   std::string points;
   for (std::size_t i = 0; i < text.size();) {

@@ -1,4 +1,4 @@
-// What the library and ICU make of code pages.
+// What code page numbers and names open, for `codepages` and `locales`.
 
 #include "codepage/page_lookup.h"
 
@@ -13,15 +13,15 @@ namespace nls2::tool {
 
 namespace {
 
-constexpr std::array prefixes{"ibm-", "cp", "windows-"}; // that people write before numbers
+constexpr std::array prefixes{"ibm-", "cp", "windows-"}; // people write these before numbers
 
-// What opening a number shows. All but the first three are empty where it does not open.
+// Only the first three are set if the number does not open.
 struct PageFacts {
   int32_t number = 0;
   int32_t status = 0;
   int32_t twoNulls = 0;
   bool opens = false;
-  std::optional<std::string> converter; // nothing where it has no name
+  std::optional<std::string> converter; // nothing if it has no name
   std::optional<int32_t> ccsid;
   std::optional<int32_t> maxCharSize;
 
@@ -61,7 +61,7 @@ std::string textOf(const PageFacts &facts) {
   if (facts.opens) {
     line("converter", facts.name());
     line("CCSID", facts.ccsid ? std::to_string(*facts.ccsid) : "none");
-    line("largest character", fmt::format("{} byte(s) a UTF-16 unit", *facts.maxCharSize));
+    line("largest character", fmt::format("{} byte(s) per UTF-16 unit", *facts.maxCharSize));
   }
   line("two-null terminator", facts.twoNulls != 0 ? "yes" : "no");
   for (const std::string &name : windowsNamesOf(facts.number)) {
@@ -80,14 +80,14 @@ Json jsonOf(const PageFacts &facts) {
        {"maxCharSize", facts.maxCharSize},
        {"windowsNames", Json::array(windowsNamesOf(facts.number))},
        {"status", facts.status},
-       // ICU's name of the status, for programs; people get statusText().
+       // ICU's name of the status is for programs; people get statusText().
        {"statusName",
         fmt::format("{} ({})", u_errorName(static_cast<UErrorCode>(facts.status)), facts.status)}});
 }
 
-// ICU's number of the name, that of the library's Windows names, and the one inside the name, as
-// 1252 is in windows-1252; for a name without any of them, the numbers that the library opens as
-// the same converter.
+// The numbers that a name may mean: ICU's CCSID, the library's Windows name, and the number inside
+// the name (1252 in windows-1252). If there are none, the listed numbers that open the same
+// converter.
 std::vector<int32_t> numbersOf(const std::string &name) {
   std::vector<int32_t> numbers;
   const auto add = [&](std::optional<int32_t> number) {
@@ -113,7 +113,7 @@ std::vector<int32_t> numbersOf(const std::string &name) {
   return numbers;
 }
 
-// The names that people write for a number, as far as ICU has them.
+// The usual names of a number, as far as ICU knows them.
 std::vector<std::string> namesOf(int32_t number) {
   std::vector<std::string> names;
   for (const char *prefix : prefixes) {
@@ -125,7 +125,7 @@ std::vector<std::string> namesOf(int32_t number) {
 }
 
 Answer describe(const std::vector<int32_t> &numbers, const std::vector<std::string> &names) {
-  std::string text = numbers.empty() ? "No number of the library's opens this code page.\n" : "";
+  std::string text = numbers.empty() ? "No number of the library opens this code page.\n" : "";
   Json numberRows = Json::array();
   Json nameRows = Json::array();
   std::set<std::optional<std::string>> tables;
@@ -143,7 +143,7 @@ Answer describe(const std::vector<int32_t> &numbers, const std::vector<std::stri
   }
   tables.erase(std::nullopt);
   const bool differ = tables.size() > 1;
-  return {text + (differ ? "Beware: these open different tables.\n" : ""),
+  return {text + (differ ? "Warning: these open different tables.\n" : ""),
           Json::object({{"numbers", numberRows}, {"names", nameRows}, {"tablesDiffer", differ}})};
 }
 
@@ -163,23 +163,23 @@ Answer lookUpPage(const std::string &asked) {
     }
     name = fmt::format("windows-{}", *number);
     if (!windowsPage(name)) {
-      throw failure(
-          "code page {} is unknown: it is not one of the library's numbers, and ICU has no "
-          "converter for it as a CCSID",
-          *number);
+      throw failure("code page {} is unknown: the library does not list it, and ICU has no "
+                    "converter with this CCSID",
+                    *number);
     }
   }
   const auto numbers = name.empty() ? std::vector<int32_t>() : numbersOf(name);
   if (numbers.empty() && !converterOf(name)) {
-    throw failure("code page \"{}\" is unknown: it is neither a name that ICU has a converter for "
-                  "nor a Windows name of the library's{}",
-                  printable(name), nearPages(name));
+    throw failure(
+        "code page \"{}\" is unknown: neither ICU nor the library's list of Windows names "
+        "has it{}",
+        printable(name), nearPages(name));
   }
   return describe(numbers, {name});
 }
 
 Answer allPages() {
-  std::string text = "Numbers opened by name (any other number is opened as a CCSID of ICU's):\n";
+  std::string text = "Numbers opened by name (any other number is opened as a CCSID):\n";
   Json numbers = Json::array();
   Json names = Json::array();
   for (const int32_t number : pagesWithNames) {

@@ -1,4 +1,4 @@
-// What the library and ICU make of code pages.
+// What code page numbers and names open, for `codepages` and `locales`.
 #pragma once
 
 #include "base/json.h"
@@ -10,11 +10,11 @@ namespace nls2::tool {
 
 Answer describePage(int32_t number);
 
-// The code page by number or name: what opens it, and whether that opens different tables of ICU's.
-// Throws Error where neither the library nor ICU knows it.
+// Describes a code page given by number or name, with a warning if its number and names open
+// different tables. Throws Error if neither the library nor ICU knows it.
 Answer lookUpPage(const std::string &asked);
 
-// The library's tables: the numbers with names, and the Windows names.
+// The library's tables: the listed numbers and the Windows names.
 Answer allPages();
 
 } // namespace nls2::tool

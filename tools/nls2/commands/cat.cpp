@@ -1,4 +1,4 @@
-// nls2 cat: text files in any encoding as UTF-8 on standard output.
+// nls2 cat: writes text files in any encoding to standard output as UTF-8.
 
 #include "base/options.h"
 #include "codepage/code_page.h"
@@ -16,10 +16,10 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(NAME is a code page by number, or a converter name of ICU's: UTF-16, ISO-8859-1, ibm-1141. Line ends
-and nulls stay what they are. UTF-16 and UTF-32 take off a byte-order mark, and do without one (then
-big-endian); with any other name a mark is text, U+FEFF.
-Exit codes: 1 if bytes that are not valid in the encoding were replaced, 2 for any failure.
+    R"(NAME is a code page number or the name of a converter of ICU: UTF-16, ISO-8859-1, ibm-1141. Line ends
+and nulls are kept. With UTF-16 and UTF-32 a byte-order mark is removed, and a file without one is
+read as big-endian; with any other NAME a mark is text (U+FEFF).
+Exit codes: 1 invalid bytes were replaced, 2 error.
 )";
 
 struct Arguments {
@@ -27,7 +27,7 @@ struct Arguments {
   std::vector<std::string> paths;
 };
 
-// Writes files to standard output, one after another.
+// Converts files to UTF-8, one after another.
 class Copier {
 public:
   explicit Copier(const std::string &encoding)
@@ -38,7 +38,7 @@ public:
     ucnv_setFromUCallBack(utf8_.get(), onLoneSurrogate, &replaced_, nullptr, nullptr, &error);
     requireSuccess(error, "convert to UTF-8");
   }
-  Copier(const Copier &) = delete; // the converters count into it
+  Copier(const Copier &) = delete; // the converters hold pointers to it
   Copier &operator=(const Copier &) = delete;
 
   int copyAll(const std::vector<std::string> &paths) {
@@ -51,7 +51,7 @@ public:
   }
 
 private:
-  // The exit code for this file. A failure to read is reported, and leaves the others to be read.
+  // Returns the exit code for this file. Reports a failure to read and goes on with the next file.
   int copy(const std::string &path) {
     ucnv_reset(source_.get());
     ucnv_reset(utf8_.get());
@@ -86,7 +86,7 @@ private:
     UCNV_TO_U_CALLBACK_SUBSTITUTE(nullptr, arguments, bytes, length, reason, error);
   }
 
-  // UTF-8 cannot hold them.
+  // UTF-8 cannot represent lone surrogates.
   static void onLoneSurrogate(const void *counter, UConverterFromUnicodeArgs *arguments,
                               const UChar *units, int32_t length, UChar32 character,
                               UConverterCallbackReason reason, UErrorCode *error) {
@@ -98,7 +98,7 @@ private:
     *static_cast<uint64_t *>(const_cast<void *>(counter)) += reason <= UCNV_IRREGULAR ? 1 : 0;
   }
 
-  // Adds the next part of the file. False at its end.
+  // Appends the next part of the file. False at its end.
   bool read(InputFile &in, std::string &text) {
     const std::size_t length = in.read(bytes_.data(), bytes_.size());
     const char *source = bytes_.data();
@@ -137,10 +137,10 @@ private:
 
 Command catCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {.operands = {{"FILE", "files to read, one after another; - is standard input",
+  return {.operands = {{"FILE", "input files, written one after another; - is standard input",
                         into(arguments->paths), 1, Operand::anyNumber}},
           .options = {required(
-              value("encoding", "NAME", "the files' encoding", into(arguments->encoding)))},
+              value("encoding", "NAME", "encoding of the files", into(arguments->encoding)))},
           .notes = notes,
           .run = [arguments] { return Copier(arguments->encoding).copyAll(arguments->paths); }};
 }

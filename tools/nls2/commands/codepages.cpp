@@ -1,5 +1,5 @@
-// nls2 codepages: the library's numbers and names of code pages, what is known of one, its chart,
-// and where two differ.
+// nls2 codepages: the code page numbers and names of the library, facts about one page, charts, and
+// the difference of two pages.
 
 #include "base/options.h"
 #include "codepage/code_page.h"
@@ -16,9 +16,9 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(A number is the library's; everything else is a name as ICU spells them: cp037, latin1. Without PAGE
-all numbers with names and all Windows names are listed. In a chart, rows are the first hex digit of
-a byte and columns the second.
+    R"(A number is the library's; anything else is a name as ICU spells it: cp037, latin1. Without PAGE, the
+numbers that are opened by name and all Windows names are listed. In a chart, the row is the first
+hex digit of a byte and the column the second.
 )";
 
 struct Arguments {
@@ -35,7 +35,7 @@ struct ByteMeaning {
   std::u16string text; // of a character; empty for all else
 };
 
-// What each single byte of a code page means.
+// The meaning of each single byte of a code page.
 struct ByteChart {
   int32_t page;
   std::vector<ByteMeaning> bytes;
@@ -61,7 +61,7 @@ ByteMeaning meaningOf(UConverter *converter, char byte) {
   return isPending ? ByteMeaning{"lead byte", ">>", {}} : ByteMeaning{"shift", "<>", {}};
 }
 
-// Throws Error where the page does not open or no byte of it is a character by itself.
+// Throws Error if the page does not open or has no single-byte characters.
 ByteChart chartOf(const char *option, const std::string &name) {
   const CodePage page(parsePage(option, name), option);
   UErrorCode error = U_ZERO_ERROR;
@@ -71,12 +71,12 @@ ByteChart chartOf(const char *option, const std::string &name) {
     chart.bytes.push_back(meaningOf(page.converter(), static_cast<char>(byte)));
   }
   if (std::ranges::all_of(chart.bytes, &std::u16string::empty, &ByteMeaning::text)) {
-    throw failure("code page {} has no characters of one byte", page.number());
+    throw failure("code page {} has no single-byte characters", page.number());
   }
   return chart;
 }
 
-// Two columns, so that no mark can be taken for a character.
+// Two columns wide, so that no mark looks like a character.
 std::string cellOf(const ByteMeaning &meaning) {
   if (meaning.text.empty()) {
     return meaning.mark;
@@ -111,7 +111,7 @@ Answer chart(const std::string &name) {
     }
     text += line.substr(0, line.find_last_not_of(' ') + 1) + "\n";
   }
-  text += "SP blank, .. does not print, >> lead byte, <> shift, -- no character\n";
+  text += "SP blank, .. not printable, >> lead byte, <> shift, -- no character\n";
   return {text, Json::object({{"codepage", chart.page}, {"bytes", rows}})};
 }
 
@@ -136,11 +136,11 @@ Answer difference(const std::string &first, const std::string &second) {
                               {"differences", rows}})};
 }
 
-// What the options ask for of the pages.
+// The answer to the options, for the pages given.
 Answer answer(const Arguments &arguments) {
   const auto &pages = arguments.pages;
   if (arguments.asChart + arguments.asDifference + arguments.asNames > 1) {
-    throw usageError("--chart, --diff and --names exclude each other");
+    throw usageError("--chart, --diff and --names cannot be combined");
   }
   if (arguments.asDifference && pages.size() != 2) {
     throw usageError("--diff needs two PAGEs");
@@ -166,12 +166,11 @@ Answer answer(const Arguments &arguments) {
 
 Command codepagesCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {.operands = {{"PAGE", "show what the library and ICU make of this number or name",
-                        into(arguments->pages), 0, 2}},
+  return {.operands = {{"PAGE", "number or name to look up", into(arguments->pages), 0, 2}},
           .options = {flag("chart", "show what every byte of PAGE means", into(arguments->asChart)),
-                      flag("diff", "show the bytes whose characters differ in two PAGEs",
+                      flag("diff", "show the bytes that differ between two PAGEs",
                            into(arguments->asDifference)),
-                      flag("names", "list the names that options take for a PAGE",
+                      flag("names", "list the names that options accept as a PAGE",
                            into(arguments->asNames)),
                       flag("json", "write JSON", into(arguments->asJson))},
           .notes = notes,

@@ -1,4 +1,4 @@
-// nls2 compare: two texts in the order of a language.
+// nls2 compare: compares two texts by the rules of a language.
 
 #include "base/options.h"
 #include "io/output_file.h"
@@ -11,9 +11,9 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(Prints -1 if A sorts before B, 1 if B sorts before A, 0 if they are equal. The order counts case,
-accents and punctuation. A and B are bytes of the code page.
-Exit codes: 0 equal, 1 not equal, 2 anything that went wrong.
+    R"(Prints -1 if A sorts before B, 1 if B sorts before A, 0 if they are equal. Case, accents and
+punctuation count. A and B are in the code page.
+Exit codes: 0 equal, 1 not equal, 2 error.
 )";
 
 struct Arguments {

@@ -1,4 +1,4 @@
-// nls2 detect: which Unicode signatures files begin with.
+// nls2 detect: reports the Unicode signatures of files.
 
 #include "base/json.h"
 #include "base/options.h"
@@ -16,9 +16,9 @@ namespace {
 constexpr std::size_t longestSignature = 5;
 
 constexpr const char *notes =
-    R"(Without a signature a file may still be Unicode. FF FE 00 00 is UTF-32LE, even where a text in
-UTF-16LE begins with a null.
-Exit codes: 0 every file has a signature, 1 some file has none, 2 something went wrong.
+    R"(A file without a signature may still be Unicode. FF FE 00 00 is reported as UTF-32LE, even if it is a
+UTF-16LE text that begins with a null.
+Exit codes: 0 every file has a signature, 1 some file has none, 2 error.
 )";
 
 struct Arguments {
@@ -37,7 +37,7 @@ std::string beginningOf(const std::string &path) {
   return bytes;
 }
 
-// Adds what there is to say of a file. The exit code for it.
+// Appends the facts about a file. Returns the exit code for it.
 int detect(const std::string &path, Answer &answer) {
   try {
     const std::string bytes = beginningOf(path);
@@ -76,7 +76,7 @@ int detectAll(const Arguments &arguments) {
 
 Command detectCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {.operands = {{"FILE", "files to look at; - is standard input", into(arguments->paths), 1,
+  return {.operands = {{"FILE", "files to examine; - is standard input", into(arguments->paths), 1,
                         Operand::anyNumber}},
           .options = {flag("json", "write JSON", into(arguments->asJson))},
           .notes = notes,

@@ -1,4 +1,4 @@
-// nls2 dump: a file in hex and, side by side, as text of a code page.
+// nls2 dump: shows a file in hex and, beside it, as text of a code page.
 
 #include "base/options.h"
 #include "codepage/code_page.h"
@@ -14,9 +14,9 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(A character stands where its first byte does, and takes as many columns as it has bytes. What does
-not print, shifts and bytes that are not valid are dots. Records begin a new line and are decoded on
-their own. The last line is the offset of the end.
+    R"(A character is shown at its first byte and takes one column per byte. Unprintable characters, shifts
+and invalid bytes are dots. Each record begins a new line and is decoded separately. The last line is
+the offset of the end.
 )";
 
 constexpr std::size_t bytesALine = 16;
@@ -27,7 +27,7 @@ struct Arguments {
   int32_t recordLength = 0; // 0: the whole file is one record
 };
 
-// Decodes byte by byte, since only that shows which bytes each character takes.
+// Decodes byte by byte, because only that shows which bytes belong to each character.
 class PageDump {
 public:
   explicit PageDump(CodePage page) : page_(std::move(page)) {
@@ -35,10 +35,10 @@ public:
     ucnv_setToUCallBack(page_.converter(), onInvalid, this, nullptr, nullptr, &error);
     requireSuccess(error, "decode");
   }
-  PageDump(const PageDump &) = delete; // the converter reports into it
+  PageDump(const PageDump &) = delete; // the converter holds a pointer to it
   PageDump &operator=(const PageDump &) = delete;
 
-  // Goes on within a record. A line is ready as soon as its text is known.
+  // Adds a byte of the record. A line is ready as soon as its text is known.
   void add(const char &byte) {
     bytes_ += byte;
     decode(&byte, false);
@@ -47,7 +47,7 @@ public:
     }
   }
 
-  // The next byte begins a record: a line, and the decoding, too.
+  // Ends the record: the next byte begins a new line, and decoding starts afresh.
   void endRecord() {
     decode("", true);
     ucnv_reset(page_.converter());
@@ -56,14 +56,14 @@ public:
     }
   }
 
-  // The line with the offset of the end.
+  // Adds a last line with the offset of the end.
   void end() { lines_ += offset_ > 0 ? fmt::format("{:08x}\n", offset_) : ""; }
 
-  // The lines that are ready since the last call.
+  // The lines completed since the last call.
   std::string takeLines() { return std::exchange(lines_, {}); }
 
 private:
-  // Every byte that is not valid is a dot. It may come before a character of the same call.
+  // Invalid bytes become dots. They may precede a character of the same call.
   static void onInvalid(const void *dump, UConverterToUnicodeArgs *, const char *, int32_t length,
                         UConverterCallbackReason reason, UErrorCode *error) {
     if (reason <= UCNV_IRREGULAR) {
@@ -72,12 +72,12 @@ private:
     }
   }
 
-  // Some converters count bytes once more that they had taken before.
+  // Some converters report bytes again that they had consumed before.
   void addDots(std::size_t length) {
     cells_.insert(cells_.end(), std::min(length, bytes_.size() - cells_.size()), ".");
   }
 
-  // One column a byte. What a wide character covers is an empty cell.
+  // One column per byte. A wide character covers the cells after its own, which stay empty.
   void addCharacter(std::u16string_view text, std::size_t length) {
     const Display display = displayOf(text);
     for (std::size_t i = 0; i < length; ++i) {
@@ -86,7 +86,7 @@ private:
     }
   }
 
-  // What the converter has taken without a character, such as a shift, is a dot.
+  // Bytes that the converter consumes without producing a character, such as shifts, become dots.
   void decode(const char *byte, bool isLast) {
     std::array<char16_t, 32> units;
     char16_t *end = units.data();
@@ -109,7 +109,7 @@ private:
     constexpr const char *digits = "0123456789abcdef";
     std::string hex;
     std::string text;
-    bool isCovered = true; // by a character of the line before, whose columns are not here
+    bool isCovered = true; // by a character of the line before
     for (std::size_t i = 0; i < length; ++i) {
       const auto byte = static_cast<unsigned char>(bytes_[i]);
       hex.append(i == bytesALine / 2 ? "  " : " ").append(1, digits[byte / 16]);
@@ -125,10 +125,10 @@ private:
   }
 
   CodePage page_;
-  uint64_t offset_ = 0;            // of the first byte that is not in a line yet
-  std::string bytes_;              // from there
-  std::vector<std::string> cells_; // what stands in their columns, as far as it is known
-  std::u16string held_;            // of a character whose second half has not come
+  uint64_t offset_ = 0;            // of the first byte not yet in a line
+  std::string bytes_;              // from that offset on
+  std::vector<std::string> cells_; // the text shown for each byte decoded so far
+  std::u16string held_;            // the first half of a surrogate pair
   std::string lines_;
 };
 
@@ -138,7 +138,7 @@ int dumpFile(const Arguments &arguments) {
   OutputFile out("-");
   out.requireOther(in);
   std::string bytes(std::size_t{64} * 1024, '\0');
-  int32_t done = 0; // of the record
+  int32_t done = 0; // bytes of the record
   while (const std::size_t got = in.read(bytes.data(), bytes.size())) {
     for (std::size_t i = 0; i < got; ++i) {
       dump.add(bytes[i]);
@@ -160,13 +160,13 @@ int dumpFile(const Arguments &arguments) {
 
 Command dumpCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {.operands = {{"FILE", "file to read; standard input if - or not given",
-                        into(arguments->path)}},
-          .options = {required(pageValue("from", "code page of the file", arguments->page)),
-                      numberValue("record-length", "N", "bytes of every record",
-                                  arguments->recordLength, 1, 1 << 30)},
-          .notes = notes,
-          .run = [arguments] { return dumpFile(*arguments); }};
+  return {
+      .operands = {{"FILE", "input file; standard input if - or not given", into(arguments->path)}},
+      .options = {required(pageValue("from", "code page of the file", arguments->page)),
+                  numberValue("record-length", "N", "length of every record, in bytes",
+                              arguments->recordLength, 1, 1 << 30)},
+      .notes = notes,
+      .run = [arguments] { return dumpFile(*arguments); }};
 }
 
 } // namespace nls2::tool

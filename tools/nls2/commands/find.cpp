@@ -1,4 +1,4 @@
-// nls2 find: the lines in which a text occurs.
+// nls2 find: prints the lines in which a text occurs.
 
 #include "base/icu_memory.h"
 #include "base/options.h"
@@ -15,10 +15,10 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(PATTERN is plain text in UTF-8, whatever the code page of the files; an empty one occurs in every
-line. Lines end in U+000A as the code page writes it, and are printed in the code page. A line whose
-bytes are not valid in the code page ends the search of its file; the other files are searched.
-Exit codes: 0 found, 1 not found, 2 anything that went wrong.
+    R"(PATTERN is plain text in UTF-8, whatever the code page of the files; an empty one is in every line.
+Lines end in the code page's line feed (U+000A) and are printed in the code page. A line with invalid
+bytes ends the search of its file; the other files are still searched.
+Exit codes: 0 found, 1 not found, 2 error.
 )";
 
 struct Arguments {
@@ -29,8 +29,8 @@ struct Arguments {
   std::vector<std::string> inputs;
 };
 
-// Most lines are ASCII, whose folding is a loop over many units at once. False if the text is not
-// ASCII; the output is of no use then.
+// Folds a text that is all ASCII, as most lines are, many units at a time. If it is not, returns
+// false and the output is useless.
 bool foldAscii(std::u16string_view text, char16_t *folded) {
   char16_t all = 0;
   for (const char16_t unit : text) {
@@ -40,7 +40,7 @@ bool foldAscii(std::u16string_view text, char16_t *folded) {
   return all < 0x80;
 }
 
-// As a whole: a page may have a pair of characters that it does not have alone.
+// Checks the pattern as a whole: a page may have a pair of characters but not each of them alone.
 void requireCharacters(const std::string &pattern, int32_t page) {
   field_translator translator(utf8_page, code_page(page), {});
   std::string encoded;
@@ -59,10 +59,10 @@ std::u16string decodedPattern(const std::string &pattern) {
   }
 }
 
-// The search for a text in lines of a code page.
+// Searches lines of a code page for a text.
 class TextSearch {
 public:
-  // Throws usageError where the code page lacks a character of the pattern.
+  // Throws usageError if the code page lacks a character of the pattern.
   explicit TextSearch(const Arguments &arguments)
       : decoder_(arguments.locale.codepage),
         encoder_(utf8_page, code_page(arguments.locale.codepage), {.bad = on_bad::replace}),
@@ -90,7 +90,7 @@ public:
 
   std::string lineFeed() const { return lineFeedOf(decoder_.page(), true); }
 
-  // UTF-8 as the lines' code page has it.
+  // Converts UTF-8 to the code page of the lines.
   std::string encode(const std::string &utf8) {
     std::string bytes;
     encoder_.translate(utf8, bytes);
@@ -122,7 +122,7 @@ private:
   const bool ignoreCase_;
   uint32_t folding_ = 0; // U_FOLD_CASE_*
   std::u16string pattern_;
-  std::string utf8Pattern_; // where lines of ASCII may be searched as bytes; else empty
+  std::string utf8Pattern_; // if ASCII lines may be searched as bytes; else empty
   std::u16string folded_;   // the last line
 };
 
@@ -140,7 +140,7 @@ public:
   }
 
 private:
-  // A file that fails does not keep the others from being searched. Output that fails ends the run.
+  // A file that cannot be read does not stop the search of the others; a failed write does.
   void searchFile(const std::string &path) {
     const std::string name = (path == "-" ? "standard input" : path) + ":";
     const std::string prefix = arguments_.inputs.size() > 1 ? name : "";
@@ -167,7 +167,7 @@ private:
       }
       return line;
     } catch (const Error &error) {
-      requireMemory(); // without it the text may be valid
+      requireMemory(); // if memory ran out, the text may be valid after all
       output_.flush();
       complain(error.what());
       failed_ = true;
@@ -187,16 +187,16 @@ private:
 
 Command findCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {.operands = {{"PATTERN", "the text to find", into(arguments->pattern), 1},
-                       {"FILE", "files to read; standard input if - or not given",
-                        into(arguments->inputs), 0, Operand::anyNumber}},
-          .options = localeOptions(
-              arguments->locale,
-              {flag("ignore-case", "fold the case of both, by the language's rules",
-                    into(arguments->ignoreCase)),
-               flag("line-number", "print the lines' numbers", into(arguments->lineNumbers), 'n')}),
-          .notes = notes,
-          .run = [arguments] { return FindRun(*arguments).run(); }};
+  return {
+      .operands = {{"PATTERN", "text to find", into(arguments->pattern), 1},
+                   {"FILE", "input files; standard input if - or not given",
+                    into(arguments->inputs), 0, Operand::anyNumber}},
+      .options = localeOptions(
+          arguments->locale,
+          {flag("ignore-case", "ignore case, by the language's rules", into(arguments->ignoreCase)),
+           flag("line-number", "print line numbers", into(arguments->lineNumbers), 'n')}),
+      .notes = notes,
+      .run = [arguments] { return FindRun(*arguments).run(); }};
 }
 
 } // namespace nls2::tool

@@ -1,4 +1,4 @@
-// nls2 locales: the library's table of locales, or its records of one name or number.
+// nls2 locales: the table of locales, or its records with a given name or number.
 
 #include "base/options.h"
 #include "codepage/page_lookup.h"
@@ -16,8 +16,8 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(Language ids are decimal or 0x... A number is looked for among the language ids first. Where several
-records are shown, the library's own searches take the first.
+    R"(Language ids are decimal or 0x... A number is looked up as a language id first, then as a code page.
+If several records are shown, the library's own searches use the first.
 )";
 
 struct Arguments {
@@ -38,7 +38,7 @@ Records recordsThat(IsWanted isWanted) {
   return records;
 }
 
-// What the text matches, by the first of the ways that finds any. Throws Error where none does.
+// The first kind of match that finds records, and the records. Throws Error if there is none.
 std::pair<const char *, Records> lookUp(const std::string &asked) {
   const auto number = wholeNumber(asked);
   const std::pair<const char *, std::function<bool(const LocaleMapEntry &)>> ways[] = {
@@ -56,7 +56,7 @@ std::pair<const char *, Records> lookUp(const std::string &asked) {
                 number ? "" : localeNear(asked));
 }
 
-// The records' code pages, each once.
+// The code pages of the records, each once.
 std::set<int32_t> pagesOf(const Records &records) {
   std::set<int32_t> pages;
   for (const LocaleMapEntry *entry : records) {

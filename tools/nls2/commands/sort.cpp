@@ -1,4 +1,4 @@
-// nls2 sort: lines or records in the order of a language.
+// nls2 sort: sorts lines or records by the rules of a language.
 
 #include "base/options.h"
 #include "io/output_file.h"
@@ -15,10 +15,9 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(The order counts case, accents and punctuation; lines that it holds equal stay in the order of the
-input. Lines end in U+000A as the code page writes it; a last line without it gets one. A line whose
-bytes are not valid in the code page is an error, and nothing is written then. All lines are held in
-memory. OUT may be one of the FILEs.
+    R"(Case, accents and punctuation count; equal lines keep their order. Lines end in the code page's line
+feed (U+000A); the last line gets one if it has none. A line with invalid bytes is an error, and then
+nothing is written. All lines are kept in memory. OUT may be one of the FILEs.
 )";
 
 struct Arguments {
@@ -28,10 +27,10 @@ struct Arguments {
   std::string output = "-";
 };
 
-// A line with its sort key. Most comparisons need the first bytes of the keys only, and those are
-// beside each other.
+// A line with its sort key. Most comparisons need only the first bytes of the keys, which are kept
+// side by side.
 struct KeyedLine {
-  uint64_t prefix;   // of the key, in an order that compares as its bytes do
+  uint64_t prefix;   // the first bytes of the key, as a number
   const char *bytes; // the key, and after it the line
   uint32_t keyLength;
   uint32_t lineLength;
@@ -45,7 +44,7 @@ struct KeyedLine {
 
 class Lines {
 public:
-  // Keeps copies of both.
+  // Copies both.
   void add(std::string_view line, std::string_view key) {
     auto *const bytes = static_cast<char *>(memory_.allocate(key.size() + line.size(), 1));
     std::copy(line.begin(), line.end(), std::copy(key.begin(), key.end(), bytes));
@@ -55,7 +54,7 @@ public:
                       static_cast<uint32_t>(line.size())});
   }
 
-  // Lines with equal keys are in the order in which they were added.
+  // Sorts the lines; those with equal keys keep the order in which they were added.
   const std::vector<KeyedLine> &sorted() {
     std::stable_sort(lines_.begin(), lines_.end());
     return lines_;
@@ -92,13 +91,13 @@ int sortFiles(const Arguments &arguments) {
 
 Command sortCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {.operands = {{"FILE", "files to read; standard input if - or not given",
+  return {.operands = {{"FILE", "input files; standard input if - or not given",
                         into(arguments->inputs), 0, Operand::anyNumber}},
           .options = orderOptions(
               arguments->order,
               {numberValue("record-length", "N", "sort records of N bytes instead of lines",
                            arguments->recordLength, 1, 1 << 30),
-               value("output", "OUT", "file to write; standard output if - or not given",
+               value("output", "OUT", "output file; standard output if - or not given",
                      into(arguments->output), 'o')}),
           .notes = notes,
           .run = [arguments] { return sortFiles(*arguments); }};

@@ -1,4 +1,4 @@
-// nls2 translate: its options and its help.
+// nls2 translate: the options and their help.
 
 #include "base/options.h"
 #include "codepage/code_page.h"
@@ -14,10 +14,10 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(Each record, line or field is translated on its own. Under --fill, --keep-blanks and --strip the
-blanks and nulls at its end are cut off, and blanks (U+0020) are put back as the option says; a null
-inside the text is refused. Nothing is lost in silence: what cannot be translated ends the run, or
-is treated as --on-error says. An output file appears only when it is complete.
+    R"(Each record, line or field is translated separately. --fill, --keep-blanks and --strip remove the
+blanks and nulls at its end, then add blanks (U+0020) as the option requires; a null inside the text
+is an error. Nothing is lost silently: text that cannot be translated ends the run, unless --on-error
+replaces or rejects it. An output file appears only when it is complete.
 )";
 
 struct Arguments {
@@ -32,7 +32,7 @@ struct Rule {
   const char *message;
 };
 
-// The first rule that is broken is the one to report.
+// Reports the first rule that is broken.
 void check(const Arguments &arguments) {
   const TranslateOptions &options = arguments.options;
   const bool hasLength = options.recordLength != 0;
@@ -41,15 +41,16 @@ void check(const Arguments &arguments) {
   const bool rejects = options.onError == OnError::reject;
   for (const auto &[isBroken, message] : {
            Rule{!arguments.to && !options.csv, "--to PAGE is missing"},
-           Rule{hasLength && arguments.lines, "--record-length and --lines exclude each other"},
+           Rule{hasLength && arguments.lines, "--record-length and --lines cannot be combined"},
            Rule{arguments.fields && !hasLength, "--fields needs --record-length"},
            Rule{!hasLength && !arguments.lines, "--record-length N or --lines is missing"},
            Rule{options.csv && arguments.to.value_or(utf8Page) != utf8Page,
-                "--csv writes UTF-8: --to must be 1208, or left out"},
+                "--csv writes UTF-8, so --to must be 1208 or omitted"},
            Rule{options.csv && options.newline.value_or(Newline::lf) != Newline::lf,
-                "--csv ends its lines in LF: --newline must be lf, or left out"},
-           Rule{options.csv && (fills || keeps || options.outLength != 0),
-                "--csv strips its fields: --fill, --keep-blanks and --out-length make no sense"},
+                "--csv ends lines in LF, so --newline must be lf or omitted"},
+           Rule{
+               options.csv && (fills || keeps || options.outLength != 0),
+               "--csv strips its fields, so --fill, --keep-blanks and --out-length cannot be used"},
            Rule{fills && options.outLength == 0 && !arguments.fields, "--fill needs --out-length"},
            Rule{rejects && !options.rejects, "--on-error reject needs --rejects FILE"},
            Rule{!rejects && options.rejects, "--rejects needs --on-error reject"},
@@ -78,13 +79,13 @@ Take set(Value &value, bool to) {
 Take set(nls2::padding &padding, nls2::padding chosen) {
   return [&padding, chosen](const std::string &) {
     if (padding != nls2::padding::as_is && padding != chosen) {
-      throw usageError("--fill, --keep-blanks and --strip exclude each other");
+      throw usageError("--fill, --keep-blanks and --strip cannot be combined");
     }
     padding = chosen;
   };
 }
 
-// One of the words of `kinds`, whose numbers are those of the enumerators.
+// Takes one of the words in `kinds`, which are in the order of the enumerators.
 template <typename Kind, typename Target>
 Take word(const char *option, Target &target, const std::vector<const char *> &kinds) {
   return [=, &target](const std::string &text) {
@@ -103,36 +104,35 @@ std::vector<Option> optionsOf(Arguments &arguments) {
   TranslateOptions &options = arguments.options;
   return {
       required(pageValue("from", "code page of the input", options.from)),
-      pageValue("to", "code page of the output; required but for --csv", arguments.to),
-      numberValue("record-length", "N", "bytes of every input record", options.recordLength, 1,
-                  longest),
-      flag("lines", "read lines that end in LF, CR LF or NEL in place of records",
+      pageValue("to", "code page of the output; not needed with --csv", arguments.to),
+      numberValue("record-length", "N", "length of every input record, in bytes",
+                  options.recordLength, 1, longest),
+      flag("lines", "read lines, ended by LF, CR LF or NEL, instead of records",
            into(arguments.lines)),
-      numberValue("skip", "N", "leave out the first N records", options.skip, 0, most),
-      numberValue("count", "M", "translate M records at the most", options.count, 0, most),
-      value("fields", "LIST", "START-END[=KIND][:WIDTH],...: the bytes of a record to put out",
+      numberValue("skip", "N", "skip the first N records", options.skip, 0, most),
+      numberValue("count", "M", "translate at most M records", options.count, 0, most),
+      value("fields", "LIST", "START-END[=KIND][:WIDTH],...: parts of a record to write",
             into(arguments.fields)),
-      numberValue("out-length", "M", "the most bytes of an output record", options.outLength, 1,
-                  longest),
+      numberValue("out-length", "M", "maximum length of an output record, in bytes",
+                  options.outLength, 1, longest),
       flag("fill", "pad with blanks to M bytes", set(options.padding, nls2::padding::fill)),
-      flag("keep-blanks", "keep the trailing blanks, or as many as fit in M",
+      flag("keep-blanks", "keep trailing blanks, as many as fit in M bytes",
            set(options.padding, nls2::padding::keep_blanks)),
       flag("strip", "drop trailing blanks", set(options.padding, nls2::padding::strip)),
-      value("newline", "KIND", "what ends every output record: none, lf, crlf or nel",
+      value("newline", "KIND", "end of every output record: none, lf, crlf or nel",
             word<Newline>("--newline", options.newline, {"none", "lf", "crlf", "nel"})),
       flag("csv", "write comma-separated values in UTF-8", into(options.csv)),
       value("on-error", "WHAT", "stop (the default), replace characters or reject records",
             word<OnError>("--on-error", options.onError, {"stop", "replace", "reject"})),
-      value("rejects", "FILE", "where rejected records go", into(options.rejects)),
+      value("rejects", "FILE", "file for rejected records", into(options.rejects)),
       flag("verify", "translate every record back and compare", into(options.verify)),
       flag("dry-run", "write no output", into(options.dryRun)),
-      value("report", "FILE", "write what was done as JSON", into(options.report)),
-      flag("progress", "show how far the run is; the default on a terminal",
-           set(options.progress, true)),
-      flag("no-progress", "do not show it", set(options.progress, false)),
-      value("output", "OUT", "file to write; standard output if - or not given",
-            into(options.output), 'o'),
-      flag("sync", "wait until the disk has it", into(options.sync)),
+      value("report", "FILE", "write a summary of the run as JSON", into(options.report)),
+      flag("progress", "show progress; the default on a terminal", set(options.progress, true)),
+      flag("no-progress", "do not show progress", set(options.progress, false)),
+      value("output", "OUT", "output file; standard output if - or not given", into(options.output),
+            'o'),
+      flag("sync", "wait until the output is on disk", into(options.sync)),
   };
 }
 
@@ -140,7 +140,7 @@ std::vector<Option> optionsOf(Arguments &arguments) {
 
 Command translateCommand() {
   const auto arguments = std::make_shared<Arguments>();
-  return {.operands = {{"INPUT", "file to read; standard input if - or not given",
+  return {.operands = {{"INPUT", "input file; standard input if - or not given",
                         into(arguments->options.input)}},
           .options = optionsOf(*arguments),
           .notes = notes,

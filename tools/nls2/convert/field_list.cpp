@@ -1,4 +1,4 @@
-// The list of --fields.
+// Parses the list of --fields.
 
 #include "base/options.h"
 #include "codepage/code_page.h"
@@ -12,7 +12,7 @@ namespace {
 
 constexpr std::size_t longest = std::size_t{1} << 30;
 
-// Cuts off what follows the separator; nothing where there is none.
+// Cuts off the text after the separator; nothing if there is no separator.
 std::optional<std::string_view> cut(std::string_view &text, char separator) {
   const std::size_t at = text.find(separator);
   if (at == std::string_view::npos) {
@@ -43,7 +43,7 @@ FieldSpec parseField(std::string_view piece, const TranslateOptions &options) {
   if (kind == "raw" || kind == "hex") {
     field.kind = kind == "raw" ? FieldSpec::Kind::raw : FieldSpec::Kind::hex;
   } else if (kind && kind != "text") {
-    require(!kind->empty(), "a kind must follow \"=\": text, raw, hex or a code page");
+    require(!kind->empty(), "\"=\" must be followed by text, raw, hex or a code page");
     field.from = parsePage(who.c_str(), std::string(*kind));
     const CodePage opens(field.from, who.c_str());
   }
@@ -53,13 +53,13 @@ FieldSpec parseField(std::string_view piece, const TranslateOptions &options) {
   require(*first != 0, "bytes are counted from 1");
   require(*end >= *first, "the range is empty");
   require(*end <= options.recordLength,
-          fmt::format("the range goes past the record of {} bytes", options.recordLength));
+          fmt::format("the range ends after the record of {} bytes", options.recordLength));
   field.begin = *first - 1;
   field.end = *end;
   const bool isRaw = field.kind == FieldSpec::Kind::raw;
   require(!isRaw || field.width == 0, "raw bytes have no width");
-  require(!isRaw || !options.csv, "raw bytes are not text, as --csv needs it; hex is");
-  require(field.width == 0 || !options.csv, "--csv strips its fields, which have no width");
+  require(!isRaw || !options.csv, "--csv needs text; use hex in place of raw");
+  require(field.width == 0 || !options.csv, "--csv strips its fields, so they have no width");
   return field;
 }
 

@@ -1,8 +1,8 @@
-// The pieces of an input in several threads, with the results in the order of the input.
+// Processes the pieces of an input in several threads and keeps the results in order.
 //
-// Why not tbb::parallel_pipeline: here everything before a failure is written before the failure
-// comes out, a read that waits for input can be ended, the pieces in flight are limited by their
-// bytes as well as their number, and where no thread is to be had the caller's does all the work.
+// Why not tbb::parallel_pipeline: here everything before a failure is written before the failure is
+// reported, a read that waits for input can be interrupted, the pieces in progress are limited by
+// bytes as well as by number, and if no thread can be started, the caller's does all the work.
 #pragma once
 
 #include <algorithm>
@@ -27,8 +27,8 @@ class Pipeline {
 public:
   explicit Pipeline(Steps &steps) : steps_(steps) {}
 
-  // Returns when all is written. The first exception of a step ends the run when the pieces before
-  // have been written, and comes out here.
+  // Returns when everything is written. The first exception of a step ends the run after the pieces
+  // before it are written, and is thrown here.
   void run() {
     // One thread more than processors, since one mostly reads or writes.
     const unsigned workers = std::clamp(std::thread::hardware_concurrency(), 1U, mostWorkers);
@@ -37,7 +37,7 @@ public:
       while (threads.size() < workers) {
         threads.emplace_back([this] { takePieces(); });
       }
-    } catch (const std::exception &) { // fewer threads than wanted will do, and none too
+    } catch (const std::exception &) { // the threads that started are enough
     }
     takePieces();
     threads.clear(); // when they have ended
@@ -50,7 +50,7 @@ private:
   static constexpr unsigned mostWorkers = 8;
   static constexpr std::size_t mostWeight = std::size_t{8} << 20;
 
-  // One piece after the other, through all of its steps.
+  // Takes one piece after another through all steps.
   void takePieces() {
     Piece piece;
     std::optional<decltype(steps_.worker())> worker;
@@ -73,8 +73,8 @@ private:
     }
   }
 
-  // The number of the piece; nothing at the end. A read that fails has a number too, so that its
-  // failure comes out after the pieces before it.
+  // The number of the piece; nothing at the end. A failed read also has a number, so that it is
+  // reported after the pieces before it.
   std::optional<std::size_t> readNext(Piece &piece, std::exception_ptr &error) {
     const std::lock_guard turn(reading_);
     std::unique_lock lock(mutex_);
@@ -94,7 +94,7 @@ private:
     return read_++;
   }
 
-  // After the first failure no piece is written.
+  // Writes no piece after the first failure.
   void writeInTurn(std::size_t number, Piece &piece, std::exception_ptr &error) {
     std::unique_lock lock(mutex_);
     changed_.wait(lock, [&] { return written_ == number; });

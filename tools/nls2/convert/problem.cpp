@@ -1,4 +1,4 @@
-// What keeps a record from being translated, and how that and a whole run are reported.
+// Problems of records, and how they and a whole run are reported.
 
 #include "convert/problem.h"
 
@@ -19,8 +19,8 @@ std::string codePointText(const Problem &problem) {
 // Of a text that does not fit, by what limits it.
 std::string widthAdvice(Limit limitedBy, const char *ofOutLength) {
   return limitedBy == Limit::outLength    ? ofOutLength
-         : limitedBy == Limit::fieldWidth ? "; give the field another width"
-                                          : "; give the field a width, or --out-length";
+         : limitedBy == Limit::fieldWidth ? "; use another width for the field"
+                                          : "; use a width for the field, or --out-length";
 }
 
 std::string counted(uint64_t count, std::string_view what) {
@@ -77,23 +77,24 @@ Explanation explain(const Problem &problem) {
   switch (problem.kind) {
   case ProblemKind::invalidBytes:
     return {notValidText(found.source_bytes(), problem.page),
-            "; is that page right? --on-error replace puts a substitution character"};
+            "; is this the right page? --on-error replace writes a substitution character instead"};
   case ProblemKind::notInPage:
     return {fmt::format("the character {}{} is not in {}", codePointText(problem),
                         found.byte_count > 0 ? " (" + bytes + ")" : "", in),
-            "; --on-error replace puts its substitution character"};
+            "; --on-error replace writes a substitution character instead"};
   case ProblemKind::tooLong:
-    return {fmt::format("the text takes {} bytes, but {} {}{}", found.needed,
-                        limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit,
-                        found.byte_count > 0 ? ", which ends before the " + bytes : ""),
-            widthAdvice(problem.limitedBy, "; give a larger --out-length")};
+    return {
+        fmt::format("the text needs {} bytes, but {} {}{}", found.needed,
+                    limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit,
+                    found.byte_count > 0 ? " (the first that does not fit: " + bytes + ")" : ""),
+        widthAdvice(problem.limitedBy, "; use a larger --out-length")};
   case ProblemKind::nullInside:
-    return {fmt::format("a null (U+0000, {}) is inside the text, and would end it", bytes),
-            "; replace it, or do without --strip, --fill, --keep-blanks, --csv and widths"};
+    return {fmt::format("a null (U+0000, {}) is inside the text and would end it", bytes),
+            "; replace it, or do not use --strip, --fill, --keep-blanks, --csv or widths"};
   case ProblemKind::noExactFill:
-    return {fmt::format("filled with blanks it can be {} bytes long, but not {}", found.needed,
-                        problem.limit),
-            widthAdvice(problem.limitedBy, "; give another --out-length")};
+    return {fmt::format("filled with blanks the text can be {} bytes long, but not {}",
+                        found.needed, problem.limit),
+            widthAdvice(problem.limitedBy, "; use another --out-length")};
   case ProblemKind::notReversible:
     if (problem.cameBack >= 0) {
       return {fmt::format("not reversible: the {} comes back from {} as {:02X}", bytes, in,
@@ -109,7 +110,7 @@ Explanation explain(const Problem &problem) {
     return {fmt::format("the input ends after {} of {} bytes", found.needed, problem.limit),
             fmt::format("; is --record-length {} right?", problem.limit)};
   case ProblemKind::beyondLimit:
-    return {"the field has more than 1 GiB", ""};
+    return {"the field is longer than 1 GiB", ""};
   default:
     return {"out of memory", "; is the record length right?"};
   }
@@ -121,11 +122,12 @@ std::string summaryOf(const Tally &tally, std::string_view unit) {
   }
   const std::string first = placeOf(*tally.first, unit) + ": " + explain(*tally.first).reason;
   if (tally.rejected > 0) {
-    return fmt::format("{} {} rejected, the first is {}", counted(tally.rejected, unit),
+    return fmt::format("{} {} rejected; the first is {}", counted(tally.rejected, unit),
                        wasOrWere(tally.rejected), first);
   }
-  return fmt::format("{} in {} {} replaced, the first in {}", counted(tally.replaced, "character"),
-                     counted(tally.replacedRecords, unit), wasOrWere(tally.replaced), first);
+  return fmt::format("{} in {} {} replaced; the first is in {}",
+                     counted(tally.replaced, "character"), counted(tally.replacedRecords, unit),
+                     wasOrWere(tally.replaced), first);
 }
 
 std::string reportOf(const Tally &tally, const TranslateOptions &options, double seconds) {

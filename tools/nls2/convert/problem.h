@@ -1,4 +1,4 @@
-// What keeps a record from being translated, and how that and a whole run are reported.
+// Problems of records, and how they and a whole run are reported.
 #pragma once
 
 #include "convert/translate_options.h"
@@ -22,7 +22,7 @@ enum class ProblemKind {
   shortRecord
 };
 
-// What a text had to fit in.
+// The limit that a text exceeded.
 enum class Limit { outLength, fieldWidth, ownLength };
 
 struct Problem {
@@ -57,12 +57,12 @@ std::string placeOf(const Problem &problem, std::string_view unit);
 
 struct Explanation {
   std::string reason; // "the character U+0416 (bytes D0 96) is not in code page 37"
-  std::string advice; // what would help, after a semicolon; empty where nothing is known to
+  std::string advice; // a hint that begins with a semicolon; may be empty
 };
 
 Explanation explain(const Problem &problem);
 
-// What became of the characters and records that were replaced or rejected; empty where none was.
+// A summary of the replaced or rejected characters and records; empty if there are none.
 std::string summaryOf(const Tally &tally, std::string_view unit);
 
 // The report as JSON.

@@ -1,4 +1,4 @@
-// How far a long run is, in one line on standard error.
+// Shows the progress of a long run in one line on standard error.
 #pragma once
 
 #include "io/signals.h"
@@ -15,8 +15,8 @@ namespace nls2::tool {
 
 class Progress {
 public:
-  // Shown where standard error is a terminal and the run lasts longer than a second, unless
-  // `wanted` says so or forbids it. `total` are the bytes of the input, where they are known.
+  // By default shown if standard error is a terminal and the run lasts longer than a second;
+  // `wanted` forces or forbids it. `total` is the size of the input, if known.
   Progress(std::optional<bool> wanted, std::optional<uint64_t> total)
       : total_(total.value_or(0)), next_(start_ + std::chrono::seconds(wanted == true ? 0 : 1)),
         isShown_(wanted.value_or(isatty(STDERR_FILENO) == 1)) {}
@@ -24,7 +24,7 @@ public:
   Progress(const Progress &) = delete;
   Progress &operator=(const Progress &) = delete;
 
-  // `bytes` of the input are done.
+  // Call it when `bytes` of the input have been processed.
   void update(uint64_t bytes) {
     const auto now = Clock::now();
     if (isShown_ && now >= next_) {

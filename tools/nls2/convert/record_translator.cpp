@@ -24,7 +24,7 @@ nls2::field_translator makeTranslator(int32_t from, int32_t to, const nls2::fiel
   return made;
 }
 
-// Quotes the last `length` bytes, a field in UTF-8, as RFC 4180 does where that is needed.
+// Quotes the last `length` bytes, a field in UTF-8, if RFC 4180 requires it.
 void quoteForCsv(ByteBuffer &out, std::size_t length) {
   const std::string_view field = out.bytes().substr(out.size() - length);
   if (field.find_first_of(",\"\r\n") == std::string_view::npos) {
@@ -38,9 +38,9 @@ void quoteForCsv(ByteBuffer &out, std::size_t length) {
   out.append(quoted + '"');
 }
 
-// As it is after a record's text, without a signature. Pages that change their mode for U+0085 have
-// no bytes that always mean it. Where nothing else is asked for, records are not ended and lines
-// are, unless they are filled.
+// The line end as it is after a text, without a signature. A page that switches modes for U+0085
+// has no fixed bytes for it. By default records get no line end and lines get LF, unless they are
+// filled.
 std::string encodedNewline(const CodePage &page, const TranslateOptions &options) {
   constexpr std::array<std::u16string_view, 4> texts{u"", u"\n", u"\r\n", u"\u0085"};
   static const std::set wide{UCNV_UTF16, UCNV_UTF32, UCNV_UTF16_BigEndian, UCNV_UTF16_LittleEndian};

@@ -19,8 +19,8 @@ public:
   // page only.
   OutputField(const FieldSpec &spec, std::size_t number, const TranslateOptions &options);
 
-  // Appends the field, and to `replaced` the characters that it lost. On failure the problem says
-  // where in the record.
+  // Appends the field, and adds the number of characters replaced in it. On failure the problem has
+  // the place in the record.
   std::optional<Problem> translate(std::string_view record, ByteBuffer &out, std::size_t &replaced);
 
 private:
@@ -49,7 +49,7 @@ public:
   // On failure the output is as it was.
   std::optional<Problem> translate(std::string_view record, ByteBuffer &out, std::size_t &replaced);
 
-  // The first character that is replaced in a record; nothing where none is.
+  // The first character replaced in a record; nothing if there is none.
   std::optional<Problem> firstReplaced(std::string_view record) const;
 
 private:

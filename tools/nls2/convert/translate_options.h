@@ -1,4 +1,4 @@
-// What `nls2 translate` is asked to do.
+// The options of `nls2 translate`.
 #pragma once
 
 #include "nls2/field_types.hpp"
@@ -14,7 +14,7 @@ namespace nls2::tool {
 enum class OnError { stop, replace, reject };
 enum class Newline { none, lf, crlf, nel };
 
-// Which bytes of a record become a field of the output.
+// The bytes of a record that become a field of the output.
 struct FieldSpec {
   enum class Kind { text, raw, hex };
 
@@ -40,7 +40,7 @@ struct TranslateOptions {
   bool verify = false;
   bool dryRun = false;
   bool sync = false;
-  std::optional<bool> progress; // nothing: where standard error is a terminal
+  std::optional<bool> progress; // by default if standard error is a terminal
   uint64_t skip = 0;
   uint64_t count = std::numeric_limits<uint64_t>::max();
   std::string input = "-";
@@ -51,8 +51,7 @@ struct TranslateOptions {
   const char *unit() const { return recordLength == 0 ? "line" : "record"; }
 };
 
-// START-END[=KIND][:WIDTH],... for records as the options have them. Throws usageError, which
-// quotes the piece that is wrong.
+// Parses START-END[=KIND][:WIDTH],... Throws usageError, which quotes the wrong piece.
 std::vector<FieldSpec> parseFields(std::string_view list, const TranslateOptions &options);
 
 // The exit code. Throws Error.

@@ -25,22 +25,21 @@ struct Piece {
   std::size_t weight() const { return batch.size(); }
 };
 
-// Those that are not wanted are null.
+// Null if not requested.
 struct Files {
   InputFile input;
   const std::unique_ptr<OutputFile> output;
   const std::unique_ptr<OutputFile> rejects;
   const std::unique_ptr<OutputFile> report;
 
-  // Throws Error, also where one would take the place of another. Only the output may replace the
-  // input.
+  // Throws Error, also if one file would overwrite another. Only the output may replace the input.
   explicit Files(const TranslateOptions &options)
       : input(options.input),
         output(options.dryRun ? nullptr : std::make_unique<OutputFile>(options.output)),
         rejects(opened(options.rejects)), report(opened(options.report)) {
     if (output && output->isDirect() && output->isSame(input.facts())) {
-      throw usageError("{} is also {}; give --output, which replaces it at the end", input.name(),
-                       output->name());
+      throw usageError("{} is also {}; use --output, which replaces the file at the end",
+                       input.name(), output->name());
     }
     requireOthers("--rejects", rejects.get(), {output.get()});
     requireOthers("--report", report.get(), {output.get(), rejects.get()});
@@ -58,7 +57,7 @@ private:
     }
     for (const OutputFile *other : others) {
       if (file != nullptr && other != nullptr && file->isSame(*other)) {
-        throw usageError("{} names a file that is written already", option);
+        throw usageError("{} names the same file as another output", option);
       }
     }
   }
@@ -74,7 +73,7 @@ std::optional<uint64_t> bytesToRead(const InputFile &input, const TranslateOptio
   return std::min(records - skipped, options.count) * options.recordLength;
 }
 
-// The bytes that a record takes in the output at the least, where it is filled.
+// The least length of a filled record in the output, in bytes; 0 if it is not filled.
 std::size_t filledLength(const TranslateOptions &options) {
   const std::size_t filled = options.padding == nls2::padding::fill ? options.outLength : 0;
   std::size_t length = options.fields.empty() ? filled : 0;
@@ -84,7 +83,7 @@ std::size_t filledLength(const TranslateOptions &options) {
   return length;
 }
 
-// Batches are small enough for their output to be small too.
+// Batches are small, so that their output is small too.
 RecordShape shapeOf(const TranslateOptions &options) {
   return {.length = options.recordLength,
           .page = options.from,
@@ -146,8 +145,8 @@ void TranslateRun::summarize() {
   }
 }
 
-// The work buffers of a worker grow with the longest record: those for a very long one are not
-// kept.
+// A worker's buffers grow with its longest record, so a batch with a very long record gets a
+// translator of its own.
 void TranslateRun::work(RecordTranslator &worker, Piece &piece) const {
   piece.output.clear(usualOutput);
   piece.rejects.clear(usualOutput);
@@ -163,7 +162,7 @@ void TranslateRun::work(RecordTranslator &worker, Piece &piece) const {
   piece.tally.bytesOut = piece.output.size();
 }
 
-// False ends the piece, and the run.
+// False ends the piece and the run.
 bool TranslateRun::translate(RecordTranslator &worker, const Record &record, Piece &piece) const {
   Tally &tally = piece.tally;
   std::size_t replaced = 0;
@@ -213,7 +212,7 @@ void TranslateRun::write(Piece &piece) {
 
 } // namespace
 
-// The report comes last of all, after a failure too.
+// The report is written last, and after a failure too.
 int translateFile(const TranslateOptions &options) {
   const RecordTranslator translator(options);
   Files files(options);

@@ -1,4 +1,4 @@
-// A block of bytes that grows, and whose room is not cleared first as a std::string's is.
+// A growing byte buffer that, unlike std::string, does not clear new room.
 #pragma once
 
 #include <algorithm>
@@ -17,7 +17,7 @@ public:
   ByteBuffer(const ByteBuffer &) = delete;
   ByteBuffer &operator=(const ByteBuffer &) = delete;
 
-  // Room after the bytes, `length` of it at least. Throws std::bad_alloc.
+  // At least `length` bytes of room after the bytes. Throws std::bad_alloc.
   std::span<char> room(std::size_t length) {
     if (capacity_ - size_ < length) {
       const std::size_t capacity = std::max(size_ + length, capacity_ + capacity_ / 2);
@@ -30,14 +30,14 @@ public:
     }
     return {data_ + size_, capacity_ - size_};
   }
-  // The first `length` bytes of the room become bytes of the buffer.
+  // Makes the first `length` bytes of the room part of the buffer.
   void commit(std::size_t length) { size_ += length; }
   void append(std::string_view bytes) {
     std::copy(bytes.begin(), bytes.end(), room(bytes.size()).begin());
     commit(bytes.size());
   }
   void truncate(std::size_t size) { size_ = size; }
-  // Gives the memory back as well when it is more than `most`.
+  // Also frees the memory if it is more than `most`.
   void clear(std::size_t most) {
     size_ = 0;
     if (capacity_ > most) {

@@ -1,4 +1,4 @@
-// Where a command reads from: a file or standard input.
+// Reads from a file or from standard input.
 
 #include "io/input_file.h"
 
@@ -58,7 +58,7 @@ std::size_t InputFile::read(char *buffer, std::size_t length) {
   }
 }
 
-// Devices such as terminals "seek" without doing so.
+// Terminals and other devices accept a seek but ignore it, so only regular files are sought.
 void InputFile::skip(uint64_t bytes) {
   constexpr uint64_t farthest = std::numeric_limits<off_t>::max();
   if (const auto left = bytesLeft()) {
@@ -66,7 +66,7 @@ void InputFile::skip(uint64_t bytes) {
     if (lseek(fd_, static_cast<off_t>(sought), SEEK_CUR) < 0) {
       fail();
     }
-    bytes -= sought; // a file of /proc has more than it says
+    bytes -= sought; // files in /proc are longer than their size
   }
   constexpr std::size_t chunk = std::size_t{64} * 1024;
   const auto dropped = std::make_unique_for_overwrite<char[]>(chunk);

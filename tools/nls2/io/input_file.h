@@ -1,4 +1,4 @@
-// Where a command reads from: a file or standard input.
+// Reads from a file or from standard input.
 #pragma once
 
 #include <cstddef>
@@ -18,17 +18,16 @@ public:
   InputFile(const InputFile &) = delete;
   InputFile &operator=(const InputFile &) = delete;
 
-  // Up to `length` bytes, as many as are there at once; 0 at the end, and after interrupt(). Throws
+  // Up to `length` bytes, as soon as there are any; 0 at the end and after interrupt(). Throws
   // Error.
   std::size_t read(char *buffer, std::size_t length);
   void interrupt() const;
-  // Leaves out the next bytes, by seeking where the file can; fewer where it ends before. Throws
-  // Error.
+  // Skips the next bytes, by seeking if the file can; fewer if it ends first. Throws Error.
   void skip(uint64_t bytes);
-  // The bytes from here to the end, where that is known.
+  // The number of bytes to the end, if known.
   std::optional<uint64_t> bytesLeft() const;
 
-  struct stat facts() const;                        // all zero where they cannot be had
+  struct stat facts() const;                        // all zero if unavailable
   const std::string &name() const { return name_; } // for messages
 
 private:
@@ -36,10 +35,10 @@ private:
 
   std::string name_;
   const int fd_;
-  const int wakeFd_; // becomes readable for good
+  const int wakeFd_; // interrupt() makes it readable
 };
 
-// The paths of a command that reads standard input where it is given none.
+// The given paths, or standard input if there are none.
 inline std::vector<std::string> inputsOf(const std::vector<std::string> &given) {
   return given.empty() ? std::vector<std::string>{"-"} : given;
 }

@@ -1,4 +1,4 @@
-// Where a command writes: standard output, a file that appears when it is complete, or a device.
+// Writes to standard output, to a file that appears only when complete, or to a device.
 
 #include "io/output_file.h"
 
@@ -33,7 +33,7 @@ std::string directoryOf(const std::string &path) {
   return parent.empty() ? "." : parent.string();
 }
 
-// The number that a name of an open descriptor gives.
+// The descriptor that /dev/stdout, /dev/fd/N and the like name.
 std::optional<int> descriptorOf(std::string_view path) {
   if (path == "/dev/stdout" || path == "/dev/stderr") {
     return path == "/dev/stdout" ? STDOUT_FILENO : STDERR_FILENO;
@@ -48,7 +48,7 @@ std::optional<int> descriptorOf(std::string_view path) {
 
 std::string ownPath(int fd) { return fmt::format("/proc/self/fd/{}", fd); }
 
-// In a directory such as /tmp only the owner of a file, or of the directory, may replace it.
+// In a directory such as /tmp, only the owner of the file or of the directory may replace a file.
 bool isOthersInStickyDirectory(const std::string &path, const struct stat &existing) {
   struct stat directory = {};
   return stat(directoryOf(path).c_str(), &directory) == 0 && (directory.st_mode & S_ISVTX) != 0 &&
@@ -80,13 +80,14 @@ void copyAttributes(int fd, const std::string &path, const std::string &target,
 
 } // namespace
 
-// Delegates, so that the destructor removes the temporary file where this throws.
+// Delegates to the default constructor, so that the destructor removes the temporary file if this
+// throws.
 OutputFile::OutputFile(const std::string &path) : OutputFile() {
   name_ = shownName(path, "standard output");
   if (path == "-") {
     fd_ = STDOUT_FILENO;
   } else if (const auto number = descriptorOf(path)) {
-    fd_ = fcntl(*number, F_DUPFD_CLOEXEC, 0); // the same open file, its offset included
+    fd_ = fcntl(*number, F_DUPFD_CLOEXEC, 0); // the same open file, with its offset
   } else if (stat(path.c_str(), &file_) != 0) {
     makeFile(path);
   } else if (S_ISREG(file_.st_mode)) {
@@ -99,7 +100,7 @@ OutputFile::OutputFile(const std::string &path) : OutputFile() {
   }
 }
 
-// A terminal or a null device may be several things at once.
+// Terminals and the null device may serve several purposes at once.
 bool OutputFile::isSame(const struct stat &other) const {
   return file_.st_ino == other.st_ino && file_.st_dev == other.st_dev &&
          (S_ISREG(file_.st_mode) || S_ISFIFO(file_.st_mode));
@@ -121,7 +122,7 @@ void OutputFile::makeFile(const std::string &path) {
     fail();
   }
   if (lstat(path.c_str(), &link) == 0) {
-    throw failure("cannot write {}: it is a symbolic link that leads nowhere", name_);
+    throw failure("cannot write {}: it is a symbolic link to a missing file", name_);
   }
   std::error_code error;
   target_ = fs::weakly_canonical(fs::absolute(path), error);
@@ -131,8 +132,8 @@ void OutputFile::makeFile(const std::string &path) {
   openTemporary(0666);
 }
 
-// Whatever would keep the file from being replaced in the end is found now. A symbolic link stays
-// one when its file is replaced.
+// Finds out now whether the file can be replaced at the end. A symbolic link stays a link to the
+// new file.
 void OutputFile::replaceFile(const std::string &path) {
   std::error_code error;
   target_ = fs::canonical(path, error);
@@ -140,14 +141,14 @@ void OutputFile::replaceFile(const std::string &path) {
     fail();
   }
   if (isOthersInStickyDirectory(target_, file_)) {
-    throw failure("cannot write {}: it is another user's, in a directory with the sticky bit",
+    throw failure("cannot write {}: it belongs to another user, in a directory with the sticky bit",
                   name_);
   }
   openTemporary(0600);
   copyAttributes(fd_, temporary_.empty() ? ownPath(fd_) : temporary_, target_, file_);
 }
 
-// File systems without unnamed files, and systems without /proc, get a name at once.
+// File systems without unnamed files, and systems without /proc, need a name from the start.
 void OutputFile::openTemporary(mode_t mode) {
   catchEndingSignals();
   fd_ = open(directoryOf(target_).c_str(), O_TMPFILE | O_RDWR | O_CLOEXEC, mode);
@@ -162,7 +163,7 @@ void OutputFile::openTemporary(mode_t mode) {
   });
 }
 
-// Calls `make` with names beside the target until one is free.
+// Calls `make` with names in the target's directory until one is free.
 void OutputFile::takeFreeName(const std::function<int(const char *)> &make) {
   const SignalsHeldBack held;
   int made = -1;
@@ -175,7 +176,7 @@ void OutputFile::takeFreeName(const std::function<int(const char *)> &make) {
   }
   if (made < 0) {
     temporary_.clear();
-    throw failure("cannot write {}: cannot make a file in its directory: {}", name_,
+    throw failure("cannot write {}: cannot create a file in its directory: {}", name_,
                   std::strerror(errno));
   }
   *std::find(namesToRemove.begin(), namesToRemove.end(), nullptr) = temporary_.c_str();
@@ -229,8 +230,8 @@ void OutputFile::flush() {
   kept_.clear();
 }
 
-// An unnamed file can take a free name only; the step from there to the target is a rename. A file
-// system may report only at close() that bytes were lost: before the name is taken.
+// linkat() cannot replace a file, so an unnamed file first gets a free name and is then renamed.
+// close() comes first, because a file system may report lost bytes only there.
 void OutputFile::publish(bool sync) {
   const SignalsHeldBack held;
   if (temporary_.empty()) {
@@ -251,9 +252,10 @@ void OutputFile::publish(bool sync) {
   }
 }
 
-// Closing a second descriptor makes a file system report lost bytes, and standard output stays.
+// Closing a duplicate descriptor makes a file system report lost bytes and leaves standard output
+// open.
 void OutputFile::commit(bool sync) {
-  requireMemory(); // what ICU made without it must not take a file's place
+  requireMemory(); // without memory the output may be wrong
   flush();
   if (!target_.empty()) {
     publish(sync);

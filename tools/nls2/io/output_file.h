@@ -1,4 +1,4 @@
-// Where a command writes: standard output, a file that appears when it is complete, or a device.
+// Writes to standard output, to a file that appears only when complete, or to a device.
 #pragma once
 
 #include "io/input_file.h"
@@ -12,28 +12,29 @@ namespace nls2::tool {
 
 class OutputFile {
 public:
-  // "-" is standard output. A path that leads to an open descriptor, such as /dev/stdout or
-  // /dev/fd/3, is written to; a file is replaced by commit(). Throws Error.
+  // "-" is standard output. A path that names an open descriptor, such as /dev/stdout or /dev/fd/3,
+  // is written directly; commit() replaces a file. Throws Error.
   explicit OutputFile(const std::string &path);
   ~OutputFile();
   OutputFile(const OutputFile &) = delete;
   OutputFile &operator=(const OutputFile &) = delete;
 
-  // Writes at once. A reader that has gone away ends the process, as SIGPIPE does. Throws Error.
+  // Writes immediately. If the reader has gone away, ends the process as SIGPIPE does. Throws
+  // Error.
   void write(std::string_view bytes);
-  // Keeps small pieces of text until there are many; what is kept when it is destroyed is lost.
+  // Buffers small pieces. The destructor does not write what is still buffered.
   void put(std::string_view bytes);
   void flush();
-  // Without it a file that has been written disappears and the one before it stays. `sync` also
-  // waits for the disk. Throws Error.
+  // Without it the new file is discarded and the old one stays. `sync` also waits for the disk.
+  // Throws Error.
   void commit(bool sync = false);
 
-  // Whether the bytes go to the file at once, and not with commit().
+  // Whether bytes are written to the file directly, not by commit().
   bool isDirect() const { return target_.empty(); }
-  // Whether both replace, or write to, the same file.
+  // Whether both write or replace the same file.
   bool isSame(const OutputFile &other) const;
   bool isSame(const struct stat &other) const;
-  // For one that is direct: what is read would grow without end. Throws Error.
+  // Throws Error if a direct output is also this input, which would then grow without end.
   void requireOther(const InputFile &input) const;
   const std::string &name() const { return name_; } // for messages
 
@@ -49,9 +50,9 @@ private:
 
   std::string name_;
   std::string target_;    // the file that commit() makes or replaces; empty for others
-  std::string temporary_; // the name until then, while there is one
+  std::string temporary_; // its name until then, if it has one
   std::string kept_;
-  struct stat file_ = {}; // that was there before; none where the file is new
+  struct stat file_ = {}; // of the old file; all zero if there is none
   int fd_ = -1;
 };
 

@@ -1,4 +1,4 @@
-// Signals that end the process: what they remove and clear first, and how to hold them back.
+// Cleans up when a signal ends the process, and holds signals back.
 #pragma once
 
 #include <array>
@@ -8,8 +8,8 @@
 
 namespace nls2::tool {
 
-// The names of the files that they remove, with room for more than a command ever has. They change
-// only while the signals are held back, in a process with one thread.
+// The files to remove; there is room for more than a command ever has. The list changes only while
+// signals are held back and the process has one thread.
 inline std::array<const char *volatile, 8> namesToRemove{};
 
 inline std::atomic<bool> progressIsShown = false; // a line on the terminal
@@ -21,8 +21,7 @@ inline void clearProgress() {
   }
 }
 
-// Ends the process as this signal does when nobody handles it, without the files. Safe in a signal
-// handler.
+// Removes the files, then ends the process as the unhandled signal would. Safe in a signal handler.
 [[noreturn]] inline void endBySignal(int signal) {
   for (const char *name : namesToRemove) {
     if (name != nullptr) {
@@ -39,8 +38,8 @@ inline void clearProgress() {
   _exit(128 + signal);
 }
 
-// Those that end a process unless it handles them, and that others send or a clock does. Signals
-// that the caller had ignored, as nohup does, stay ignored.
+// Handles the signals that end a process by default and come from other processes or from timers. A
+// signal that the caller ignores, as nohup does, stays ignored.
 inline void catchEndingSignals() {
   for (const int signal : {SIGHUP, SIGINT, SIGQUIT, SIGTERM, SIGALRM, SIGUSR1, SIGUSR2, SIGXCPU,
                            SIGPIPE, SIGPOLL, SIGVTALRM, SIGPROF, SIGPWR, SIGSTKFLT}) {

@@ -1,4 +1,4 @@
-// The options --locale and --codepage, and the locale that a command follows without --locale.
+// The options --locale and --codepage, and the locale that applies without --locale.
 
 #include "locale/locale_option.h"
 
@@ -16,8 +16,8 @@ namespace nls2::tool {
 
 namespace {
 
-// A locale's own name wins over a short name, which may be another locale's own name. A short name
-// means the first record with its id.
+// A locale name wins over a short name, because a short name may be the name of another locale. A
+// short name means the first record with its id.
 const LocaleMapEntry *recordNamed(const std::string &name) {
   for (const LocaleMapEntry &entry : locale_records()) {
     if (name == entry.localeName) {
@@ -29,18 +29,18 @@ const LocaleMapEntry *recordNamed(const std::string &name) {
   return error ? nullptr : find_record(id);
 }
 
-// Without an encoding and a modifier: de_DE.UTF-8, de_DE@euro, de_DE.ISO-8859-15@euro.
+// The name without encoding and modifier: de_DE.UTF-8, de_DE@euro, de_DE.ISO-8859-15@euro.
 std::string withoutSuffixes(const std::string &name) {
   return name.substr(0, name.find_first_of(".@"));
 }
 
-// The script that a POSIX name's modifier asks for, as a part of a BCP 47 tag. Other modifiers,
-// such as @euro, do not change the order.
+// The script that a POSIX modifier means, as part of a BCP 47 tag. Other modifiers, such as @euro,
+// do not affect the order.
 std::string scriptAsked(const std::string &name) {
   return name.ends_with("@latin") ? "-Latn" : name.ends_with("@cyrillic") ? "-Cyrl" : "";
 }
 
-// ICU's spelling of a POSIX name or a BCP 47 tag; empty where it is neither.
+// ICU's spelling of a POSIX name or BCP 47 tag; empty if it is neither.
 std::string icuName(const std::string &name) {
   std::string tag = withoutSuffixes(name);
   std::replace(tag.begin(), tag.end(), '_', '-');
@@ -52,7 +52,7 @@ std::string icuName(const std::string &name) {
   return U_SUCCESS(error) && parsed == static_cast<int32_t>(tag.size()) ? icu : "";
 }
 
-// ICU's name of the locale that a name in any spelling means; empty where localeMap lacks it.
+// ICU's name of the locale that a name means in any spelling; empty if localeMap lacks it.
 std::string knownLocale(const std::string &name) {
   const std::string plain = withoutSuffixes(name);
   const std::string icu = icuName(name);
@@ -64,7 +64,7 @@ std::string knownLocale(const std::string &name) {
   return entry != nullptr ? entry->localeName : "";
 }
 
-// A locale with its likely script and region: de_Latn_DE for de.
+// The locale with its likely script and region: de_Latn_DE for de.
 icu::Locale fullLocale(const std::string &name) {
   icu::Locale locale(name.c_str());
   UErrorCode error = U_ZERO_ERROR;
@@ -72,7 +72,8 @@ icu::Locale fullLocale(const std::string &name) {
   return locale;
 }
 
-// localeMap has one of the Norwegian languages, with the same order; others had codes before.
+// localeMap has only one of the Norwegian languages; the order is the same. Some languages had
+// other codes.
 std::string_view languageOf(const icu::Locale &locale) {
   const std::string_view language = locale.getLanguage();
   return language == "nb" || language == "no" ? "nn"
@@ -81,9 +82,8 @@ std::string_view languageOf(const icu::Locale &locale) {
                                               : language;
 }
 
-// The locale of localeMap that suits best among those of a locale's language: of its script before
-// others, and then of its region, of the language's main one, or the first. Empty where there is
-// none.
+// The locale in localeMap that suits a language best: of the same script, then of the same region,
+// then of the language's main region; else the first. Empty if the language has none.
 std::string localeOfLanguage(const std::string &name) {
   const std::string icu = icuName(name);
   if (icu.empty()) {
@@ -119,7 +119,7 @@ std::string parseLocale(const std::string &text) {
   return known;
 }
 
-// The variable that names the environment's locale, and the name.
+// The environment variable that sets the locale, and its value.
 std::pair<const char *, std::string> environmentLocale() {
   for (const char *variable : {"LC_ALL", "LC_COLLATE", "LANG"}) {
     if (const char *value = std::getenv(variable); value != nullptr && *value != '\0') {
@@ -140,8 +140,7 @@ std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> ow
   const auto takeLocale = [&](const std::string &text) { options.locale = parseLocale(text); };
   own.insert(
       own.begin(),
-      {value("locale", "LOCALE", "whose rules: a name or language id of `nls2 locales`",
-             takeLocale),
+      {value("locale", "LOCALE", "whose rules apply: a name or id from `nls2 locales`", takeLocale),
        pageValue("codepage", "code page of all texts; 1208 (UTF-8) by default", options.codepage)});
   return own;
 }
@@ -155,7 +154,7 @@ std::string orderLocale(const LocaleOptions &options) {
   std::string locale = known.empty() ? localeOfLanguage(name) : known;
   if (locale.empty()) {
     throw usageError(
-        "{}: \"{}\" is not a known locale{}; give --locale one of those that `nls2 locales` lists",
+        "{}: \"{}\" is not a known locale{}; use --locale with a name that `nls2 locales` lists",
         variable, printable(name), localeNear(name));
   }
   return locale;

@@ -1,4 +1,4 @@
-// The options --locale and --codepage, and the locale that a command follows without --locale.
+// The options --locale and --codepage, and the locale that applies without --locale.
 #pragma once
 
 #include "base/options.h"
@@ -14,23 +14,22 @@ namespace nls2::tool {
 inline constexpr std::string_view byCodePoint = "en_US_POSIX"; // ICU's name of the locale C
 
 struct LocaleOptions {
-  std::optional<std::string> locale; // the name in ICU's spelling of a locale that is known
+  std::optional<std::string> locale; // of localeMap, in ICU's spelling
   int32_t codepage = utf8Page;
 };
 
-// " (did you mean de_DE?)" for a name that is not in the table.
+// " (did you mean de_DE?)": the locale of the same language; empty if there is none.
 std::string localeNear(const std::string &name);
 
-// The two options, and after them a command's own.
+// The two options, followed by the command's own.
 std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> own);
 
-// The locale whose order of texts counts, byCodePoint for C and POSIX: of --locale, or of the
-// environment (LC_ALL, LC_COLLATE, LANG), which may also be another locale of a language that
-// localeMap holds. Throws usageError where localeMap does not hold the environment's language.
+// The locale that determines the order, byCodePoint for C and POSIX: from --locale or from the
+// environment (LC_ALL, LC_COLLATE, LANG). For the environment it may be another locale of the
+// language. Throws usageError if localeMap has no locale of that language.
 std::string orderLocale(const LocaleOptions &options);
 
-// Whether i without a dot is a letter of the locale's language. The environment's language may be
-// any.
+// Whether the language has a dotless i, as Turkish does. The environment's language may be any.
 bool hasDotlessI(const LocaleOptions &options);
 
 } // namespace nls2::tool

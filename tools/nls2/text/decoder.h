@@ -1,4 +1,4 @@
-// Texts of a code page as UTF-16.
+// Decodes texts of a code page to UTF-16.
 #pragma once
 
 #include "base/errors.h"
@@ -18,7 +18,7 @@
 
 namespace nls2::tool {
 
-// Whether all bytes are below 0x80. Looks at every one, which the compiler does for many at once.
+// Whether all bytes are below 0x80. Without an early exit, so that the compiler can vectorize it.
 inline bool isAscii(std::string_view bytes) {
   unsigned char all = 0;
   for (const char byte : bytes) {
@@ -27,19 +27,19 @@ inline bool isAscii(std::string_view bytes) {
   return all < 0x80;
 }
 
-// A text without the nulls at its end. Throws TextFault where text follows a null.
+// The text without trailing nulls. Throws TextFault if text follows a null.
 inline std::u16string_view withoutNulls(std::u16string_view text) {
-  if (std::count(text.begin(), text.end(), u'\0') == 0) { // faster than to look for the first
+  if (std::count(text.begin(), text.end(), u'\0') == 0) { // faster than find()
     return text;
   }
   const std::size_t null = text.find(u'\0');
   if (text.find_first_not_of(u'\0', null) != text.npos) {
-    throw TextFault(": text follows a null (U+0000), where it would not be seen");
+    throw TextFault(": text follows a null (U+0000) and would be ignored");
   }
   return text.substr(0, null);
 }
 
-// A text without the tabs and space characters at its end.
+// The text without trailing tabs and space characters.
 inline std::u16string_view withoutBlanks(std::u16string_view text) {
   for (std::size_t end = text.size(); end > 0; text = text.substr(0, end)) {
     UChar32 character = 0;
@@ -51,10 +51,10 @@ inline std::u16string_view withoutBlanks(std::u16string_view text) {
   return text;
 }
 
-// Decodes through one converter that stays open. For one thread at a time.
+// Keeps one converter open. For one thread at a time.
 class Decoder {
 public:
-  // Of the option --codepage. Throws usageError where the page does not open.
+  // The page of --codepage. Throws usageError if it does not open.
   explicit Decoder(int32_t page)
       : page_(page, "--codepage"), isUtf8_(ucnv_getType(page_.converter()) == UCNV_UTF8) {
     UErrorCode error = U_ZERO_ERROR;
@@ -62,8 +62,8 @@ public:
                         &error);
   }
 
-  // A text of up to 1 GiB, valid until the next call. Throws TextFault where bytes are not valid in
-  // the page. UTF-8 goes without the converter, which takes longer to start than a short line to
+  // Decodes up to 1 GiB; the result is valid until the next call. Throws TextFault for invalid
+  // bytes. UTF-8 bypasses the converter, which takes longer to start than a short line takes to
   // decode.
   std::u16string_view decode(std::string_view bytes) {
     units_.resize(std::max(units_.size(), bytes.size() + 1));
@@ -106,7 +106,7 @@ private:
     }
   }
 
-  // `consumed` bytes end with those that are to blame.
+  // The last of the `consumed` bytes are the invalid ones.
   TextFault invalidBytes(std::size_t consumed) const {
     char bytes[32];
     int8_t count = sizeof bytes;

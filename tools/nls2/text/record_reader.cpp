@@ -1,4 +1,4 @@
-// Records of one length, or lines, read in batches of many or one by one.
+// Reads records of one length, or lines, in batches or one by one.
 
 #include "text/record_reader.h"
 
@@ -17,8 +17,8 @@ std::string bytesOf(const CodePage &page, char16_t character) {
   return encoded ? encoded->bytes : "";
 }
 
-// Searching bytes finds characters only where no character's bytes can hold another's. That is so
-// for single bytes below 0x40 in every page, and for the encodings of Unicode that are searched.
+// A byte search is correct only if the bytes of the line end cannot be part of another character.
+// That holds for single bytes below 0x40 in every page, and in the Unicode encodings listed here.
 std::string bytesOfNel(const CodePage &page) {
   static const std::set searched{UCNV_UTF8,
                                  UCNV_CESU8,
@@ -38,18 +38,19 @@ std::string lineFeedOf(const CodePage &page, bool isMoved) {
   static const std::set withStates{UCNV_HZ, UCNV_ISO_2022};
   std::string bytes = bytesOf(page, u'\n');
   if (bytes.empty()) {
-    throw usageError("code page {} has no line feed to end lines", page.number());
+    throw usageError("code page {} has no line feed", page.number());
   }
   const UConverterType type = ucnv_getType(page.converter());
   if (dependent.contains(type) || (isMoved && withStates.contains(type))) {
-    throw usageError("lines of code page {} depend on the text before them; of UTF-16 and UTF-32 "
-                     "give the page without a signature, such as 1200",
-                     page.number());
+    throw usageError(
+        "code page {} cannot be read by lines, since a line depends on the text before "
+        "it; for UTF-16 and UTF-32 use a page without a signature, such as 1200",
+        page.number());
   }
   return bytes;
 }
 
-// UTF-8 has a byte as its unit, and an end of two bytes that cannot begin inside a character.
+// In UTF-8 the unit is a byte: its NEL has two, which cannot begin inside a character.
 std::size_t EndPattern::next(std::string_view text, std::size_t from) {
   if (bytes_.empty() || (found_ != npos && found_ >= from)) {
     return found_;
@@ -120,14 +121,13 @@ void RecordReader::readMore(RecordBatch &batch, std::size_t most) {
   ended_ = got == 0;
 }
 
-// Keeps the bytes from there on for the next batch.
+// Keeps the bytes from `from` on for the next batch.
 void RecordReader::carry(RecordBatch &batch, std::size_t from) {
   carried_ = batch.bytes_.bytes().substr(from);
   batch.bytes_.truncate(from);
 }
 
-// Records are skipped by their length. No byte after the last record wanted is taken from the
-// input.
+// Skips records by their length. Reads no byte after the last record wanted.
 std::size_t RecordReader::readRecords(RecordBatch &batch) {
   constexpr uint64_t farthest = std::numeric_limits<uint64_t>::max();
   if (shape_.skip > 0) {
@@ -145,7 +145,7 @@ std::size_t RecordReader::readRecords(RecordBatch &batch) {
   return 0;
 }
 
-// Lines can be skipped only by looking at them.
+// Lines must be read to be skipped.
 std::size_t RecordReader::readLines(RecordBatch &batch) {
   scanned_ = 0;
   lineFeed_.restart();
@@ -153,7 +153,7 @@ std::size_t RecordReader::readLines(RecordBatch &batch) {
   std::size_t skipped = findLines(batch);
   while (scanned_ == 0 && !ended_) {
     if (batch.bytes_.size() > longestLine) {
-      throw failure("{}: line {} at byte {}: it is longer than 1 GiB", input_.name(), records_ + 1,
+      throw failure("{}: line {} at byte {}: longer than 1 GiB", input_.name(), records_ + 1,
                     offset_);
     }
     readMore(batch, usualBatch);
@@ -163,7 +163,7 @@ std::size_t RecordReader::readLines(RecordBatch &batch) {
   return skipped;
 }
 
-// The bytes of lines that are skipped, which come first.
+// Returns the number of bytes in skipped lines, which come first.
 std::size_t RecordReader::findLines(RecordBatch &batch) {
   const std::string_view text = batch.bytes_.bytes();
   std::size_t skipped = 0;
@@ -186,8 +186,8 @@ std::size_t RecordReader::findLines(RecordBatch &batch) {
   return skipped;
 }
 
-// LF, CR LF and NEL (U+0085) end a line. It has no bytes where its end is not in the text yet; the
-// last line may have no end.
+// LF, CR LF and NEL (U+0085) end a line; the last line may have no end. Empty if the end is not in
+// the text yet.
 RecordBatch::LineBounds RecordReader::nextLine(std::string_view text) {
   const std::size_t lf = lineFeed_.next(text, scanned_);
   const std::size_t nel = nextLine_.next(text, scanned_);

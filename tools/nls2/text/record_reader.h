@@ -1,4 +1,4 @@
-// Records of one length, or lines, read in batches of many or one by one.
+// Reads records of one length, or lines, in batches or one by one.
 #pragma once
 
 #include "base/errors.h"
@@ -11,7 +11,7 @@
 
 namespace nls2::tool {
 
-// What the records of a file are, and which of them are wanted.
+// The form of the records of a file, and which of them to read.
 struct RecordShape {
   std::size_t length = 0; // bytes of each; 0: lines
   int32_t page = 0;       // in which lines end
@@ -28,31 +28,31 @@ struct Record {
   uint64_t offset = 0;    // in the input
 };
 
-// The line feed of a page. Throws usageError where it has none, and where lines depend on the text
-// before them; with `isMoved`, for lines that get other neighbours, also where they may do so.
+// The line feed of a page. Throws usageError if the page has none, or if lines depend on the text
+// before them; with `isMoved` (lines are reordered or selected) also if they may depend on it.
 std::string lineFeedOf(const CodePage &page, bool isMoved);
 
-// One way to write a line's end, and the search for it in a text that grows at its end.
+// One form of line end, and the search for it in a text that grows at its end.
 class EndPattern {
 public:
   explicit EndPattern(std::string bytes) : bytes_(std::move(bytes)) {}
 
   std::size_t length() const { return bytes_.size(); }
-  // The first place from `from` on, a whole number of units from the text's beginning; npos where
-  // there is none yet. `from` never goes back.
+  // The first place at or after `from`, counted in whole units from the beginning of the text; npos
+  // if there is none yet. `from` never decreases.
   std::size_t next(std::string_view text, std::size_t from);
-  // For a new text, which begins at a line's beginning.
+  // Starts a new text, which begins at the beginning of a line.
   void restart();
 
 private:
-  std::string bytes_; // one unit; none where the page does not have the character
+  std::string bytes_; // one unit; empty if the page lacks the character
   std::size_t found_ = std::string_view::npos;
   std::size_t searched_ = 0; // no place before this one
 };
 
 class RecordBatch {
 public:
-  // Nothing after the last one. The last record of the input may be shorter than the others.
+  // Nothing after the last one. The last record of the input may be too short.
   std::optional<Record> next();
   std::size_t size() const { return bytes_.size(); }
 
@@ -73,16 +73,15 @@ private:
 
 class RecordReader {
 public:
-  // Throws usageError for a page that has no line feed, or in which a line cannot be read without
-  // the text before it.
+  // Throws usageError if the page has no line feed, or if its lines depend on the text before them.
   RecordReader(InputFile &input, const RecordShape &shape);
 
-  // The next records, as soon as there is one, or lines that were skipped; false at the end of the
-  // input. Throws Error.
+  // Reads the next records as soon as there is one, or skips lines; false at the end of the input.
+  // Throws Error.
   bool read(RecordBatch &batch);
 
 private:
-  // The bytes of the batch that were skipped.
+  // Both return the number of bytes skipped in the batch.
   std::size_t readRecords(RecordBatch &batch);
   std::size_t readLines(RecordBatch &batch);
   std::size_t findLines(RecordBatch &batch);
@@ -91,30 +90,30 @@ private:
   void carry(RecordBatch &batch, std::size_t from);
 
   InputFile &input_;
-  RecordShape shape_; // `count` are those that may still be read, `skip` those to be skipped yet
+  RecordShape shape_; // with `count` and `skip` of what is left to read
   EndPattern lineFeed_{""};
   EndPattern nextLine_{""};
   std::string carriageReturn_;
-  std::string carried_;     // the beginning of a record whose end has not been read
+  std::string carried_;     // an incomplete record at the end of the last batch
   std::size_t scanned_ = 0; // where the next line of the batch begins
   uint64_t records_ = 0;
   uint64_t offset_ = 0;
   bool ended_ = false;
 };
 
-// The records of one file, for a command that reads them one by one.
+// Reads the records of one file one by one.
 class RecordFile {
 public:
   // Throws Error.
   RecordFile(const std::string &path, const RecordShape &shape)
       : input_(path), shape_(shape), reader_(input_, shape) {}
 
-  // The next record, valid until the next call; nothing at the end. The last line need not have its
-  // end, the last record must be whole. Throws Error.
+  // The next record, valid until the next call; nothing at the end. Only the last line may lack its
+  // end; a short last record is an Error.
   std::optional<Record> next();
   const InputFile &input() const { return input_; }
 
-  // What `use` makes of its text. Throws Error, which says where the record is, for a TextFault.
+  // Calls `use` with the text. Turns a TextFault into an Error that names the place of the record.
   template <typename Use>
   auto apply(const Record &record, Use use) const {
     try {

@@ -1,4 +1,4 @@
-// The order of texts in a language, for sort and compare.
+// Sort keys in the order of a language, for sort and compare.
 #pragma once
 
 #include "locale/locale_option.h"
@@ -15,15 +15,15 @@ struct OrderOptions {
   bool ignoreTrailing = false;
 };
 
-// The options, with a command's own at the end.
+// The common options, followed by the command's own.
 inline std::vector<Option> orderOptions(OrderOptions &options, std::vector<Option> own = {}) {
   own.insert(own.begin(),
-             flag("ignore-trailing", "trailing blanks do not count", into(options.ignoreTrailing)));
+             flag("ignore-trailing", "ignore trailing blanks", into(options.ignoreTrailing)));
   return localeOptions(options.locale, std::move(own));
 }
 
-// Gives every text a key; the keys' bytes compare as the library's comparison orders the texts, and
-// for the locale C as their code points do. For one thread at a time.
+// Makes sort keys. Keys compare as the library's comparison orders the texts; for the locale C, by
+// code point. For one thread at a time.
 class TextOrder {
 public:
   // Throws usageError.
@@ -36,13 +36,13 @@ public:
     UErrorCode error = U_ZERO_ERROR;
     collator_.adoptInstead(ucol_open(locale.c_str(), &error));
     if (U_FAILURE(error)) {
-      throw failure("cannot open the order of {}: {}", locale, statusText(error));
+      throw failure("cannot open the collation of {}: {}", locale, statusText(error));
     }
     ucol_setStrength(collator_.getAlias(), UCOL_TERTIARY);
   }
 
-  // Valid until the next call. Throws TextFault. The library's comparison makes nulls of trailing
-  // blanks; the collator ignores nulls, so that cutting them off is the same.
+  // Valid until the next call. Throws TextFault. The library's comparison turns trailing blanks
+  // into nulls, which the collator ignores; removing them is equivalent.
   std::string_view keyOf(std::string_view bytes) {
     std::u16string_view text = decoder_.decode(bytes);
     if (ignoreTrailing_) {
@@ -54,7 +54,7 @@ public:
     const int32_t length = ucol_getSortKey(
         collator_.getAlias(), text.data(), static_cast<int32_t>(text.size()),
         reinterpret_cast<uint8_t *>(key_.data()), static_cast<int32_t>(key_.size()));
-    if (length <= 0) { // also the key of an empty text has a byte, its terminator
+    if (length <= 0) { // even an empty text has a key of one byte, the terminator
       throw std::bad_alloc();
     }
     if (static_cast<std::size_t>(length) > key_.size()) {
@@ -81,7 +81,7 @@ private:
 
   Decoder decoder_;
   const bool ignoreTrailing_;
-  icu::LocalUCollatorPointer collator_; // none: by code point
+  icu::LocalUCollatorPointer collator_; // null: order by code point
   std::string key_ = std::string(256, '\0');
 };
 
