@@ -20,9 +20,9 @@
 #pragma once
 
 #include "nls2.h"
+#include "support/exact.h"
 #include "support/probe.h"
 
-#include <algorithm>
 #include <functional>
 #include <map>
 #include <memory>
@@ -46,14 +46,6 @@ public:
 private:
   NLS2_Locale *object_;
 };
-
-// The characters alone, in a block of their own, where a sanitizer sees a read past them.
-template <class Unit>
-std::unique_ptr<Unit[]> exact(const std::basic_string<Unit> &text) {
-  auto block = std::make_unique<Unit[]>(text.size());
-  std::copy(text.begin(), text.end(), block.get());
-  return block;
-}
 
 using Names = std::map<const void *, std::string>;
 

@@ -1,7 +1,7 @@
 // nls2::field_translator: the table against the general path, room to the byte, and what every
 // result promises.
 
-#include "checks.h"
+#include "property.h"
 
 #include <map>
 #include <nls2.hpp>
@@ -9,7 +9,6 @@
 
 namespace {
 
-using fuzz::check;
 using nls2::code_page;
 using nls2::field_policy;
 using nls2::field_problem;
@@ -17,6 +16,7 @@ using nls2::field_result;
 using nls2::field_translator;
 using nls2::on_bad;
 using nls2::padding;
+using property::check;
 
 // Translators live from one input to the next, so that a state left behind shows.
 using Key = std::tuple<int32_t, int32_t, int, size_t, int, bool, bool>;
@@ -35,8 +35,8 @@ struct Answer {
 
 // Into a heap block of exactly `room` bytes.
 Answer translated(field_translator &with, const std::string &field, size_t room) {
-  const auto source = fuzz::exact(field);
-  const fuzz::Output<char> block(room);
+  const auto source = property::exact(field);
+  const property::Output<char> block(room);
   const field_result result =
       with.translate(std::span(source.get(), field.size()), std::span(block.get(), room));
   check(result.written <= room, "no more is written than there is room");
@@ -90,25 +90,26 @@ void checkAgainstC(code_page from, code_page to, const Answer &answer, const std
         "the bytes of NLS2_TranslateString");
 }
 
-field_policy policyFrom(FuzzedDataProvider &input) {
+field_policy policyFrom(property::Input &input) {
   constexpr padding paddings[] = {padding::as_is, padding::strip, padding::fill,
                                   padding::keep_blanks};
-  field_policy policy{.padding = input.PickValueInArray(paddings)};
-  const auto width = input.ConsumeIntegralInRange<size_t>(0, 20);
+  field_policy policy{.padding = input.oneOf(paddings)};
+  const auto width = input.below(21);
   policy.width = policy.padding == padding::fill ? width + 1 : width;
-  policy.bad = input.ConsumeBool() ? on_bad::stop : on_bad::replace;
-  policy.drop_ignorable = input.ConsumeBool();
+  policy.bad = input.flag() ? on_bad::stop : on_bad::replace;
+  policy.drop_ignorable = input.flag();
   return policy;
 }
 
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
-  FuzzedDataProvider input(data, size);
-  const code_page from(fuzz::page(input).number);
-  const code_page to(fuzz::page(input).number);
+  property::Input input(data, size);
+  const property::Page page = input.page();
+  const code_page from(page.number);
+  const code_page to(input.page().number);
   field_policy policy = policyFrom(input);
-  const std::string field = input.ConsumeRemainingBytesAsString();
+  const std::string field = input.text(page);
 
   if (made.size() > 2000) {
     made.clear();

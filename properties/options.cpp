@@ -1,23 +1,36 @@
 // The command line of nls2: the parser over every command's tables, and the list of --fields.
 
 #include "base/options.h"
-#include "checks.h"
 #include "convert/translate_options.h"
+#include "property.h"
 
 #include <getopt.h>
 #include <vector>
 
 namespace {
 
-using fuzz::check;
+using property::check;
 using namespace nls2::tool;
 
-void fieldList(FuzzedDataProvider &input) {
+// Any bytes, or pieces of what the command takes.
+std::string line(property::Input &input, const std::vector<const char *> &pieces) {
+  if (input.flag()) {
+    return input.bytes(SIZE_MAX);
+  }
+  std::string text;
+  for (size_t count = input.below(20); count > 0; --count) {
+    text += input.oneOf(pieces);
+  }
+  return text;
+}
+
+void fieldList(property::Input &input) {
   TranslateOptions options;
   options.from = 37;
-  options.recordLength = input.ConsumeIntegralInRange<size_t>(1, 200);
-  options.csv = input.ConsumeBool();
-  const std::string list = input.ConsumeRemainingBytesAsString();
+  options.recordLength = 1 + input.below(200);
+  options.csv = input.flag();
+  const std::string list =
+      line(input, {"1-", "1-10", "11-", "200", ",", "=", "hex", "=raw", ":", "5", "930"});
   try {
     const std::vector<FieldSpec> fields = parseFields(list, options);
     check(!fields.empty(), "a list that parses has a field");
@@ -32,13 +45,15 @@ void fieldList(FuzzedDataProvider &input) {
 }
 
 // Arguments are what lies between line feeds. Nothing is run.
-void commandLine(FuzzedDataProvider &input) {
+void commandLine(property::Input &input) {
   constexpr Command (*commands[])() = {catCommand,  codepagesCommand, compareCommand,
                                        dumpCommand, detectCommand,    findCommand,
                                        sortCommand, localesCommand,   translateCommand};
-  const Command command = input.PickValueInArray(commands)();
+  const Command command = input.oneOf(commands)();
   std::vector<std::string> words(1, "nls2");
-  std::string text = input.ConsumeRemainingBytesAsString();
+  std::string text =
+      line(input, {"--from\n37\n", "--to\n", "1208\n", "--record-length\n80\n", "--fields=1-10\n",
+                   "--str", "ip\n", "-o\n", "x\n", "--locale=de_DE\n", "-", "=", "--help\n"});
   for (size_t at = 0; at < text.size() && words.size() < 30;) {
     const size_t end = std::min(text.find('\n', at), text.size());
     words.push_back(text.substr(at, end - at));
@@ -60,7 +75,7 @@ void commandLine(FuzzedDataProvider &input) {
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
-  FuzzedDataProvider input(data, size);
-  input.ConsumeBool() ? fieldList(input) : commandLine(input);
+  property::Input input(data, size);
+  input.flag() ? fieldList(input) : commandLine(input);
   return 0;
 }

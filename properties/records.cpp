@@ -2,7 +2,7 @@
 // where it must be.
 
 #include "base/errors.h"
-#include "checks.h"
+#include "property.h"
 #include "text/record_reader.h"
 
 #include <fcntl.h>
@@ -11,13 +11,13 @@
 
 namespace {
 
-using fuzz::check;
+using property::check;
 using namespace nls2::tool;
 
 // A file in memory, by a name that opens it.
 class File {
 public:
-  explicit File(const std::string &bytes) : fd_(memfd_create("fuzz", 0)) {
+  explicit File(const std::string &bytes) : fd_(memfd_create("property", 0)) {
     check(write(fd_, bytes.data(), bytes.size()) == static_cast<ssize_t>(bytes.size()), "a file");
   }
   ~File() { close(fd_); }
@@ -64,13 +64,14 @@ void checkFile(const RecordShape &shape, const std::string &bytes, const File &f
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
-  FuzzedDataProvider input(data, size);
+  property::Input input(data, size);
   RecordShape shape;
-  shape.page = fuzz::page(input).number;
-  shape.length = input.ConsumeIntegralInRange<size_t>(0, 40);
-  shape.isText = input.ConsumeBool();
-  shape.mostInBatch = input.ConsumeIntegralInRange<uint64_t>(1, 4);
-  const std::string bytes = input.ConsumeRemainingBytesAsString();
+  const property::Page page = input.page();
+  shape.page = page.number;
+  shape.length = input.below(41);
+  shape.isText = input.flag();
+  shape.mostInBatch = 1 + input.below(4);
+  const std::string bytes = input.text(page);
   const File file(bytes);
   try {
     checkBatches(shape, bytes, file);
