@@ -1,8 +1,8 @@
 // nls2::field_translator: the table against the general path, and both against bare ICU.
 
-#include <nls2.hpp>
+#include "nls2.hpp"
+#include "support/probe.h"
 
-#include <cstdlib>
 #include <gtest/gtest.h>
 #include <random>
 #include <sstream>
@@ -18,8 +18,6 @@ using nls2::field_result;
 using nls2::field_translator;
 using nls2::on_bad;
 using nls2::padding;
-
-[[maybe_unused]] std::size_t allocations = 0;
 
 // Every code page that opens, of the numbers in use.
 const std::vector<code_page> &allPages() {
@@ -276,7 +274,6 @@ TEST(FieldTranslator, MakersReportWhatDoesNotOpen) {
   EXPECT_THROW(field_translator(code_page(57364), code_page(1208)), nls2::error);
 }
 
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) && !defined(FOREIGN_HEAP)
 TEST(FieldTranslator, AllocatesNothingAfterItIsMade) {
   const std::string field(1000, '\x40');
   std::vector<char> out(4000);
@@ -285,24 +282,13 @@ TEST(FieldTranslator, AllocatesNothingAfterItIsMade) {
          {padding::as_is, padding::strip, padding::fill, padding::keep_blanks}) {
       field_translator translator(code_page(from), code_page(to),
                                   {.padding = padding, .width = 1200});
-      const std::size_t before = allocations;
+      const long before = support::heapRequests();
       for (const std::size_t size : {10U, 80U, 1000U}) {
         EXPECT_TRUE(translator.translate(std::span(field).first(size), out));
       }
-      EXPECT_EQ(allocations, before) << from << " to " << to;
+      EXPECT_EQ(support::heapRequests(), before) << from << " to " << to;
     }
   }
 }
-#endif
 
 } // namespace
-
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) && !defined(FOREIGN_HEAP)
-// NOLINTNEXTLINE(bugprone-reserved-identifier,readability-identifier-naming)
-extern "C" void *__libc_malloc(std::size_t size) noexcept;
-
-extern "C" void *malloc(std::size_t size) noexcept {
-  ++allocations;
-  return __libc_malloc(size);
-}
-#endif

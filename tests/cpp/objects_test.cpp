@@ -27,7 +27,7 @@ TEST(Owners, GiveBackOnceWhatTheyOwn) {
 }
 
 TEST(CodePages, HaveNumbersAndNames) {
-  const int before = support::openConverters();
+  const interpose::Held before = interpose::held();
   EXPECT_EQ(code_page::from_name("ibm-1141"), code_page(1141));
   EXPECT_EQ(code_page::from_name("windows-936"), code_page(936)) << "not ICU's number";
   EXPECT_EQ(STATUS_OF(code_page::from_name("hz", error)), 37) << "it has no number";
@@ -37,7 +37,7 @@ TEST(CodePages, HaveNumbersAndNames) {
   EXPECT_EQ(STATUS_OF(code_page::from_name(std::string(256, 'x'), error)), 31);
   EXPECT_EQ(name_of(utf8_page), "UTF-8");
   EXPECT_EQ(STATUS_OF(name_of(code_page(57364), error)), 4);
-  EXPECT_EQ(support::openConverters(), before);
+  EXPECT_EQ(interpose::held(), before);
   EXPECT_STREQ(windows_names().back().name, "BIG5");
 }
 

@@ -1,14 +1,13 @@
-// Runs calls that stand in case files.
+// Runs the calls of case files.
 
 #include "support/call_cases.h"
 
 #include "support/case_file.h"
+#include "support/functions.h"
+#include "support/probe.h"
 #include "support/recording_host.h"
 
 #include <algorithm>
-#include <cctype>
-#include <cstring>
-#include <fstream>
 #include <gtest/gtest.h>
 #include <optional>
 #include <sstream>
@@ -17,12 +16,7 @@ namespace support {
 
 namespace {
 
-// A heap whose first block of a size has an address that ends in 32 zero bits, as the thread
-// sanitizer's has, gives it away here: in a trace it would look like null.
-[[maybe_unused]] const auto firstObject = std::make_unique<NLS2_Locale>();
-NLS2_Locale never = {0x03480001, 1208, "en_US", nullptr};
-
-const std::vector<std::string> traceKeys = {"|", "dump", "calls", "icu", "host", "=", "..."};
+const std::vector<std::string> traceKeys = {"|", "dump", "calls", "host", "=", "..."};
 
 struct Settings {
   World world;
@@ -33,12 +27,9 @@ struct Settings {
 void apply(Settings &settings, const std::string &key, const std::string &value) {
   std::istringstream words(value);
   if (key == "default") {
-    settings.world.locale = value == "''" ? "" : value;
+    settings.world.locale = value == "''" ? "" : CaseLine{key, value, value}.bytes();
   } else if (key == "codepages") {
-    settings.world.codepages.clear();
-    for (std::string word; std::getline(words, word, ',');) {
-      settings.world.codepages.push_back(word);
-    }
+    settings.world.codepages = split(value, ',');
   } else if (key == "made") {
     words >> settings.made;
   } else if (key == "call") {
@@ -55,13 +46,14 @@ void apply(Settings &settings, const std::string &key, const std::string &value)
 
 // What a sanitizer's heap neither refuses nor counts is left out.
 bool canHappen(const Settings &settings, const std::string &expected) {
-  return heapIsOurs || (expected.find("blocks left") == expected.npos &&
-                        std::ranges::none_of(settings.world.faults, [](const Fault &fault) {
-                          return fault.function.find("alloc") != std::string::npos;
-                        }));
+  return interpose::heapIsOurs ||
+         (expected.find("blocks left") == expected.npos &&
+          std::ranges::none_of(settings.world.faults, [](const Fault &fault) {
+            return fault.function.find("alloc") != std::string::npos;
+          }));
 }
 
-// Gives the next letters to those live objects that have no name yet, and describes the lettered.
+// Names those live objects by the next letters that have no name yet, and describes the lettered.
 std::string listed(Names &names) {
   std::string text;
   for (const NLS2_Locale *node = pLocaleObjectList; node != nullptr; node = node->pNext) {
@@ -75,34 +67,25 @@ std::string listed(Names &names) {
   return text;
 }
 
-// A sanitizer's heap begins where addresses end in zero bits: in a trace its first blocks look like
-// small numbers, so the text gets a block beyond those.
-std::unique_ptr<char[]> farBlock(const std::string &text) {
-  std::vector<std::unique_ptr<char[]>> near;
-  while (near.empty() || low32(near.back().get()) < 0x10000) {
-    near.push_back(exact(text));
+// What the library holds beside the objects on its list.
+interpose::Held heldNow() {
+  interpose::Held held = interpose::held();
+  for (const NLS2_Locale *node = pLocaleObjectList; node != nullptr; node = node->pNext) {
+    --held.blocks;
   }
-  return std::move(near.back());
+  return held;
 }
 
-// The text with pointers, in hex or as signed numbers, replaced by their names.
-std::string named(const std::string &text, const Names &names) {
-  const auto isInWord = [](unsigned char c) { return std::isalnum(c) != 0 || c == '-'; };
-  std::map<std::string, std::string> byDigits;
-  for (const auto &[pointer, name] : names) {
-    char hex[9];
-    std::snprintf(hex, sizeof hex, "%X", low32(pointer));
-    byDigits[hex] = byDigits[shown(pointer)] = "{" + name + "}";
+std::string leftBehind(const interpose::Held &before) {
+  const interpose::Held now = heldNow();
+  std::string text;
+  if (now.handles != before.handles) {
+    text += ", handles left " + shown(now.handles - before.handles);
   }
-  std::string result;
-  for (auto at = text.begin(); at != text.end();) {
-    auto end = std::find_if_not(at, text.end(), isInWord);
-    end += end == at ? 1 : 0;
-    const auto found = byDigits.find({at, end});
-    result += found != byDigits.end() ? found->second : std::string(at, end);
-    at = end;
+  if (interpose::heapIsOurs && now.blocks != before.blocks) {
+    text += ", blocks left " + shown(now.blocks - before.blocks);
   }
-  return result;
+  return text;
 }
 
 // The trace of `function` as a case has it, what it calls folded.
@@ -138,20 +121,21 @@ std::vector<std::string> folded(const std::string &function,
   return own;
 }
 
-// What the call leaves behind, and gives it back.
-std::string leftBehind(int converters, int blocks, Names &names) {
+// The lines joined by blanks; at their end the answer, and what was left behind.
+std::string joined(std::vector<std::string> lines, std::string answer) {
+  if (!lines.empty()) {
+    const bool isValue = "= " + answer.substr(0, answer.find(',')) == lines.back();
+    answer = isValue ? "= " + answer : lines.back() + ", " + answer;
+    lines.pop_back();
+  }
   std::string text;
-  if (openConverters() != converters) {
-    text += ", converters left " + shown(openConverters() - converters);
+  for (const std::string &line : lines) {
+    text += line + " ";
   }
-  if (openBlocks() != blocks) {
-    text += ", blocks left " + shown(openBlocks() - blocks);
-  }
-  return text + listed(names);
+  return text + answer;
 }
 
-// The trace of the settings' call, its lines joined by blanks; at its end the answer.
-std::string run(const Functions &functions, const Settings &settings, TraceFlags flags) {
+std::string run(const Settings &settings, TraceFlags flags) {
   world = {};
   for (int i = 0; i < settings.made; ++i) {
     int32_t status = 0;
@@ -160,35 +144,25 @@ std::string run(const Functions &functions, const Settings &settings, TraceFlags
   std::string trace;
   {
     const Words words(settings.call);
-    Names &names = words.names();
-    words.name(&never, "never");
-    listed(names);
+    listed(words.names());
     const std::string function = settings.call.substr(0, settings.call.find(' '));
-    const int blocks = openBlocks();
-    const int converters = openConverters();
-    openedConverters();
-    world = settings.world;
+    const interpose::Held before = heldNow();
+    openedHandles();
     std::string answer;
     std::vector<std::string> lines;
     {
       const Recording recording(flags);
-      answer = functions.at(function)(words);
+      world = settings.world;
+      answer = functions().at(function)(words);
+      world = {};
       lines = folded(function, recording.lines());
     }
-    world = {};
-    if (flags == traceAll && !lines.empty()) {
-      const bool isValue = "= " + answer.substr(0, answer.find(',')) == lines.back();
-      answer = isValue ? "= " + answer : lines.back() + ", " + answer;
-      lines.pop_back();
-      for (const std::string &line : lines) {
-        trace += line + " ";
-      }
+    trace = joined(flags == traceAll ? lines : std::vector<std::string>(), answer);
+    trace += leftBehind(before) + listed(words.names());
+    for (const void *handle : openedHandles()) {
+      words.name(handle, "converter");
     }
-    trace += answer + leftBehind(converters, blocks, names);
-    for (const void *converter : openedConverters()) {
-      words.name(converter, "converter");
-    }
-    trace = named(trace, names);
+    trace = named(trace, words.names());
   }
   while (pLocaleObjectList != nullptr && NLS2_ReleaseLocale(pLocaleObjectList) == 0) {
   }
@@ -197,7 +171,7 @@ std::string run(const Functions &functions, const Settings &settings, TraceFlags
 
 // One thing a line, for a report.
 std::string broken(std::string text) {
-  for (const std::string start : {" | ", " calls ", " icu ", " host ", " dump "}) {
+  for (const std::string start : {" | ", " calls ", " host ", " dump "}) {
     for (std::size_t at = 0; (at = text.find(start, at)) != text.npos;) {
       text[at] = '\n';
     }
@@ -205,8 +179,8 @@ std::string broken(std::string text) {
   return text;
 }
 
-void expectCall(const std::string &expected, const Functions &functions, const Settings &settings,
-                TraceFlags flags, const std::string &place) {
+void expectCall(const std::string &expected, const Settings &settings, TraceFlags flags,
+                const std::string &place) {
   if (!canHappen(settings, expected)) {
     return;
   }
@@ -214,46 +188,39 @@ void expectCall(const std::string &expected, const Functions &functions, const S
   if (expected.find(" left ") != expected.npos) {
     leak.emplace();
   }
-  std::string actual = run(functions, settings, flags);
+  std::string actual = run(settings, flags);
   const std::string gap = "... ";
   const std::size_t at = expected.find(gap + "| ");
   if (at != expected.npos && actual.size() + gap.size() > expected.size()) {
     actual.replace(at, actual.size() + gap.size() - expected.size(), gap);
   }
-  std::string file = place + ".actual";
-  std::ranges::replace_if(
-      file, [](char c) { return c == '/' || c == ':'; }, '_');
-  if (actual != expected) {
-    std::ofstream(file) << broken(actual);
-  }
-  EXPECT_EQ(broken(expected), broken(actual)) << place << "\nThe whole text: " << file;
+  EXPECT_EQ(broken(expected), broken(actual)) << place;
 }
 
-void expectPlain(const Functions &functions, Settings settings, const CaseLine &line) {
+void expectPlain(Settings settings, const CaseLine &line) {
   const auto [call, answer] = line.split(" -> ");
   settings.call = call;
-  expectCall(answer.value, functions, settings, traceOff, line.place);
+  expectCall(answer.value, settings, traceOff, line.place);
   if (line.key == "plain") {
-    expectCall(answer.value, functions, settings, traceDetail, line.place);
+    expectCall(answer.value, settings, traceDetail, line.place);
   }
 }
 
-void expectOther(const Functions &functions, Settings settings, const CaseLine &line,
-                 const std::string &before) {
+void expectOther(Settings settings, const CaseLine &line, const std::string &before) {
   const auto [setting, rest] = line.split(": ");
   const auto [key, value] = CaseLine{line.key, setting, line.place}.split(" ");
   apply(settings, key, value.value);
-  expectCall(before + rest.value, functions, settings, traceAll, line.place);
+  expectCall(before + rest.value, settings, traceAll, line.place);
 }
 
-void expectCase(const Functions &functions, const Case &c) {
+void expectCase(const Case &c) {
   Settings settings;
   std::string trace; // each line with a blank at its end
   for (const CaseLine &line : c.lines) {
     if (line.key == "plain" || line.key == "untraced") {
-      expectPlain(functions, settings, line);
+      expectPlain(settings, line);
     } else if (line.key == "or") {
-      expectOther(functions, settings, line, trace);
+      expectOther(settings, line, trace);
     } else if (std::ranges::find(traceKeys, line.key) == traceKeys.end()) {
       apply(settings, line.key, line.value);
     } else {
@@ -263,89 +230,21 @@ void expectCase(const Functions &functions, const Case &c) {
   ASSERT_EQ(settings.call.empty(), trace.empty()) << "a call and its trace";
   if (!trace.empty()) {
     trace.pop_back();
-    expectCall(trace, functions, settings, traceAll, c.place);
+    expectCall(trace, settings, traceAll, c.place);
   }
 }
 
 } // namespace
 
-LiveLocale::LiveLocale(uint32_t codepage, const char *name) {
-  int32_t status = -1;
-  object_ = NLS2_GetLocale(NLS2_LanguageIDFromShortPosixName(name, &status), codepage, 0, &status);
-  EXPECT_EQ(status, 0) << name;
-}
-
-LiveLocale::~LiveLocale() { EXPECT_EQ(NLS2_ReleaseLocale(object_), 0); }
-
-Words::Words(const std::string &call) {
-  std::istringstream stream(call);
-  std::string word;
-  stream >> word;
-  while (stream >> word) {
-    words_.push_back(word == "''" ? "" : CaseLine{"", word, call}.bytes());
-    texts_.push_back(word == "null" ? nullptr : farBlock(words_.back()));
-    if (word[0] == 'L' && std::isdigit(static_cast<unsigned char>(word[1])) != 0 && word != "L0") {
-      const std::size_t slash = word.find('/');
-      auto &live = live_[word];
-      live = std::make_unique<LiveLocale>(std::stoul(word.substr(1)),
-                                          slash == word.npos ? "en_US" : &word[slash + 1]);
-      name(live->get(), live_.size() == 1 ? "locale" : "locale" + shown(live_.size()));
-    }
-  }
-}
-
-NLS2_Locale *Words::object(std::size_t i) const {
-  static NLS2_Locale copy;
-  const std::string &word = words_.at(i);
-  if (word == "L0") {
-    static NLS2_Locale unlisted{};
-    name(&unlisted, "locale");
-    return &unlisted;
-  }
-  if (word[0] == 'L') {
-    return live_.at(word)->get();
-  }
-  if (word == "null" || word == "never") {
-    return word == "null" ? nullptr : &never;
-  }
-  NLS2_Locale *node = pLocaleObjectList;
-  for (char letter = word == "copy" ? 'A' : word[0]; letter > 'A'; --letter) {
-    node = node->pNext;
-  }
-  copy = *node;
-  return word == "copy" ? &copy : node;
-}
-
-std::string shown(const std::string &bytes) {
-  std::string text;
-  for (const char c : bytes) {
-    const auto byte = static_cast<unsigned char>(c);
-    char escaped[5] = {c};
-    if (byte <= ' ' || byte >= 0x7F || byte == '\\') {
-      std::snprintf(escaped, sizeof escaped, byte == 0 ? "\\0" : "\\x%02X", unsigned{byte});
-    }
-    text += escaped;
-  }
-  return text.empty() ? "''" : text;
-}
-
-std::string shown(const NLS2_Locale &object) {
-  char numbers[32];
-  std::snprintf(numbers, sizeof numbers, "%u %08X ", object.codepage, object.languageId);
-  return numbers + shown(std::string(object.icuLocale));
-}
-
-void expectCases(const std::string &folder, const Functions &functions) {
-  std::vector<std::string> keys = {"plain",         "untraced",     "call",   "or",
-                                   "default",       "codepages",    "made",   "ucnv_open",
-                                   "ucnv_getCCSID", "ucnv_getName", "malloc", "u_strToLower",
-                                   "u_strFoldCase", "realloc"};
+void expectCases(const std::string &file) {
+  std::vector<std::string> keys = {"plain",        "untraced",  "call",         "or",
+                                   "default",      "codepages", "made",         "malloc",
+                                   "calloc",       "realloc",   "ucnv_open",    "ucnv_getCCSID",
+                                   "ucnv_getName", "u_init",    "u_strToLower", "u_strFoldCase"};
   keys.insert(keys.end(), traceKeys.begin(), traceKeys.end());
-  for (const std::string &file : caseFiles(folder)) {
-    for (const Case &c : readCases(file, keys)) {
-      SCOPED_TRACE(c.place + ": " + c.why);
-      expectCase(functions, c);
-    }
+  for (const Case &c : readCases(file, keys)) {
+    SCOPED_TRACE(c.place + ": " + c.why);
+    expectCase(c);
   }
 }
 

@@ -13,57 +13,53 @@ namespace support {
 
 namespace {
 
+// A unit from hex digits.
 template <class Unit>
-void appendUnit(std::string &bytes, std::istream &text) {
+std::string unit(std::istream &text) {
   std::string digits(sizeof(Unit) * 2, ' ');
   text.read(digits.data(), static_cast<std::streamsize>(digits.size()));
-  if (!std::all_of(digits.begin(), digits.end(),
-                   [](unsigned char c) { return std::isxdigit(c); })) {
+  if (!std::ranges::all_of(digits, [](unsigned char c) { return std::isxdigit(c); })) {
     throw std::invalid_argument("too few hex digits");
   }
-  const auto unit = static_cast<Unit>(std::stoul(digits, nullptr, 16));
-  bytes.append(reinterpret_cast<const char *>(&unit), sizeof unit);
+  const auto value = static_cast<Unit>(std::stoul(digits, nullptr, 16));
+  return {reinterpret_cast<const char *>(&value), sizeof value};
 }
 
 std::string unescaped(const std::string &escaped);
 
-void appendRepeated(std::string &bytes, std::istream &text) {
+std::string repeated(std::istream &text) {
   std::size_t count = 0;
   text >> count;
-  std::string repeated(1, static_cast<char>(text.get()));
-  if (repeated == "(") {
-    std::getline(text, repeated, ')');
-    if (text.eof()) {
-      throw std::invalid_argument("no ) ends the repeated text");
-    }
-    repeated = unescaped(repeated);
+  std::string once(1, static_cast<char>(text.get()));
+  if (once == "(" && std::getline(text, once, ')')) {
+    once =
+        text.eof() ? throw std::invalid_argument("no ) ends the repeated text") : unescaped(once);
   }
   if (!text) {
     throw std::invalid_argument("\\* wants a count and what to repeat");
   }
+  std::string bytes;
   for (; count > 0; --count) {
-    bytes += repeated;
+    bytes += once;
   }
+  return bytes;
 }
 
-void appendEscaped(std::string &bytes, std::istream &text) {
-  switch (text.get()) {
-  case 'n':
-    return bytes.push_back('\n');
-  case 't':
-    return bytes.push_back('\t');
-  case '0':
-    return bytes.push_back('\0');
-  case '\\':
-    return bytes.push_back('\\');
+std::string escape(std::istream &text) {
+  const char kind = static_cast<char>(text.get());
+  constexpr std::string_view letters = "nt0\\";
+  if (const std::size_t at = letters.find(kind); at != letters.npos) {
+    return {"\n\t\0\\"[at]};
+  }
+  switch (kind) {
   case 'x':
-    return appendUnit<uint8_t>(bytes, text);
+    return unit<uint8_t>(text);
   case 'u':
-    return appendUnit<uint16_t>(bytes, text);
+    return unit<uint16_t>(text);
   case 'U':
-    return appendUnit<uint32_t>(bytes, text);
+    return unit<uint32_t>(text);
   case '*':
-    return appendRepeated(bytes, text);
+    return repeated(text);
   default:
     throw std::invalid_argument("no such escape");
   }
@@ -73,7 +69,7 @@ std::string unescaped(const std::string &escaped) {
   std::istringstream text(escaped);
   std::string bytes;
   for (char c = 0; text.get(c);) {
-    c == '\\' ? appendEscaped(bytes, text) : bytes.push_back(c);
+    bytes += c == '\\' ? escape(text) : std::string(1, c);
   }
   return bytes;
 }
@@ -152,11 +148,22 @@ std::vector<std::string> caseFiles(const std::string &folder) {
       files.push_back(entry.path().string());
     }
   }
-  std::sort(files.begin(), files.end());
+  std::ranges::sort(files);
   if (files.empty()) {
     throw std::runtime_error(folder + ": no case files");
   }
   return files;
+}
+
+std::vector<std::string> split(const std::string &text, char separator) {
+  std::vector<std::string> parts;
+  std::istringstream stream(text);
+  for (std::string part; std::getline(stream, part, separator);) {
+    if (!part.empty()) {
+      parts.push_back(part);
+    }
+  }
+  return parts;
 }
 
 } // namespace support

@@ -40,4 +40,7 @@ std::vector<Case> readCases(const std::string &path, const std::vector<std::stri
 // Every *.cases file of a folder in the order of their names; at least one.
 std::vector<std::string> caseFiles(const std::string &folder);
 
+// What is between the separators, without what is empty.
+std::vector<std::string> split(const std::string &text, char separator);
+
 } // namespace support

@@ -1,12 +1,18 @@
-// Calls a function of the library with a case's words, one for each parameter but int32_t and void
-// pointers. The answer is the result and what the call wrote through pointers, in their order.
+// Calls a function of the library with the words of a call, one for each parameter but int32_t and
+// void pointers. The answer is the result and what the call wrote through pointers, in their order.
 #pragma once
 
-#include "support/call_cases.h"
+#include "support/words.h"
 
 #include <tuple>
+#include <unicode/unistr.h>
+#include <unicode/ures.h>
+#include <unicode/ustdio.h>
 
 namespace support {
+
+// Called with true before each call of the library, and with false after it.
+inline void (*aroundCall)(bool isBefore) = [](bool /*isBefore*/) {};
 
 struct Cursor {
   const Words &words;
@@ -40,8 +46,8 @@ struct Slot<const void *> : Given<const void *> {
 };
 
 template <class Unit>
-struct TextSlot {
-  explicit TextSlot(Cursor &at) : bytes(at.words.text(at.next)), size(at.words[at.next].size()) {
+struct Slot<Unit *> { // char and UChar, also constant ones
+  explicit Slot(Cursor &at) : bytes(at.words.text(at.next)), size(at.words[at.next].size()) {
     at.words.name(bytes, "word " + shown(at.next++));
   }
   Unit *get() const { return reinterpret_cast<Unit *>(bytes); }
@@ -51,19 +57,90 @@ struct TextSlot {
   char *bytes;
   std::size_t size;
 };
-template <class Unit>
-struct Slot<Unit *> : TextSlot<Unit> { // char and UChar, also constant ones
-  using TextSlot<Unit>::TextSlot;
+
+// An object called "new" begins with zero bytes, and the answer shows what it becomes.
+template <>
+struct Slot<NLS2_Locale *> {
+  explicit Slot(Cursor &at) : isNew(at.words[at.next++] == "new") {
+    live = isNew ? nullptr : at.words.object(at.next - 1);
+  }
+  NLS2_Locale *get() { return isNew ? &fresh : live; }
+  std::string answer() const { return isNew ? ", " + shown(fresh) : ""; }
+  NLS2_Locale fresh = {};
+  NLS2_Locale *live;
+  bool isNew;
+};
+template <>
+struct Slot<const NLS2_Locale *> : Given<const NLS2_Locale *> {
+  explicit Slot(Cursor &at) : Given{at.words.object(at.next++)} {}
+};
+
+// A new stream. One called "!" is for the library to close; null is none.
+template <>
+struct Slot<UFILE *> : Given<UFILE *> {
+  explicit Slot(Cursor &at)
+      : Given{at.words[at.next] == "null" ? nullptr : u_fopen("/dev/null", "w", nullptr, "UTF-8")},
+        owned(at.words[at.next++] == "file" ? value : nullptr) {
+    at.words.name(value, "file");
+  }
+  icu::LocalUFILEPointer owned;
+};
+
+// The example bundle of a language; with "!", for the library to close.
+template <>
+struct Slot<UResourceBundle *> : Given<UResourceBundle *> {
+  explicit Slot(Cursor &at) : Given{nullptr} {
+    const std::string &word = at.words[at.next++];
+    UErrorCode error = U_ZERO_ERROR;
+    value = ures_open("./messages", word.c_str() + (word[0] == '!' ? 1 : 0), &error);
+    owned.adoptInstead(word[0] == '!' ? nullptr : value);
+  }
+  icu::LocalUResourceBundlePointer owned;
 };
 
 template <>
-struct Slot<NLS2_Locale *> : Given<NLS2_Locale *> {
-  explicit Slot(Cursor &at) : Given{at.words.object(at.next++)} {}
+struct Slot<const UResourceBundle *> : Slot<UResourceBundle *> {
+  using Slot<UResourceBundle *>::Slot;
 };
-template <>
-struct Slot<const NLS2_Locale *> : Slot<NLS2_Locale *> {
-  using Slot<NLS2_Locale *>::Slot;
-};
+
+// A result as the answer has it, by its name if it is a pointer. Handles are closed.
+template <class Number>
+std::string answered(const Words & /*words*/, Number result) {
+  return shown(result);
+}
+template <class Handle>
+std::string answered(const Words &words, Handle *result, const char *name,
+                     void (*close)(Handle *)) {
+  words.name(result, name);
+  close(result);
+  return shown(result);
+}
+inline std::string answered(const Words &words, UConverter *result) {
+  return answered(words, result, "converter", ucnv_close);
+}
+inline std::string answered(const Words &words, UFILE *result) {
+  return answered(words, result, "file", u_fclose);
+}
+inline std::string answered(const Words &words, UResourceBundle *result) {
+  return answered(words, result, "bundle", ures_close);
+}
+inline std::string answered(const Words &words, NLS2_Locale *result) {
+  words.made(result);
+  return shown(result);
+}
+inline std::string answered(const Words &words, const LocaleMapEntry *result) {
+  words.name(result, "row " + shown(result - localeMap));
+  return shown(result);
+}
+inline std::string answered(const Words &words, const char *result) {
+  words.name(result, result == nullptr ? "" : result);
+  return shown(result);
+}
+inline std::string answered(const Words &words, const UChar *result) {
+  std::string text;
+  words.name(result, icu::UnicodeString(result == nullptr ? u"" : result).toUTF8String(text));
+  return shown(result);
+}
 
 template <class Result, class... Parameters>
 std::string dispatch(Result (*function)(Parameters...), const Words &words) {
@@ -71,12 +148,15 @@ std::string dispatch(Result (*function)(Parameters...), const Words &words) {
   std::tuple<Slot<Parameters>...> slots{Slot<Parameters>(at)...};
   return std::apply(
       [&](auto &...slot) {
+        aroundCall(true);
         if constexpr (std::is_void_v<Result>) {
           function(slot.get()...);
+          aroundCall(false);
           return ("done" + ... + slot.answer());
         } else {
-          const std::string result = shown(function(slot.get()...));
-          return (result + ... + slot.answer());
+          const Result result = function(slot.get()...);
+          aroundCall(false);
+          return (answered(words, result) + ... + slot.answer());
         }
       },
       slots);
@@ -86,9 +166,5 @@ template <auto function>
 std::string call(const Words &words) {
   return dispatch(function, words);
 }
-
-// A row of a room's functions.
-#define CALL(function)                                                                             \
-  { #function, support::call < function> }
 
 } // namespace support

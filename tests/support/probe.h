@@ -1,9 +1,9 @@
-// Decides what ICU and the heap answer, watches what the library takes and gives back. Linking it
-// into a program puts its functions before ICU's and the C library's own.
+// Decides what ICU and the heap answer, and watches what the library takes.
 #pragma once
 
+#include "proof/interposers.h"
+
 #include <string>
-#include <unicode/utypes.h>
 #include <vector>
 #if defined(__SANITIZE_ADDRESS__)
 #include <sanitizer/lsan_interface.h>
@@ -11,28 +11,22 @@
 
 namespace support {
 
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__) || defined(FOREIGN_HEAP)
-constexpr bool heapIsOurs = false; // a sanitizer or Valgrind brings its own
-#else
-constexpr bool heapIsOurs = true;
-#endif
 #if defined(__SANITIZE_ADDRESS__)
 using MeantLeak = __lsan::ScopedDisabler;
-constexpr std::size_t canaries = 0; // the sanitizer watches a block's end
 #else
 struct MeantLeak {};
-constexpr std::size_t canaries = 8;
 #endif
 
-// The nth call of a function of ICU's fails with `error`. Of the heap's functions, "realloc" and
-// "malloc" fail for every block of n bytes; "object" stands for those of a locale object.
+// The nth call of a function of ICU's by the library fails with `error`. Of the heap's functions,
+// "malloc" and "realloc" fail for every block of n bytes; "object" is the size of a
+// locale object.
 struct Fault {
   std::string function;
   long nth;
   UErrorCode error = U_MEMORY_ALLOCATION_ERROR;
 };
 
-// What ICU says of the process, and what fails. "null" stands for a null pointer.
+// What ICU reports of the process, and what fails. "null" stands for a null pointer.
 struct World {
   std::string locale = "en_US";
   std::vector<std::string> codepages{"UTF-8"}; // call by call; the last one stays
@@ -40,10 +34,9 @@ struct World {
 };
 extern World world;
 
-int openConverters();
-// Every converter that was opened since the call before.
-std::vector<const void *> openedConverters();
-// Blocks that came from realloc and were not given back.
-int openBlocks();
+// Every handle of ICU that the library has opened since the call before.
+std::vector<const void *> openedHandles();
+// How many blocks the program has asked of the heap.
+long heapRequests();
 
 } // namespace support

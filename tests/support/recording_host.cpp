@@ -9,6 +9,7 @@
 #include <atomic>
 #include <cstdarg>
 #include <cstdio>
+#include <cstdlib>
 #include <map>
 #include <mutex>
 
@@ -16,7 +17,7 @@ namespace {
 
 std::mutex recordMutex;
 std::vector<std::string> recorded;
-std::atomic<bool> recording{false};
+bool recording = false;
 
 std::map<std::string, support::SeenFunction> seenFunctions;
 
@@ -28,6 +29,14 @@ std::mutex listMutex;
 
 std::string nameOf(const TRC1_EntryBlock *anchor) {
   return {anchor->functionName, anchor->functionNameLength};
+}
+
+// Adds a line to the recording that is open, if any.
+void mark(const std::string &line) {
+  const std::lock_guard<std::mutex> guard(recordMutex);
+  if (recording) {
+    recorded.push_back(line);
+  }
 }
 
 void setFlags(uint32_t flags) {
@@ -64,19 +73,6 @@ SeenFunction seen(const std::string &function) {
 
 void changeSyncWord() { setFlags(currentFlags); }
 
-bool isRecording() { return recording; }
-
-void mark(const std::string &line) {
-  const std::lock_guard<std::mutex> guard(recordMutex);
-  if (recording) {
-    recorded.push_back(line);
-  }
-}
-
-uint32_t low32(const void *pointer) {
-  return static_cast<uint32_t>(reinterpret_cast<uintptr_t>(pointer));
-}
-
 } // namespace support
 
 uint32_t TRC1_Sync(TRC1_EntryBlock *anchor) {
@@ -109,7 +105,7 @@ void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t line, uint32_t kind, ...) {
     text += " " + std::to_string(static_cast<int32_t>(va_arg(arguments, uint32_t)));
     va_end(arguments);
   }
-  support::mark(text);
+  mark(text);
 }
 
 void TRC1_Printf(TRC1_EntryBlock *anchor, uint32_t /*line*/, const char *format, ...) {
@@ -123,8 +119,8 @@ void TRC1_Printf(TRC1_EntryBlock *anchor, uint32_t /*line*/, const char *format,
   va_end(arguments);
   const std::string text(line, static_cast<std::size_t>(length));
   std::free(line);
-  support::mark(nameOf(anchor) + ": " +
-                (text.ends_with('\n') ? text.substr(0, text.size() - 1) : text + "(no newline)"));
+  mark(nameOf(anchor) + ": " +
+       (text.ends_with('\n') ? text.substr(0, text.size() - 1) : text + "(no newline)"));
 }
 
 void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t /*line*/, const void *address, uint32_t length,
@@ -135,15 +131,15 @@ void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t /*line*/, const void *address, 
     std::snprintf(digits, sizeof digits, " %02X", static_cast<const unsigned char *>(address)[i]);
     text += digits;
   }
-  support::mark(zero == 0 ? text : text + " (last argument not 0)");
+  mark(zero == 0 ? text : text + " (last argument not 0)");
 }
 
 void SYS1_GetLock(void *lock) {
   listMutex.lock();
-  support::mark(lock == &LocaleObjectList_Lock ? "host lock" : "host lock of another");
+  mark(lock == &LocaleObjectList_Lock ? "host lock" : "host lock of another");
 }
 
 void SYS1_ReleaseLock(void *lock) {
-  support::mark(lock == &LocaleObjectList_Lock ? "host unlock" : "host unlock of another");
+  mark(lock == &LocaleObjectList_Lock ? "host unlock" : "host unlock of another");
   listMutex.unlock();
 }

@@ -23,7 +23,8 @@ enum TraceFlags : uint32_t {
 // A line is one trace call, written as
 //   NLS2_Name> entry            NLS2_Name= 37        NLS2_Name=
 //   NLS2_Name: detail text      NLS2_Name# C1 C2     (a dump)
-// with exit values as signed numbers. Marks of other probes stand between, in their order in time.
+// with exit values as signed numbers. The lock's calls appear in between as "host lock" and
+// "host unlock".
 class Recording {
 public:
   explicit Recording(TraceFlags flags);
@@ -45,12 +46,5 @@ struct SeenFunction {
 SeenFunction seen(const std::string &function);
 // Changes the word that the anchors' sync pointers were moved to; the flags stay.
 void changeSyncWord();
-
-// Adds a line to the recording that is open, if any; for probes that watch ICU or the heap.
-void mark(const std::string &line);
-bool isRecording();
-
-// What an exit event or "%X" carries of a pointer.
-uint32_t low32(const void *pointer);
 
 } // namespace support
