@@ -162,8 +162,8 @@ NLS2_API NLS2_Locale *NLS2_allocateLocale(int32_t *pStatus);
  * the default locale "ses_ML" (Koyraboro Senni) is found as "es". */
 NLS2_API int32_t NLS2_initLocaleObject(NLS2_Locale *pLocale);
 
-/* Status, as the result: 0 if the object is live, NLS2_ERR_INVALID_LOCALE otherwise, also for null.
- * Any pointer will do; it is compared, not followed. Takes no lock. */
+/* Whether an object is live. Status, as the result: 0 if it is, NLS2_ERR_INVALID_LOCALE otherwise,
+ * also for null. Any pointer will do; it is compared, not followed. Takes no lock. */
 NLS2_API int32_t NLS2_ValidateLocale(const NLS2_Locale *pLocale);
 
 /* Releases an object. Status, as the result: 0, or NLS2_ERR_INVALID_PARAMETER (not INVALID_LOCALE

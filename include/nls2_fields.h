@@ -118,6 +118,7 @@ NLS2_API int32_t NLS2F_OpenPageByNumber(int32_t number, NLS2F_Page **page);
  * three. */
 NLS2_API int32_t NLS2F_NearPageNames(const char *name, char *names, int64_t room);
 
+/* Closes a page. */
 NLS2_API void NLS2F_ClosePage(NLS2F_Page *page);
 
 /* Kinds of pages. */
@@ -195,6 +196,7 @@ NLS2_API int32_t NLS2F_OpenTranslator(const NLS2F_Page *from, const NLS2F_Page *
 NLS2_API int32_t NLS2F_CloneTranslator(const NLS2F_Translator *translator,
                                        NLS2F_Translator **clone);
 
+/* Closes a translator. */
 NLS2_API void NLS2F_CloseTranslator(NLS2F_Translator *translator);
 
 /* A room that is enough for any field of `length` bytes. Does not allocate. */
@@ -290,6 +292,7 @@ typedef struct NLS2F_Collator NLS2F_Collator;
 NLS2_API int32_t NLS2F_OpenCollator(const char *locale, const NLS2F_Page *page, uint32_t options,
                                     NLS2F_Collator **collator);
 
+/* Closes a collator. */
 NLS2_API void NLS2F_CloseCollator(NLS2F_Collator *collator);
 
 /* *order: -1 if text 1 sorts first, 1 if text 2 does, 0 if they are equal. Bytes that are not valid
