@@ -125,7 +125,7 @@ std::vector<std::string> namesOf(int32_t number) {
 }
 
 Answer describe(const std::vector<int32_t> &numbers, const std::vector<std::string> &names) {
-  std::string text = numbers.empty() ? "No number of the library opens this code page.\n" : "";
+  std::string text = numbers.empty() ? "The library has no number for this code page.\n" : "";
   Json numberRows = Json::array();
   Json nameRows = Json::array();
   std::set<std::optional<std::string>> tables;

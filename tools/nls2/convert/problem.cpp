@@ -83,11 +83,10 @@ Explanation explain(const Problem &problem) {
                         found.byte_count > 0 ? " (" + bytes + ")" : "", in),
             "; --on-error replace writes a substitution character instead"};
   case ProblemKind::tooLong:
-    return {
-        fmt::format("the text needs {} bytes, but {} {}{}", found.needed,
-                    limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit,
-                    found.byte_count > 0 ? " (the first that does not fit: " + bytes + ")" : ""),
-        widthAdvice(problem.limitedBy, "; use a larger --out-length")};
+    return {fmt::format("the text needs {} bytes, but {} {}{}", found.needed,
+                        limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit,
+                        found.byte_count > 0 ? "; no room for the " + bytes : ""),
+            widthAdvice(problem.limitedBy, "; use a larger --out-length")};
   case ProblemKind::nullInside:
     return {fmt::format("a null (U+0000, {}) is inside the text and would end it", bytes),
             "; replace it, or do not use --strip, --fill, --keep-blanks, --csv or widths"};

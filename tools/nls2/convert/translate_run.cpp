@@ -57,7 +57,7 @@ private:
     }
     for (const OutputFile *other : others) {
       if (file != nullptr && other != nullptr && file->isSame(*other)) {
-        throw usageError("{} names the same file as another output", option);
+        throw usageError("{} names a file that another option writes", option);
       }
     }
   }

@@ -34,7 +34,7 @@ inline std::u16string_view withoutNulls(std::u16string_view text) {
   }
   const std::size_t null = text.find(u'\0');
   if (text.find_first_not_of(u'\0', null) != text.npos) {
-    throw TextFault(": text follows a null (U+0000) and would be ignored");
+    throw TextFault(": text after a null (U+0000) would be ignored");
   }
   return text.substr(0, null);
 }

@@ -42,10 +42,9 @@ std::string lineFeedOf(const CodePage &page, bool isMoved) {
   }
   const UConverterType type = ucnv_getType(page.converter());
   if (dependent.contains(type) || (isMoved && withStates.contains(type))) {
-    throw usageError(
-        "code page {} cannot be read by lines, since a line depends on the text before "
-        "it; for UTF-16 and UTF-32 use a page without a signature, such as 1200",
-        page.number());
+    throw usageError("code page {} has no lines that can be read one by one; for UTF-16 and UTF-32 "
+                     "use a page without a signature, such as 1200",
+                     page.number());
   }
   return bytes;
 }
