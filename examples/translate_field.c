@@ -13,7 +13,7 @@ int main(void) {
   NLS2_TranslateString(1208, text, sizeof text - 1, 1141, field, sizeof field, &consumed,
                        NLS2_STRING_STRIP_TRAILING, &status);
   if (status != 0) {
-    fprintf(stderr, "status %d\n", (int)status);
+    fprintf(stderr, "%s\n", nls2_status_name(status));
     return 1;
   }
   puts(text);
