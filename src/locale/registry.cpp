@@ -25,6 +25,12 @@ constinit thread_local Remembered remembered __attribute__((tls_model("initial-e
 
 namespace {
 
+// 0 is never the count, also when it wraps.
+void countRemoval() {
+  const std::size_t next = removalCount.load(std::memory_order_relaxed) + 1;
+  removalCount.store(next != 0 ? next : 1, std::memory_order_release);
+}
+
 // Like `follow`, for a change.
 void set(NLS2_Locale *&link, NLS2_Locale *object) {
   __atomic_store_n(&link, object, __ATOMIC_SEQ_CST);
@@ -95,6 +101,9 @@ void unlink(trace::Trace trace, Position at) {
 } // namespace
 
 bool contains(const NLS2_Locale *object) {
+  if (object == nullptr) {
+    return false;
+  }
   if (isRemembered(object)) {
     return true;
   }
@@ -149,7 +158,7 @@ void remove(trace::Trace trace, NLS2_Locale *object) {
     return;
   }
   unlink(trace, at);
-  removalCount.fetch_add(1, std::memory_order_release);
+  countRemoval();
   NLS2_TRACE(trace, "Locale structure removed from list.");
   waitForWalkers();
   std::free(at.current);

@@ -50,7 +50,7 @@ inline void remember(const NLS2_Locale *object, std::size_t removals, const NLS2
 
 inline bool isRemembered(const NLS2_Locale *object) {
   const Remembered &own = remembered;
-  if (removalCount.load(std::memory_order_acquire) != own.removals ||
+  if (object == nullptr || removalCount.load(std::memory_order_acquire) != own.removals ||
       __atomic_load_n(&pLocaleObjectList, __ATOMIC_RELAXED) != own.head) {
     return false;
   }

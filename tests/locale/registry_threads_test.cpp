@@ -24,6 +24,8 @@ NLS2_Locale *make() {
   return NLS2_GetLocale(0x03480001, 819, 0, &status);
 }
 
+const NLS2_Locale never = {};
+
 // One that this thread remembers.
 NLS2_Locale *makeAndValidate() {
   NLS2_Locale *object = make();
@@ -75,7 +77,7 @@ TEST(Registry, OwnersAndValidatorsDoNotDisturbEachOther) {
       const Threads releasing(owners, [&] { liveAndDie(faults); });
       const Threads validating(4, [&] {
         faults += NLS2_ValidateLocale(first) != 0;
-        NLS2_ValidateLocale(nullptr); // walks the whole list
+        NLS2_ValidateLocale(&never); // walks the whole list
       });
       std::this_thread::sleep_for(std::chrono::seconds(seconds ? std::atoi(seconds) : 1));
     }
