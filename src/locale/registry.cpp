@@ -20,9 +20,6 @@ uint32_t LocaleObjectList_Lock[7] = {};
 
 namespace nls2::locale {
 
-constinit std::atomic<std::size_t> removalCount{1};
-constinit thread_local Remembered remembered __attribute__((tls_model("initial-exec"))) = {};
-
 namespace {
 
 // 0 is never the count, also when it wraps.

@@ -15,6 +15,9 @@
 //
 // The head is compared too: it is exported, so a program may set the list aside.
 //
+// A signal handler may validate at any time: it trusts nothing that it interrupted half written,
+// and does not write it.
+//
 // Measured: 2.7 ns a call in place of 4.1 for a walk over one object, and of 17 us over 10,000; a
 // call that returns at once is 2.5.
 #pragma once
@@ -27,10 +30,12 @@
 
 namespace nls2::locale {
 
+// The thread's own: atomic only for its signal handlers.
 struct Remembered {
-  std::size_t removals; // 0, which is never the count, before the thread's first walk
-  const NLS2_Locale *head;
-  const NLS2_Locale *objects[16]; // null: unused
+  std::atomic<std::size_t> removals; // 0, which is never the count: do not trust the rest
+  std::atomic<const NLS2_Locale *> head;
+  std::atomic<const NLS2_Locale *> objects[16]; // null: unused
+  std::atomic<bool> writing;
 };
 
 extern constinit std::atomic<std::size_t> removalCount;
@@ -44,26 +49,19 @@ inline std::size_t firstPlace(const NLS2_Locale *object) {
 }
 
 // A walk found the object; the count and the head are from before it.
-inline void remember(const NLS2_Locale *object, std::size_t removals, const NLS2_Locale *head) {
-  Remembered &own = remembered;
-  if (own.removals != removals || own.head != head) {
-    own = {removals, head, {}};
-  }
-  std::size_t place = firstPlace(object);
-  for (std::size_t i = 1; i < placesOfObject && own.objects[place] != nullptr; ++i) {
-    place = firstPlace(object) ^ i;
-  }
-  own.objects[place] = object;
-}
+void remember(const NLS2_Locale *object, std::size_t removals, const NLS2_Locale *head);
 
 inline bool isRemembered(const NLS2_Locale *object) {
   const Remembered &own = remembered;
-  if (object == nullptr || removalCount.load(std::memory_order_acquire) != own.removals ||
-      __atomic_load_n(&pLocaleObjectList, __ATOMIC_RELAXED) != own.head) {
+  if (object == nullptr ||
+      removalCount.load(std::memory_order_acquire) !=
+          own.removals.load(std::memory_order_relaxed) ||
+      __atomic_load_n(&pLocaleObjectList, __ATOMIC_RELAXED) !=
+          own.head.load(std::memory_order_relaxed)) {
     return false;
   }
   for (std::size_t i = 0; i < placesOfObject; ++i) {
-    if (own.objects[firstPlace(object) ^ i] == object) {
+    if (own.objects[firstPlace(object) ^ i].load(std::memory_order_relaxed) == object) {
       return true;
     }
   }

@@ -8,9 +8,11 @@
 #include <algorithm>
 #include <atomic>
 #include <chrono>
+#include <csignal>
 #include <cstdlib>
 #include <functional>
 #include <gtest/gtest.h>
+#include <string>
 #include <sys/wait.h>
 #include <thread>
 #include <unistd.h>
@@ -29,7 +31,9 @@ const NLS2_Locale never = {};
 // One that this thread remembers.
 NLS2_Locale *makeAndValidate() {
   NLS2_Locale *object = make();
-  EXPECT_EQ(NLS2_ValidateLocale(object), 0);
+  for (int i = 0; i < 100; ++i) {
+    EXPECT_EQ(NLS2_ValidateLocale(object), 0);
+  }
   EXPECT_EQ(NLS2_ValidateLocale(nullptr), NLS2_ERR_INVALID_LOCALE);
   return object;
 }
@@ -112,6 +116,45 @@ TEST(Registry, AChildForkedAmidValidationsWorks) {
     ASSERT_EQ(NLS2_ReleaseLocale(object), 0);
   }
 }
+
+#if defined(__x86_64__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+std::function<void(int)> atInstruction; // its argument counts from 1
+std::atomic<int> instructions;
+
+// Runs a handler at each of a function's instructions, as a signal's.
+void singleStep(const std::function<void()> &function, const std::function<void(int)> &handler) {
+  atInstruction = handler;
+  instructions = 0;
+  std::signal(SIGTRAP, [](int) { atInstruction(++instructions); });
+  asm volatile(
+      "lea -128(%%rsp), %%rsp; pushfq; orq $0x100, (%%rsp); popfq; lea 128(%%rsp), %%rsp" ::
+          : "memory", "cc");
+  function();
+  asm volatile(
+      "lea -128(%%rsp), %%rsp; pushfq; andq $-0x101, (%%rsp); popfq; lea 128(%%rsp), %%rsp" ::
+          : "memory", "cc");
+}
+
+TEST(Remembered, IsRightInASignalHandlerAtAnyInstruction) {
+  NLS2_Locale *const head = make();
+  NLS2_Locale *const released = makeAndValidate();
+  NLS2_Locale *const object = make();
+  std::jthread([=] { EXPECT_EQ(NLS2_ReleaseLocale(released), 0); }).join();
+  int wrong = 0;
+  const auto handler = [&](int instruction) {
+    wrong += NLS2_ValidateLocale(released) == 0;
+    wrong += instruction > 1000 && NLS2_ValidateLocale(head) != 0; // remembers in the handler, too
+  };
+  const auto validate = [&] {
+    for (int i = 0; i < 40; ++i) {
+      wrong += NLS2_ValidateLocale(object) != 0;
+    }
+  };
+  singleStep(validate, handler);
+  EXPECT_EQ(wrong, 0) << "in " << instructions << " instructions";
+  EXPECT_EQ(NLS2_ReleaseLocale(head) | NLS2_ReleaseLocale(object), 0);
+}
+#endif
 
 // In the first two the head of the list stays the same, so that it does not give a removal away.
 TEST(Remembered, IsForgottenWhenAnotherThreadReleasesIt) {
