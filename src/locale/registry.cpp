@@ -22,10 +22,10 @@ namespace nls2::locale {
 
 namespace {
 
-// 0 is never the count, also when it wraps.
+// 0 is never the count.
 void countRemoval() {
   const std::size_t next = removalCount.load(std::memory_order_relaxed) + 1;
-  removalCount.store(next != 0 ? next : 1, std::memory_order_release);
+  removalCount.store(next != 0 ? next : 1, std::memory_order_seq_cst);
 }
 
 // Like `follow`, for a change.
@@ -101,18 +101,19 @@ bool contains(const NLS2_Locale *object) {
   if (object == nullptr) {
     return false;
   }
-  if (isRemembered(object)) {
-    return true;
-  }
-  const std::size_t removals = removalCount.load(std::memory_order_acquire);
+  const std::size_t removals = removalCount.load(std::memory_order_seq_cst);
   const Walk walk;
-  NLS2_Locale *head = follow(pLocaleObjectList);
+  NLS2_Locale *const *link = &pLocaleObjectList;
+  const NLS2_Locale *const head = follow(*link);
   const NLS2_Locale *node = head;
+  std::size_t linksFollowed = 1;
   while (node != nullptr && node != object) {
-    node = follow(node->pNext);
+    link = &node->pNext;
+    node = follow(*link);
+    ++linksFollowed;
   }
   if (node != nullptr) {
-    remember(object, removals, head);
+    remember(object, link, linksFollowed, removals, head);
   }
   return node != nullptr;
 }
@@ -157,8 +158,9 @@ void remove(trace::Trace trace, NLS2_Locale *object) {
   unlink(trace, at);
   countRemoval();
   NLS2_TRACE(trace, "Locale structure removed from list.");
-  waitForWalkers();
-  std::free(at.current);
+  if (waitForWalkers()) {
+    std::free(at.current);
+  }
 }
 
 } // namespace nls2::locale

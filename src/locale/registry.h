@@ -13,13 +13,6 @@ void append(trace::Trace trace, NLS2_Locale *object);
 // Unlinks and frees an object. Does nothing if another thread already removed it.
 void remove(trace::Trace trace, NLS2_Locale *object);
 
-// A link of the list. Links are read by walks that take no lock; that they are sequentially
-// consistent with the counts of walkers.h is what makes a removal see every walk that can still see
-// the removed object. A load pays nothing for it on x86 and little elsewhere.
-inline NLS2_Locale *follow(NLS2_Locale *const &link) {
-  return __atomic_load_n(&link, __ATOMIC_SEQ_CST);
-}
-
 // True while the object is on the list; its contents are not looked at. Takes no lock.
 bool contains(const NLS2_Locale *object);
 

@@ -1,28 +1,47 @@
-// Who is walking the registry.
+// Who is reading the registry.
 
 #include "locale/walkers.h"
 
 #include <ctime>
+#include <linux/membarrier.h>
 #include <pthread.h>
 #include <sched.h>
+#include <sys/syscall.h>
+#include <unistd.h>
 
 namespace nls2::locale {
 
 namespace detail {
 
 constinit std::atomic<uint32_t> currentRound{0};
-constinit Stripe stripeTable[stripes] = {};
-constinit thread_local std::size_t ownStripe __attribute__((tls_model("initial-exec"))) = 0;
-
-std::size_t chooseStripe() {
-  static constinit std::atomic<std::size_t> threads{0};
-  ownStripe = threads.fetch_add(1, std::memory_order_relaxed) % stripes + 1;
-  return ownStripe;
-}
+constinit thread_local Counts *ownCounts __attribute__((tls_model("initial-exec"))) = nullptr;
 
 } // namespace detail
 
 namespace {
+
+using detail::Counts;
+
+constexpr std::size_t ownedCounts = 64;
+constexpr std::size_t sharedCounts = 16;
+
+struct Table {
+  Counts counts[ownedCounts + sharedCounts];
+
+  constexpr Table() : counts() {
+    for (std::size_t i = ownedCounts; i < ownedCounts + sharedCounts; ++i) {
+      counts[i].shared = true;
+    }
+  }
+};
+constinit Table table;
+
+constinit std::atomic<std::size_t> threads{0}; // that have read the list
+constinit std::atomic<bool> glancesExpected{false};
+
+bool membarrier(int command) { return syscall(SYS_membarrier, command, 0, 0) == 0; }
+
+const bool barriersWork = membarrier(MEMBARRIER_CMD_REGISTER_PRIVATE_EXPEDITED);
 
 // A walk takes microseconds, so mostly the processor is only offered to it. Where that does not
 // help, the walk may belong to a thread of lower real-time priority that a yield never lets run.
@@ -37,8 +56,8 @@ void giveWay(unsigned attempt) {
 }
 
 void waitForRound(uint32_t round) {
-  for (const detail::Stripe &stripe : detail::stripeTable) {
-    for (unsigned attempt = 0; stripe.walksOfRound[round].load(std::memory_order_seq_cst) != 0;
+  for (const Counts &counts : table.counts) {
+    for (unsigned attempt = 0; counts.walksOfRound[round].load(std::memory_order_seq_cst) != 0;
          ++attempt) {
       giveWay(attempt);
     }
@@ -47,9 +66,9 @@ void waitForRound(uint32_t round) {
 
 // The threads whose walks a fork cut off do not exist in the child.
 void forgetWalks() {
-  for (detail::Stripe &stripe : detail::stripeTable) {
-    stripe.walksOfRound[0].store(0, std::memory_order_relaxed);
-    stripe.walksOfRound[1].store(0, std::memory_order_relaxed);
+  for (Counts &counts : table.counts) {
+    counts.walksOfRound[0].store(0, std::memory_order_relaxed);
+    counts.walksOfRound[1].store(0, std::memory_order_relaxed);
   }
 }
 
@@ -57,13 +76,34 @@ __attribute__((constructor)) void watchForks() { pthread_atfork(nullptr, nullptr
 
 } // namespace
 
+// A thread's number is taken sequentially consistent with the links: a removal that does not see
+// the thread is seen by the thread.
+detail::Counts *detail::chooseCounts() {
+  const std::size_t number = threads.fetch_add(1, std::memory_order_seq_cst);
+  const bool owned = barriersWork && number < ownedCounts;
+  ownCounts = &table.counts[owned ? number : ownedCounts + number % sharedCounts];
+  return ownCounts;
+}
+
+void expectGlances() {
+  if (!glancesExpected.load(std::memory_order_seq_cst)) {
+    glancesExpected.store(true, std::memory_order_seq_cst);
+  }
+}
+
 // Both rounds are seen empty once. The other round goes first: it can hold only walks that read the
 // round just before it was last changed. Then new walks are sent there, and the current one drains.
-void waitForWalkers() {
+bool waitForWalkers() {
+  const bool alone = threads.load(std::memory_order_seq_cst) == 1;
+  if (glancesExpected.exchange(false, std::memory_order_seq_cst) && barriersWork && !alone &&
+      !membarrier(MEMBARRIER_CMD_PRIVATE_EXPEDITED)) {
+    return false;
+  }
   const uint32_t current = detail::currentRound.load(std::memory_order_relaxed);
   waitForRound(current ^ 1);
   detail::currentRound.store(current ^ 1, std::memory_order_relaxed);
   waitForRound(current);
+  return true;
 }
 
 } // namespace nls2::locale

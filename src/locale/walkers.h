@@ -1,12 +1,15 @@
-// Who is walking the registry: what lets walks go without the lock while objects are freed.
+// Who is reading the registry: what lets threads read it without the lock while objects are freed.
 //
-// Every walk counts itself in and out. A removal unlinks its object, then waits until every walk
-// that began before has ended, and frees it. Walks that begin later cannot meet the object and are
-// not waited for, since they count in the other of two rounds.
+// Every walk over the list counts itself in and out. A removal unlinks its object, then waits until
+// every walk that began before has ended, and frees it. Walks that begin later cannot meet the
+// object and are not waited for, since they count in the other of two rounds.
 //
-// The counts are striped, so that threads on different processors do not share a cache line. Two
-// counts up and down were measured at 11 to 15 ns a walk; a slot of each thread's own would save
-// one of them and cost an enrolment of every thread.
+// A removal must see a walk, or the walk must see the removal. The two locked instructions that
+// ensure this take 6 ns each, too long for a glance at a single link. So a glance counts with plain
+// loads and stores, in counts that no other thread uses, and a removal that expects glances has the
+// kernel run a memory barrier in every running thread: membarrier(2), which takes microseconds. The
+// first threads that read the list get counts of their own. All later ones, and all threads of a
+// system without membarrier(2), share the rest, and glance as they walk.
 #pragma once
 
 #include <atomic>
@@ -15,45 +18,67 @@
 
 namespace nls2::locale {
 
-class Walk {
-public:
-  Walk();
-  ~Walk();
-  Walk(const Walk &) = delete;
-  Walk &operator=(const Walk &) = delete;
-
-private:
-  std::atomic<uint32_t> &count_;
-};
-
-// Returns when every walk that was under way at the call has ended. One caller at a time, with
-// thread cancellation held back.
-void waitForWalkers();
-
 namespace detail {
 
-constexpr std::size_t stripes = 64;
-
-struct alignas(64) Stripe {
-  std::atomic<uint32_t> walksOfRound[2];
+struct alignas(64) Counts {
+  std::atomic<uint32_t> walksOfRound[2] = {};
+  bool shared = false;
 };
 
-extern std::atomic<uint32_t> currentRound;
-extern Stripe stripeTable[stripes];
+extern constinit std::atomic<uint32_t> currentRound;
 
-// 0 until the thread's first walk, then the number of its stripe plus one.
-extern constinit thread_local std::size_t ownStripe __attribute__((tls_model("initial-exec")));
-std::size_t chooseStripe();
-
-inline std::atomic<uint32_t> &ownCount() {
-  const std::size_t chosen = ownStripe != 0 ? ownStripe : chooseStripe();
-  return stripeTable[chosen - 1].walksOfRound[currentRound.load(std::memory_order_relaxed)];
-}
+// Null until the thread first reads the list.
+extern constinit thread_local Counts *ownCounts __attribute__((tls_model("initial-exec")));
+Counts *chooseCounts();
 
 } // namespace detail
 
-// Sequentially consistent with the links: either the walk sees the removal, or the removal sees it.
-inline Walk::Walk() : count_(detail::ownCount()) { count_.fetch_add(1, std::memory_order_seq_cst); }
-inline Walk::~Walk() { count_.fetch_sub(1, std::memory_order_release); }
+class Walk {
+public:
+  Walk() : Walk(true) {}
+  ~Walk() {
+    if (locked_) {
+      count_.fetch_sub(1, std::memory_order_release);
+    } else {
+      count_.store(count_.load(std::memory_order_relaxed) - 1, std::memory_order_release);
+    }
+  }
+  Walk(const Walk &) = delete;
+  Walk &operator=(const Walk &) = delete;
+
+protected:
+  // Sequentially consistent with the links: either the walk sees the removal, or the removal sees
+  // it. A signal handler between a plain load and store counts up and down: what was loaded holds.
+  explicit Walk(bool locked) : Walk(locked, detail::ownCounts) {}
+
+private:
+  Walk(bool locked, detail::Counts *own)
+      : Walk(locked, own != nullptr ? *own : *detail::chooseCounts()) {}
+  Walk(bool locked, detail::Counts &own)
+      : count_(own.walksOfRound[detail::currentRound.load(std::memory_order_relaxed)]),
+        locked_(locked || own.shared) {
+    if (locked_) {
+      count_.fetch_add(1, std::memory_order_seq_cst);
+    } else {
+      count_.store(count_.load(std::memory_order_relaxed) + 1, std::memory_order_relaxed);
+      std::atomic_signal_fence(std::memory_order_seq_cst);
+    }
+  }
+
+  std::atomic<uint32_t> &count_;
+  bool locked_;
+};
+
+class Glance : public Walk {
+public:
+  Glance() : Walk(false) {}
+};
+
+// Call before a glance that is to follow a link found since the last removal.
+void expectGlances();
+
+// Returns when every walk that was under way at the call has ended; false if nobody knows, because
+// the kernel refused the barrier. One caller at a time, with thread cancellation held back.
+bool waitForWalkers();
 
 } // namespace nls2::locale

@@ -180,6 +180,33 @@ TEST(Remembered, IsEachOfManyUntilItsOwnRelease) {
   EXPECT_EQ(NLS2_ReleaseLocale(head), 0);
 }
 
+// In this thread and in one that remembers it as well.
+TEST(Remembered, IsNotLiveWhileItIsOffTheList) {
+  NLS2_Locale *const objects[] = {make(), make(), make(), make()};
+  for (const int taken : {1, 2, 3, 0}) {
+    NLS2_Locale *&link = taken == 0 ? pLocaleObjectList : objects[taken - 1]->pNext;
+    const auto validate = [&] { return NLS2_ValidateLocale(objects[taken]); };
+    std::atomic<bool> offList{false};
+    std::jthread other([&] {
+      while (validate() == 0) {
+      }
+      EXPECT_TRUE(offList);
+    });
+    for (int i = 0; i < 100'000; ++i) {
+      ASSERT_EQ(validate(), 0) << taken;
+    }
+    offList = true;
+    __atomic_store_n(&link, objects[taken]->pNext, __ATOMIC_SEQ_CST);
+    EXPECT_EQ(validate(), NLS2_ERR_INVALID_LOCALE) << taken;
+    other.join();
+    link = objects[taken];
+    EXPECT_EQ(validate(), 0) << taken;
+  }
+  for (NLS2_Locale *object : objects) {
+    EXPECT_EQ(NLS2_ReleaseLocale(object), 0);
+  }
+}
+
 TEST(Remembered, IsForgottenWhileTheListIsSetAside) {
   NLS2_Locale *object = makeAndValidate();
   NLS2_Locale *list = std::exchange(pLocaleObjectList, nullptr);
