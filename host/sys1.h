@@ -1,9 +1,14 @@
 /* sys1.h - the lock service that the library asks of its host.
  *
- * A lock object is 28 bytes of zero-initialised storage, aligned for a 32-bit word, whose contents
- * belong to the service: it is neither initialised nor destroyed. It is held only around changes
- * to the library's list of locale objects, never across a call of ICU. As with trc1.h, a host's own
- * definitions replace those of libzelhost.so.
+ * A lock object is 28 bytes of storage, all zero at first and aligned for a 32-bit word. What they
+ * hold is the service's business: nothing initialises or destroys them. The library holds its one
+ * lock while it changes its list of locale objects, and never while it calls ICU.
+ *
+ * It also holds the lock across fork(2): the thread that forks gets the lock before, and releases it
+ * in the parent and in the child. In the child, a lock must therefore be releasable by the one
+ * thread that is left, although its thread id has changed.
+ *
+ * As with trc1.h, a host's own definitions replace those of libzelhost.so.
  */
 #ifndef SYS1_H
 #define SYS1_H

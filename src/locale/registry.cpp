@@ -33,6 +33,42 @@ void set(NLS2_Locale *&link, NLS2_Locale *object) {
   __atomic_store_n(&link, object, __ATOMIC_SEQ_CST);
 }
 
+// What a thread does about the lock around a fork, and what a fork in a signal handler must know.
+struct Forking {
+  bool changesList; // the thread holds the lock, or waits for it
+  bool tookLock;
+  int cancelState;
+};
+constinit thread_local Forking forking __attribute__((tls_model("initial-exec"))) = {};
+static_assert(sizeof remembered + sizeof detail::ownCounts + sizeof forking <= 256);
+
+// A child has no thread that would release the lock for another, so the thread that forks holds it.
+// Unless it is a signal handler's fork, and what it interrupted holds the lock or keeps its holder
+// waiting: that is, changes the list or walks.
+void beforeFork() {
+  pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &forking.cancelState);
+  forking.tookLock = !forking.changesList && !isWalking();
+  if (forking.tookLock) {
+    SYS1_GetLock(&LocaleObjectList_Lock);
+  }
+}
+
+void afterFork() {
+  if (forking.tookLock) {
+    SYS1_ReleaseLock(&LocaleObjectList_Lock);
+  }
+  pthread_setcancelstate(forking.cancelState, nullptr);
+}
+
+void afterForkInChild() {
+  forgetWalks();
+  afterFork();
+}
+
+__attribute__((constructor)) void watchForks() {
+  pthread_atfork(beforeFork, afterFork, afterForkInChild);
+}
+
 // Holds the list's lock, and thread cancellation back with it: a host's trace call may be a
 // cancellation point, and a cancelled thread runs no destructor of this library, which is built
 // without exceptions. The lock would never be released.
@@ -42,11 +78,13 @@ public:
       : trace_(trace), releaseLine_(releaseLine) {
     NLS2_TRACE(trace_, "Acquire lock on linked-list.");
     pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelState_);
+    forking.changesList = true;
     SYS1_GetLock(&LocaleObjectList_Lock);
   }
   ~ListLock() {
     trace_.line(releaseLine_);
     SYS1_ReleaseLock(&LocaleObjectList_Lock);
+    forking.changesList = false;
     pthread_setcancelstate(cancelState_, nullptr);
   }
   ListLock(const ListLock &) = delete;

@@ -6,7 +6,6 @@ namespace nls2::locale {
 
 constinit std::atomic<std::size_t> removalCount{1};
 constinit thread_local Remembered remembered __attribute__((tls_model("initial-exec"))) = {};
-static_assert(sizeof remembered + sizeof detail::ownCounts <= 256);
 
 namespace {
 

@@ -4,7 +4,6 @@
 
 #include <ctime>
 #include <linux/membarrier.h>
-#include <pthread.h>
 #include <sched.h>
 #include <sys/syscall.h>
 #include <unistd.h>
@@ -64,16 +63,6 @@ void waitForRound(uint32_t round) {
   }
 }
 
-// The threads whose walks a fork cut off do not exist in the child.
-void forgetWalks() {
-  for (Counts &counts : table.counts) {
-    counts.walksOfRound[0].store(0, std::memory_order_relaxed);
-    counts.walksOfRound[1].store(0, std::memory_order_relaxed);
-  }
-}
-
-__attribute__((constructor)) void watchForks() { pthread_atfork(nullptr, nullptr, forgetWalks); }
-
 } // namespace
 
 // A thread's number is taken sequentially consistent with the links: a removal that does not see
@@ -104,6 +93,20 @@ bool waitForWalkers() {
   detail::currentRound.store(current ^ 1, std::memory_order_relaxed);
   waitForRound(current);
   return true;
+}
+
+bool isWalking() {
+  const Counts *own = detail::ownCounts;
+  return own != nullptr && !own->shared &&
+         (own->walksOfRound[0].load(std::memory_order_relaxed) != 0 ||
+          own->walksOfRound[1].load(std::memory_order_relaxed) != 0);
+}
+
+void forgetWalks() {
+  for (Counts &counts : table.counts) {
+    counts.walksOfRound[0].store(0, std::memory_order_relaxed);
+    counts.walksOfRound[1].store(0, std::memory_order_relaxed);
+  }
 }
 
 } // namespace nls2::locale

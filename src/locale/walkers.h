@@ -81,4 +81,11 @@ void expectGlances();
 // the kernel refused the barrier. One caller at a time, with thread cancellation held back.
 bool waitForWalkers();
 
+// True if a walk of this thread is under way, interrupted by a signal. A thread that shares its
+// counts does not know; for it, the answer is false.
+bool isWalking();
+
+// In a forked child: the threads whose walks the fork cut off do not exist.
+void forgetWalks();
+
 } // namespace nls2::locale

@@ -4,6 +4,7 @@
 // for show as a crash or, under the sanitizers, as a report.
 
 #include "nls2.h"
+#include "sys1.h"
 
 #include <algorithm>
 #include <atomic>
@@ -99,22 +100,42 @@ bool worksInChild() {
          NLS2_ValidateLocale(own) == NLS2_ERR_INVALID_LOCALE;
 }
 
+void expectToWork(pid_t child, const std::string &what) {
+  if (child == 0) {
+    _exit(worksInChild() ? 0 : 1);
+  }
+  int status = -1;
+  ASSERT_EQ(waitpid(child, &status, 0), child);
+  ASSERT_EQ(status, 0) << what;
+}
+
 TEST(Registry, AChildForkedAmidValidationsWorks) {
   std::vector<NLS2_Locale *> list(200); // walks long enough that a fork finds some under way
   std::ranges::generate(list, make);
   const Threads validating(3, [&] { NLS2_ValidateLocale(list.back()); });
   for (int round = 0; round < 8; ++round) {
-    const pid_t child = fork();
-    if (child == 0) {
-      _exit(worksInChild() ? 0 : 1);
-    }
-    int status = -1;
-    ASSERT_EQ(waitpid(child, &status, 0), child);
-    ASSERT_EQ(status, 0) << "round " << round;
+    expectToWork(fork(), "round " + std::to_string(round));
   }
   for (NLS2_Locale *object : list) {
     ASSERT_EQ(NLS2_ReleaseLocale(object), 0);
   }
+}
+
+TEST(Registry, AForkWaitsForWhoeverChangesTheList) {
+  std::atomic<bool> held{false};
+  std::atomic<bool> forked{false};
+  const std::jthread holder([&] {
+    SYS1_GetLock(&LocaleObjectList_Lock);
+    held = true;
+    held.notify_one();
+    std::this_thread::sleep_for(std::chrono::milliseconds(20));
+    SYS1_ReleaseLock(&LocaleObjectList_Lock);
+    forked.wait(false);
+  });
+  held.wait(false);
+  expectToWork(fork(), "while another thread holds the lock");
+  forked = true;
+  forked.notify_one();
 }
 
 #if defined(__x86_64__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
