@@ -61,7 +61,7 @@ void afterFork() {
 }
 
 void afterForkInChild() {
-  forgetWalks();
+  forgetOtherWalks();
   afterFork();
 }
 

@@ -102,10 +102,12 @@ bool isWalking() {
           own->walksOfRound[1].load(std::memory_order_relaxed) != 0);
 }
 
-void forgetWalks() {
+void forgetOtherWalks() {
   for (Counts &counts : table.counts) {
-    counts.walksOfRound[0].store(0, std::memory_order_relaxed);
-    counts.walksOfRound[1].store(0, std::memory_order_relaxed);
+    if (counts.shared || &counts != detail::ownCounts) {
+      counts.walksOfRound[0].store(0, std::memory_order_relaxed);
+      counts.walksOfRound[1].store(0, std::memory_order_relaxed);
+    }
   }
 }
 

@@ -86,6 +86,6 @@ bool waitForWalkers();
 bool isWalking();
 
 // In a forked child: the threads whose walks the fork cut off do not exist.
-void forgetWalks();
+void forgetOtherWalks();
 
 } // namespace nls2::locale

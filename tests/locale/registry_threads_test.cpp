@@ -156,6 +156,19 @@ void singleStep(const std::function<void()> &function, const std::function<void(
           : "memory", "cc");
 }
 
+TEST(Registry, AChildForkedByASignalHandlerAmidAWalkWorks) {
+  NLS2_Locale *object = make();
+  for (int at = 20; at < 80; at += 2) {
+    pid_t child = -1;
+    singleStep([&] { NLS2_ValidateLocale(&never); },
+               [&](int instruction) { child = instruction == at ? fork() : child; });
+    if (child >= 0) {
+      expectToWork(child, "instruction " + std::to_string(at));
+    }
+  }
+  EXPECT_EQ(NLS2_ReleaseLocale(object), 0);
+}
+
 TEST(Remembered, IsRightInASignalHandlerAtAnyInstruction) {
   NLS2_Locale *const head = make();
   NLS2_Locale *const released = makeAndValidate();
