@@ -135,6 +135,18 @@ std::string joined(std::vector<std::string> lines, std::string answer) {
   return text + answer;
 }
 
+// A character that is repeated many times as case files have it: \*64x.
+std::string shortened(const std::string &text) {
+  std::string result;
+  for (std::size_t at = 0; at < text.size();) {
+    const std::size_t end = std::min(text.find_first_not_of(text[at], at), text.size());
+    const std::string once(1, text[at]);
+    result += end - at < 16 ? text.substr(at, end - at) : "\\*" + shown(end - at) + once;
+    at = end;
+  }
+  return result;
+}
+
 std::string run(const Settings &settings, TraceFlags flags) {
   world = {};
   for (int i = 0; i < settings.made; ++i) {
@@ -162,7 +174,7 @@ std::string run(const Settings &settings, TraceFlags flags) {
     for (const void *handle : openedHandles()) {
       words.name(handle, "converter");
     }
-    trace = named(trace, words.names());
+    trace = shortened(named(trace, words.names()));
   }
   while (pLocaleObjectList != nullptr && NLS2_ReleaseLocale(pLocaleObjectList) == 0) {
   }

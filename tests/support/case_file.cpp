@@ -118,7 +118,9 @@ std::vector<Case> readCases(const std::string &path, const std::vector<std::stri
     const CaseLine read{line.substr(0, blank),
                         blank == std::string::npos ? "" : line.substr(blank + 1),
                         path + ":" + std::to_string(++number)};
-    if (line.empty()) {
+    if (inside && line[0] == ' ' && !cases.back().lines.empty()) {
+      cases.back().lines.back().value += line;
+    } else if (line.empty()) {
       inside = false;
     } else if (line[0] == '#') {
       continue;

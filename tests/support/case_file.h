@@ -3,8 +3,10 @@
 //   # a comment
 //   == why this case exists
 //   key value
+//    that goes on here
 //
-// A key may occur several times. An empty line ends a case. Whatever does not fit this is an error
+// A key may occur several times. A line that begins with a blank is added to the one before. An empty
+// line ends a case. Whatever does not fit this is an error
 // that names the file and the line.
 #pragma once
 
