@@ -24,57 +24,37 @@ using nls2::trace::BoundedText;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
-// Which of the two strings a line is about.
-enum class Which { first, second };
-
-// Moves on by one character. NLS2_ByteLength is called twice because both calls are in the known
-// traces. Its status is ignored, since the object is known to be live.
-void walkOn(const NLS2_Locale *pLoc, const char *string, int64_t &offset, int64_t &sum) {
-  int32_t ignored = U_ZERO_ERROR;
-  const int32_t step = NLS2_ByteLength(pLoc, string + offset, &ignored);
-  sum += NLS2_ByteLength(pLoc, string + offset, &ignored);
-  offset += step;
-}
-
 // The byte length in whole characters: up to the null if `given` is negative, else up to the end of
-// the first character that ends at or after `given`. It wraps at 16 bits.
-template <Which which>
-int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, int16_t given) {
-  int64_t offset = 0;
-  int64_t sum = 0;
+// the first character that ends at or after `given`. It wraps at 16 bits. NLS2_ByteLength is called
+// twice because both calls are in the known traces; its status is ignored, since the object is live.
+int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, int16_t given,
+                     int number) {
   if (given < 0) {
-    if constexpr (which == Which::first) {
-      NLS2_TRACE(trace, "Determine length of string 1 by looking for null.");
-    } else {
-      NLS2_TRACE(trace, "Determine length of string 2 by looking for null.");
-    }
-    while (string[offset] != 0) {
-      walkOn(pLoc, string, offset, sum);
-    }
-    NLS2_TRACE(trace, "Cumulative byte length determined is %d.", static_cast<int16_t>(sum));
+    NLS2_TRACE(trace, "Determine length of string %d by looking for null.", number);
   } else {
-    if constexpr (which == Which::first) {
-      NLS2_TRACE(trace, "String 1 is not null terminated, search for last character.");
-    } else {
-      NLS2_TRACE(trace, "String 2 is not null terminated, search for last character.");
-    }
-    while (offset < given) {
-      walkOn(pLoc, string, offset, sum);
-    }
-    NLS2_TRACE(trace, "Cumulative byte length determined to be %d.", static_cast<int16_t>(sum));
+    NLS2_TRACE(trace, "String %d is not null terminated, search for last character.", number);
   }
-  return static_cast<int16_t>(sum);
+  int64_t length = 0;
+  while (given < 0 ? string[length] != 0 : length < given) {
+    int32_t ignored = U_ZERO_ERROR;
+    NLS2_ByteLength(pLoc, string + length, &ignored);
+    length += NLS2_ByteLength(pLoc, string + length, &ignored);
+  }
+  if (given < 0) {
+    NLS2_TRACE(trace, "Cumulative byte length determined is %d.", static_cast<int16_t>(length));
+  } else {
+    NLS2_TRACE(trace, "Cumulative byte length determined to be %d.", static_cast<int16_t>(length));
+  }
+  return static_cast<int16_t>(length);
 }
 
 // Both passes, into a cleared block. Without room for string 2 the converter goes first, then
 // string 1.
-template <Which which>
 bool convertString(Trace trace, LocalUConverterPointer &converter, Utf16Text &text,
-                   const char *string, int16_t length, int32_t *pStatus) {
-  constexpr bool first = which == Which::first;
+                   const char *string, int16_t length, int number, int32_t *pStatus) {
   UErrorCode error = nls2::codepage::measure(text, converter.getAlias(), string, length);
   if (failed(error)) {
-    if constexpr (first) {
+    if (number == 1) {
       NLS2_TRACE(trace, "Error pre-flighting String 1 to UChars %d", error);
     } else {
       NLS2_TRACE(trace, "Error pre-flighting String 2 to UChars");
@@ -92,7 +72,7 @@ bool convertString(Trace trace, LocalUConverterPointer &converter, Utf16Text &te
   std::memset(text.units.get(), 0, text.size());
   error = nls2::codepage::convert(text, converter.getAlias(), string, length);
   if (failed(error)) {
-    if constexpr (first) {
+    if (number == 1) {
       NLS2_TRACE(trace, "Error converting String 1 to UChars");
     } else {
       NLS2_TRACE(trace, "Error converting String 2 to UChars %d", error);
@@ -173,14 +153,14 @@ int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int16_t Stri
   int16_t length2 = String2Length;
   if ((options & CHARBASED) != 0) {
     NLS2_TRACE(frame, "CHARBASED option selected.");
-    length1 = walkedLength<Which::first>(frame, pLoc, pString1, length1);
+    length1 = walkedLength(frame, pLoc, pString1, length1, 1);
     NLS2_TRACE(frame, "Computing length of string 2");
-    length2 = walkedLength<Which::second>(frame, pLoc, pString2, length2);
+    length2 = walkedLength(frame, pLoc, pString2, length2, 2);
   }
   Utf16Text text1;
   Utf16Text text2;
-  if (!convertString<Which::first>(frame, converter, text1, pString1, length1, pStatus) ||
-      !convertString<Which::second>(frame, converter, text2, pString2, length2, pStatus)) {
+  if (!convertString(frame, converter, text1, pString1, length1, 1, pStatus) ||
+      !convertString(frame, converter, text2, pString2, length2, 2, pStatus)) {
     return frame.result(0);
   }
   converter.adoptInstead(nullptr);

@@ -24,9 +24,6 @@ using nls2::trace::Trace;
 
 constexpr int32_t searchFailed = -1;
 
-// Which of the two strings a line is about.
-enum class Which { first, second };
-
 // Everything a call owns. Known traces fix whether it is released before or after a line.
 struct Search {
   Trace trace;
@@ -117,26 +114,11 @@ bool convertString2(Search &search, const char *string, int32_t length) {
 
 // The lower-case form gets as many units as its source has and no more, so one that grows fails.
 // The source ends at its first null.
-// `lower` has the length of the source's text.
-UErrorCode toLower(const Search &search, const Utf16Text &source, Utf16Text &lower) {
-  std::memset(lower.units.get(), 0, lower.size());
-  UErrorCode error = U_ZERO_ERROR;
-  u_strToLower(lower.units.get(), lower.length, source.units.get(), lower.length,
-               search.pLocale->icuLocale, &error);
-  return error;
-}
-
-template <Which which>
-bool lowerString(Search &search, const Utf16Text &source, Utf16Text &lower) {
+bool lowerString(Search &search, const Utf16Text &source, Utf16Text &lower, int number) {
   const Trace trace = search.trace;
-  constexpr bool first = which == Which::first;
   lower.length = source.lengthToNull();
-  const auto bytes = static_cast<int32_t>(lower.size());
-  if constexpr (first) {
-    NLS2_TRACE(trace, "Buffer size for string1 to allocate is %d  bytes.", bytes);
-  } else {
-    NLS2_TRACE(trace, "Buffer size for string2 to allocate is %d  bytes.", bytes);
-  }
+  NLS2_TRACE(trace, "Buffer size for string%d to allocate is %d  bytes.", number,
+             static_cast<int32_t>(lower.size()));
   NLS2_TRACE(trace, "Allocate memory to hold converted string.");
   if (!nls2::codepage::allocate(lower, trace)) {
     search.release();
@@ -144,18 +126,21 @@ bool lowerString(Search &search, const Utf16Text &source, Utf16Text &lower) {
     return false;
   }
   NLS2_TRACE(trace, "Memory allocated.");
-  trace.line(first ? "Convert string1 to lower.\n" : "Convert string2 to lower.\n");
-  const UErrorCode error = toLower(search, source, lower);
+  NLS2_TRACE(trace, "Convert string%d to lower.", number);
+  std::memset(lower.units.get(), 0, lower.size());
+  UErrorCode error = U_ZERO_ERROR;
+  u_strToLower(lower.units.get(), lower.length, source.units.get(), lower.length,
+               search.pLocale->icuLocale, &error);
   if (failed(error)) {
     search.release();
-    if constexpr (first) {
+    if (number == 1) {
       NLS2_TRACE(trace, "Could not convert to lower case %d", error);
     } else {
       NLS2_TRACE(trace, "Could convert to lower case %d", error);
     }
     return false;
   }
-  if constexpr (first) {
+  if (number == 1) {
     NLS2_TRACE(trace, "String1 converted to lower case.");
   }
   return true;
@@ -166,28 +151,27 @@ const UChar *firstOf(const Utf16Text &sought, const Utf16Text &text) {
                         sought.lengthToNull());
 }
 
-int32_t answer(Search &search, const UChar *found) {
+int32_t answer(Trace trace, const UChar *found) {
   if (found == nullptr) {
-    NLS2_TRACE(search.trace, "Did not find occurence of string2 in string1.");
-  } else {
-    NLS2_TRACE(search.trace, "Found occurence of string2 in string1.");
+    NLS2_TRACE(trace, "Did not find occurence of string2 in string1.");
+    return 0;
   }
-  search.release();
-  return found != nullptr ? 1 : 0;
+  NLS2_TRACE(trace, "Found occurence of string2 in string1.");
+  return 1;
 }
 
 int32_t find(Search &search, uint32_t options) {
   if ((options & IGNORECASE) == 0) {
     NLS2_TRACE(search.trace, "Locate string2 within string1");
-    return answer(search, firstOf(search.text2, search.text1));
+    return answer(search.trace, firstOf(search.text2, search.text1));
   }
   NLS2_TRACE(search.trace, "IGNORECASE option detected");
-  if (!lowerString<Which::first>(search, search.text1, search.lower1) ||
-      !lowerString<Which::second>(search, search.text2, search.lower2)) {
+  if (!lowerString(search, search.text1, search.lower1, 1) ||
+      !lowerString(search, search.text2, search.lower2, 2)) {
     return searchFailed;
   }
   NLS2_TRACE(search.trace, "Look for string2 in string1.");
-  return answer(search, firstOf(search.lower2, search.lower1));
+  return answer(search.trace, firstOf(search.lower2, search.lower1));
 }
 
 } // namespace
