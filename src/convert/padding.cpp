@@ -115,6 +115,14 @@ void release(PaddedTranslation &call, Field &field) {
   call.closeConverters();
 }
 
+int32_t finish(const PaddedTranslation &call, const Field &field, int32_t amountWritten) {
+  NLS2_TRACE(call.trace, "Output parameters. destLen %d,amountWritten %d", field.room,
+             amountWritten);
+  call.trace.dump(call.buffers.dest,
+                  static_cast<uint32_t>(std::min(amountWritten, call.buffers.destLen)));
+  return amountWritten;
+}
+
 // The count is of units, not bytes, and may therefore be more than was written.
 int32_t writeStripped(PaddedTranslation &call, Field &field) {
   NLS2_TRACE(call.trace,
@@ -124,10 +132,10 @@ int32_t writeStripped(PaddedTranslation &call, Field &field) {
   release(call, field);
   if (failed(status)) {
     NLS2_TRACE(call.trace, "Error converting to destination %d.", status);
-    call.fail(status);
-    return 0;
+    return call.fail(status);
   }
-  return field.textLength + (call.has(NLS2_STRING_TERMINATE) ? call.terminatorLength() : 0);
+  const int32_t terminator = call.has(NLS2_STRING_TERMINATE) ? call.terminatorLength() : 0;
+  return finish(call, field, field.textLength + terminator);
 }
 
 // This path has always leaked its buffer and both converters, and callers' leak accounting expects
@@ -137,8 +145,7 @@ int32_t refuseOptionAndLeak(PaddedTranslation &call, Field &field) {
   static_cast<void>(field.units.release());
   call.sourceConverter.orphan();
   call.destConverter.orphan();
-  call.fail(NLS2_ERR_INVALID_OPTION);
-  return 0;
+  return call.fail(NLS2_ERR_INVALID_OPTION);
 }
 
 // How many units the padded field has. It is compared with the room, a count of bytes: exact for a
@@ -183,16 +190,6 @@ bool writePadded(const PaddedTranslation &call, const Field &field, int32_t padd
   return true;
 }
 
-int32_t storeTerminator(const PaddedTranslation &call, const Field &field) {
-  int32_t amountWritten = field.room;
-  if (call.has(NLS2_STRING_TERMINATE)) {
-    for (int32_t i = 0; i < call.terminatorLength(); ++i) {
-      call.buffers.dest[amountWritten++] = 0;
-    }
-  }
-  return amountWritten;
-}
-
 int32_t writeField(PaddedTranslation &call, Field &field) {
   const int32_t paddedUnits = paddedLength(call, field);
   appendBlanks(field, paddedUnits);
@@ -200,7 +197,13 @@ int32_t writeField(PaddedTranslation &call, Field &field) {
     return 0;
   }
   release(call, field);
-  return storeTerminator(call, field);
+  int32_t amountWritten = field.room;
+  if (call.has(NLS2_STRING_TERMINATE)) {
+    for (int32_t i = 0; i < call.terminatorLength(); ++i) {
+      call.buffers.dest[amountWritten++] = 0;
+    }
+  }
+  return finish(call, field, amountWritten);
 }
 
 } // namespace
@@ -215,22 +218,13 @@ int32_t translateWithPadding(PaddedTranslation &call) {
   if (!fitText(call, field)) {
     return 0;
   }
-  int32_t amountWritten = 0;
   if (call.has(NLS2_STRING_STRIP_TRAILING)) {
-    amountWritten = writeStripped(call, field);
-  } else if (call.has(NLS2_STRING_FILL | NLS2_STRING_TRAILING)) {
-    amountWritten = writeField(call, field);
-  } else {
-    amountWritten = refuseOptionAndLeak(call, field);
+    return writeStripped(call, field);
   }
-  if (failed(*call.pStatus)) {
-    return 0;
+  if (call.has(NLS2_STRING_FILL | NLS2_STRING_TRAILING)) {
+    return writeField(call, field);
   }
-  NLS2_TRACE(call.trace, "Output parameters. destLen %d,amountWritten %d", field.room,
-             amountWritten);
-  call.trace.dump(call.buffers.dest,
-                  static_cast<uint32_t>(std::min(amountWritten, call.buffers.destLen)));
-  return amountWritten;
+  return refuseOptionAndLeak(call, field);
 }
 
 } // namespace nls2::convert
