@@ -9,56 +9,46 @@
 namespace nls2::codepage {
 
 struct NamedCodepage {
-  const char *converterName;
-  const char *detailLine;
+  const char *converterName; // null: none
   bool twoNullTerminator;
 };
 
-#define NAMED(codepage, name, twoNull)                                                             \
-  case codepage: {                                                                                 \
-    static constexpr NamedCodepage row = {name, "Open a converter for codepage " name ".\n",       \
-                                          twoNull};                                                \
-    return &row;                                                                                   \
-  }
-
 // Numbers that ICU knows only by name, and five Windows numbers that as CCSIDs would give other
-// tables; null for every other number. The set is part of the interface: 57364 is not in it and
+// tables; no name for every other number. The set is part of the interface: 57364 is not in it and
 // goes to ICU as a CCSID, and of the multi-byte Unicode forms only four count as two-null. A
 // switch, since a search of a table shows in the time of a short translation.
-inline const NamedCodepage *namedCodepage(int32_t codepage) {
+constexpr NamedCodepage namedCodepage(int32_t codepage) {
   // clang-format off
   switch (codepage) {
-    NAMED(874, "windows-874", false)
-    NAMED(932, "shift-jis", false)
-    NAMED(936, "windows-936", false)
-    NAMED(949, "windows-949", false)
-    NAMED(950, "windows-950", false)
-    NAMED(1200, "utf-16be", true)
-    NAMED(1208, "utf-8", false)
-    NAMED(57352, "utf-8", false)
-    NAMED(57355, "sbcs", false)
-    NAMED(57356, "dbcs", false)
-    NAMED(57357, "mbcs", false)
-    NAMED(57358, "utf-16be", true)
-    NAMED(57359, "utf-16le", true)
-    NAMED(57360, "utf-32be", false)
-    NAMED(57361, "utf-32le", false)
-    NAMED(57362, "hz", false)
-    NAMED(57363, "scsu", false)
-    NAMED(57365, "iscii,version=0", false)
-    NAMED(57366, "utf-7", false)
-    NAMED(57367, "bocu1", false)
-    NAMED(57368, "utf-16", true)
-    NAMED(57369, "utf-32", false)
-    NAMED(57370, "cesu-8", false)
-    NAMED(57371, "gb18030", false)
-    NAMED(57372, "ucs-2", false)
-    default: return nullptr;
+  case 874: return {"windows-874", false};
+  case 932: return {"shift-jis", false};
+  case 936: return {"windows-936", false};
+  case 949: return {"windows-949", false};
+  case 950: return {"windows-950", false};
+  case 1200: return {"utf-16be", true};
+  case 1208: return {"utf-8", false};
+  case 57352: return {"utf-8", false};
+  case 57355: return {"sbcs", false};
+  case 57356: return {"dbcs", false};
+  case 57357: return {"mbcs", false};
+  case 57358: return {"utf-16be", true};
+  case 57359: return {"utf-16le", true};
+  case 57360: return {"utf-32be", false};
+  case 57361: return {"utf-32le", false};
+  case 57362: return {"hz", false};
+  case 57363: return {"scsu", false};
+  case 57365: return {"iscii,version=0", false};
+  case 57366: return {"utf-7", false};
+  case 57367: return {"bocu1", false};
+  case 57368: return {"utf-16", true};
+  case 57369: return {"utf-32", false};
+  case 57370: return {"cesu-8", false};
+  case 57371: return {"gb18030", false};
+  case 57372: return {"ucs-2", false};
+  default: return {nullptr, false};
   }
   // clang-format on
 }
-
-#undef NAMED
 
 // The whole of NLS2_MapCodepageIdToName, its trace frame included, to be compiled into a caller
 // that counts nanoseconds: as two calls it was half of what NLS2_TranslateString costs beside ICU.
@@ -72,13 +62,13 @@ mapCodepageIdToName(int32_t codepage, int32_t *twoNullTerminator, int32_t *statu
 
   UErrorCode error = U_ZERO_ERROR;
   UConverter *converter = nullptr;
-  if (const NamedCodepage *named = namedCodepage(codepage)) {
-    frame.line(named->detailLine);
-    if (named->twoNullTerminator) {
+  if (const auto [name, twoNull] = namedCodepage(codepage); name != nullptr) {
+    NLS2_TRACE(frame, "Open a converter for codepage %s.", name);
+    if (twoNull) {
       NLS2_TRACE(frame, "Codepage uses two null character as a string terminator..");
       *twoNullTerminator = 1;
     }
-    converter = ucnv_open(named->converterName, &error);
+    converter = ucnv_open(name, &error);
   } else {
     NLS2_TRACE(frame, "Codepage %d not mapped to name. Using codepage as CCSID instead.", codepage);
     converter = ucnv_openCCSID(codepage, UCNV_IBM, &error);

@@ -74,15 +74,12 @@ __attribute__((constructor)) void watchForks() {
 // without exceptions. The lock would never be released.
 class ListLock {
 public:
-  explicit ListLock(trace::Trace trace, const char *releaseLine)
-      : trace_(trace), releaseLine_(releaseLine) {
-    NLS2_TRACE(trace_, "Acquire lock on linked-list.");
+  ListLock() {
     pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelState_);
     forking.changesList = true;
     SYS1_GetLock(&LocaleObjectList_Lock);
   }
   ~ListLock() {
-    trace_.line(releaseLine_);
     SYS1_ReleaseLock(&LocaleObjectList_Lock);
     forking.changesList = false;
     pthread_setcancelstate(cancelState_, nullptr);
@@ -91,10 +88,22 @@ public:
   ListLock &operator=(const ListLock &) = delete;
 
 private:
-  trace::Trace trace_;
-  const char *releaseLine_;
   int cancelState_ = 0;
 };
+
+void link(trace::Trace trace, NLS2_Locale *object) {
+  NLS2_Locale *last = follow(pLocaleObjectList);
+  if (last == nullptr) {
+    NLS2_TRACE(trace, "List is empty, add as first node.");
+    set(pLocaleObjectList, object);
+    return;
+  }
+  NLS2_TRACE(trace, "List has entries, Attach to end of list.");
+  while (NLS2_Locale *following = follow(last->pNext)) {
+    last = following;
+  }
+  set(last->pNext, object);
+}
 
 // Where an object is on the list: `current` is the object, or null at the list's end.
 struct Position {
@@ -168,37 +177,27 @@ int32_t validateInFrame(TRC1_EntryBlock &anchor, const NLS2_Locale *pLocale) {
 
 void append(trace::Trace trace, NLS2_Locale *object) {
   NLS2_TRACE(trace, "Place locale object on linked list.");
-  const ListLock lock(trace, "Linked-list modification complete, release lock.\n");
-  NLS2_Locale *last = follow(pLocaleObjectList);
-  if (last == nullptr) {
-    NLS2_TRACE(trace, "List is empty, add as first node.");
-    set(pLocaleObjectList, object);
-    return;
-  }
-  NLS2_TRACE(trace, "List has entries, Attach to end of list.");
-  while (NLS2_Locale *following = follow(last->pNext)) {
-    last = following;
-  }
-  set(last->pNext, object);
+  NLS2_TRACE(trace, "Acquire lock on linked-list.");
+  const ListLock lock;
+  link(trace, object);
+  NLS2_TRACE(trace, "Linked-list modification complete, release lock.");
 }
 
 void remove(trace::Trace trace, NLS2_Locale *object) {
-  const ListLock lock(trace, "Release lock on linked-list.\n");
-  NLS2_Locale *head = follow(pLocaleObjectList);
-  if (head == nullptr) {
-    return;
+  NLS2_TRACE(trace, "Acquire lock on linked-list.");
+  const ListLock lock;
+  if (NLS2_Locale *head = follow(pLocaleObjectList)) {
+    NLS2_TRACE(trace, "Linked-list has entries");
+    if (const Position at = locate(trace, head, object); at.current != nullptr) {
+      unlink(trace, at);
+      countRemoval();
+      NLS2_TRACE(trace, "Locale structure removed from list.");
+      if (waitForWalkers()) {
+        std::free(at.current);
+      }
+    }
   }
-  NLS2_TRACE(trace, "Linked-list has entries");
-  const Position at = locate(trace, head, object);
-  if (at.current == nullptr) {
-    return;
-  }
-  unlink(trace, at);
-  countRemoval();
-  NLS2_TRACE(trace, "Locale structure removed from list.");
-  if (waitForWalkers()) {
-    std::free(at.current);
-  }
+  NLS2_TRACE(trace, "Release lock on linked-list.");
 }
 
 } // namespace nls2::locale

@@ -42,16 +42,6 @@ public:
   bool detail() const { return (flags_ & TRC1_FLAG_DETAIL) != 0; }
   TRC1_EntryBlock *anchor() const { return anchor_; }
 
-  // Prints a constant line. Unlike NLS2_TRACE it adds no newline: the text brings its own.
-  void line(const char *text, uint32_t line = __builtin_LINE()) const {
-    if (detail()) [[unlikely]] {
-#pragma GCC diagnostic push
-#pragma GCC diagnostic ignored "-Wformat-security"
-#pragma GCC diagnostic ignored "-Wformat-nonliteral"
-      TRC1_Printf(anchor_, line, text);
-#pragma GCC diagnostic pop
-    }
-  }
   void dump(const void *address, uint32_t length, uint32_t line = __builtin_LINE()) const {
     if (detail()) [[unlikely]] {
       TRC1_Dump(anchor_, line, address, length, 0);
@@ -83,7 +73,7 @@ public:
   }
   ~Frame() {
     if (events()) [[unlikely]] {
-      if (exitKind_ == TRC1_EVENT_EXIT_VALUE) {
+      if (exitLine_ != 0) {
         TRC1_Event(anchor(), exitLine_, TRC1_EVENT_EXIT_VALUE, exitValue_);
       } else {
         TRC1_Event(anchor(), anchor()->entryLine, TRC1_EVENT_EXIT);
@@ -96,7 +86,6 @@ public:
   // The exit event will carry this value; without a call of `result` it carries none.
   template <class Value>
   Value result(Value value, uint32_t line = __builtin_LINE()) {
-    exitKind_ = TRC1_EVENT_EXIT_VALUE;
     exitValue_ = exitValue(value);
     exitLine_ = line;
     return value;
@@ -116,9 +105,8 @@ private:
     return TRC1_Sync(&anchor);
   }
 
-  uint32_t exitKind_ = TRC1_EVENT_EXIT;
   uint32_t exitValue_ = 0;
-  uint32_t exitLine_ = 0;
+  uint32_t exitLine_ = 0; // 0: leaves without a value
 };
 
 } // namespace nls2::trace

@@ -22,12 +22,10 @@ using Block = std::unique_ptr<Unit[], FreeBlock>;
 inline void *realloc_mem(TRC1_EntryBlock *caller, uint32_t line, void *old, uint32_t size) {
   static constinit TRC1_EntryBlock anchor = anchorOf("realloc_mem", TRC1_ENTRY_PRIVATE);
   const Frame frame(anchor);
-  // Taken before the call: with size 0 realloc frees the block, and `old` has no value any more.
-  const auto oldAddress = reinterpret_cast<std::uintptr_t>(old);
   void *block = std::realloc(old, size);
   if (block == nullptr && frame.detail()) {
     TRC1_Printf(caller, line, "Memory allocation failure: Size(%lu), Old(%p)\n",
-                static_cast<unsigned long>(size), reinterpret_cast<void *>(oldAddress));
+                static_cast<unsigned long>(size), old);
   }
   return block;
 }
