@@ -55,17 +55,13 @@ int32_t NLS2_GetCodepageName(int32_t codepageId, char *nameBuffer, uint32_t /*bu
     NLS2_TRACE(frame, "Converter codepage name not found.");
     return frame.result(int32_t{failed(error) ? error : U_MISSING_RESOURCE_ERROR});
   }
-  // Most names live in ICU's shared data, but that of 57365 lives in the converter and is
-  // freed with it.
-  char text[UCNV_MAX_CONVERTER_NAME_LENGTH] = {};
-  std::strncpy(text, name, sizeof text - 1);
-  NLS2_TRACE(frame, "Codepage name %s found.", text);
+  NLS2_TRACE(frame, "Codepage name %s found.", name);
+  std::strcpy(nameBuffer, name); // before the close: the name of 57365 is freed with its converter
   NLS2_TRACE(frame, "Release converter %X.", nls2::trace::low32(converter.getAlias()));
   converter.adoptInstead(nullptr);
-  NLS2_TRACE(frame, "Copy codepage name %s to user buffer.", text);
-  std::strcpy(nameBuffer, text);
+  NLS2_TRACE(frame, "Copy codepage name %s to user buffer.", nameBuffer);
   NLS2_TRACE(frame, "Compute length of name.");
-  NLS2_TRACE(frame, "Name length is %d.", static_cast<int>(std::strlen(text)));
+  NLS2_TRACE(frame, "Name length is %d.", static_cast<int>(std::strlen(nameBuffer)));
   return frame.result(0);
 }
 
