@@ -4,6 +4,7 @@
 #include "nls2_fields.h"
 
 #include <exception>
+#include <unicode/utypes.h>
 
 namespace zelfields {
 
@@ -16,6 +17,11 @@ int32_t guarded(Body body) noexcept {
   } catch (const std::exception &) {
     return NLS2_ERR_NO_MEMORY;
   }
+}
+
+// ICU's status as one of ours.
+inline int32_t statusOf(UErrorCode error) noexcept {
+  return error == U_MEMORY_ALLOCATION_ERROR ? int32_t{NLS2_ERR_NO_MEMORY} : int32_t{error};
 }
 
 // Whether a struct of the caller's is there, and as large as this version of it.

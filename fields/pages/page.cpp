@@ -6,10 +6,14 @@
 
 #include <charconv>
 #include <cstring>
+#include <new>
 
 namespace zelfields {
 
 icu::LocalUConverterPointer cloneOf(const UConverter *converter, UErrorCode &error) {
+  if (ucnv_getType(converter) == UCNV_COMPOUND_TEXT) { // ICU crashes when it closes a clone of it
+    return icu::LocalUConverterPointer(ucnv_open(ucnv_getName(converter, &error), &error));
+  }
 #if U_ICU_VERSION_MAJOR_NUM >= 71
   return icu::LocalUConverterPointer(ucnv_clone(converter, &error));
 #else
@@ -17,6 +21,29 @@ icu::LocalUConverterPointer cloneOf(const UConverter *converter, UErrorCode &err
   error = error == U_SAFECLONE_ALLOCATED_WARNING ? U_ZERO_ERROR : error;
   return clone;
 #endif
+}
+
+UConverter *restart(icu::LocalUConverterPointer &converter) {
+  UConverter *const old = converter.getAlias();
+  if (ucnv_getType(old) != UCNV_COMPOUND_TEXT) {
+    ucnv_reset(old);
+    return old;
+  }
+  // ICU's reset does nothing to it.
+  UErrorCode error = U_ZERO_ERROR;
+  icu::LocalUConverterPointer fresh = cloneOf(old, error);
+  if (U_FAILURE(error)) {
+    throw std::bad_alloc();
+  }
+  UConverterToUCallback decoding = nullptr;
+  UConverterFromUCallback encoding = nullptr;
+  const void *context = nullptr;
+  ucnv_getToUCallBack(old, &decoding, &context);
+  ucnv_setToUCallBack(fresh.getAlias(), decoding, context, nullptr, nullptr, &error);
+  ucnv_getFromUCallBack(old, &encoding, &context);
+  ucnv_setFromUCallBack(fresh.getAlias(), encoding, context, nullptr, nullptr, &error);
+  converter = std::move(fresh);
+  return converter.getAlias();
 }
 
 namespace {
@@ -38,7 +65,7 @@ bool writesSignature(UConverter *converter) {
 int32_t makePage(UConverter *opened, int32_t status, NLS2F_Page **page) {
   icu::LocalUConverterPointer converter(opened);
   if (status > 0) {
-    return status;
+    return statusOf(static_cast<UErrorCode>(status));
   }
   const bool marked = writesSignature(opened);
   *page = new NLS2F_Page{std::move(converter), marked, NLS2F_Page::numberUnknown};

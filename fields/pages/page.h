@@ -21,8 +21,7 @@ namespace zelfields {
 // A converter of one's own, in its initial state. The status may be a warning.
 icu::LocalUConverterPointer cloneOf(const UConverter *converter, UErrorCode &error);
 
-inline icu::LocalUConverterPointer openConverter(const NLS2F_Page &page, UErrorCode &error) {
-  return cloneOf(page.converter.getAlias(), error);
-}
+// Brings a converter to the beginning of a text.
+UConverter *restart(icu::LocalUConverterPointer &converter);
 
 } // namespace zelfields

@@ -38,4 +38,20 @@ inline bool hasStates(UConverterType type) noexcept {
                         UCNV_ISO_2022, UCNV_HZ, UCNV_ISCII, UCNV_COMPOUND_TEXT});
 }
 
+// Text may leave a mode open that a blank after it closes, or that makes the blank another.
+inline bool leavesModesOpen(UConverterType type) noexcept {
+  return isLmbcs(type) || isOneOf(type, {UCNV_UTF7, UCNV_IMAP_MAILBOX, UCNV_SCSU, UCNV_ISCII,
+                                         UCNV_ISO_2022, UCNV_HZ, UCNV_COMPOUND_TEXT});
+}
+
+// ICU's converter forgets half a pair at the end of a text that ends in a call of its own.
+inline bool losesHalves(UConverterType type) noexcept {
+  return isOneOf(type, {UCNV_HZ, UCNV_COMPOUND_TEXT});
+}
+
+// How many UTF-16 units a byte can become: a supplementary character, or a sequence.
+inline int64_t unitsPerByte(UConverterType type) noexcept {
+  return isOneOf(type, {UCNV_SCSU, UCNV_BOCU1, UCNV_ISCII, UCNV_SBCS}) ? 2 : 1;
+}
+
 } // namespace zelfields
