@@ -28,6 +28,7 @@ int64_t invalidBytes(const UConverter *from) {
 class Units {
 public:
   Units(UConverter *from, std::string_view text) : from_(from), text_(text), decoder_(from, text) {
+    noted_[piece] = -1;
     UErrorCode error = U_ZERO_ERROR;
     ucnv_setToUCallBack(from, note, this, &policy_, &context_, &error);
   }
@@ -128,7 +129,7 @@ Character characterAt(int64_t unit, std::string_view text, UConverter *converter
 int64_t endWithoutShifts(const Character &character, std::string_view text, UConverter *converter) {
   const char *source = text.data();
   int64_t decoded = 0;
-  for (int64_t limit = character.offset; decoded < character.endUnit && limit < character.end;) {
+  for (int64_t limit = character.offset; decoded < character.endUnit && limit <= character.end;) {
     char16_t piece[64];
     char16_t *target = piece;
     UErrorCode error = U_ZERO_ERROR;
