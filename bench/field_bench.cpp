@@ -1,4 +1,4 @@
-// nls2::field_translator beside ICU and iconv kept open, on the same fields.
+// nls2::translator beside ICU and iconv kept open, on the same fields.
 
 #include <algorithm>
 #include <benchmark/benchmark.h>
@@ -6,7 +6,7 @@
 #include <iconv.h>
 #include <iostream>
 #include <new>
-#include <nls2/field_translator.hpp>
+#include <nls2/translator.hpp>
 #include <string>
 #include <unicode/ucnv.h>
 
@@ -67,7 +67,7 @@ public:
   }
 
 private:
-  nls2::field_translator translator_;
+  nls2::translator translator_;
 };
 
 class Icu {

@@ -3,37 +3,30 @@
 // usage: greet DIRECTORY (of the resource bundles)
 
 #include <nls2.hpp>
+#include <nls2/bundle.hpp>
 
 #include <algorithm>
 #include <exception>
 #include <iostream>
-#include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
 
 namespace {
 
-// A field of an international EBCDIC record as UTF-8, without its trailing blanks.
-std::string fieldText(nls2::field_translator &translator, std::string_view field) {
-  std::string text;
-  if (!translator.translate(field, text)) {
-    throw std::runtime_error("the field is not text of its code page");
-  }
-  return text;
-}
-
 void greet(std::string_view language, std::string_view directory, std::vector<std::string> names) {
-  const auto locale = nls2::make_locale(nls2::language_id::from_name(language), nls2::utf8_page);
-  const auto bundle = nls2::open_bundle(directory, locale);
+  const nls2::code_page utf8("utf-8");
+  const nls2::locale locale(nls2::language_id(language), 1208);
+  const nls2::bundle messages(directory, locale);
   const auto before = [&](const std::string &left, const std::string &right) {
-    return nls2::compare(locale, left, right) < 0;
+    int32_t status = 0;
+    return NLS2_Strcoll(locale.get(), left.c_str(), -1, right.c_str(), -1, 0, &status) < 0;
   };
   std::ranges::sort(names, before);
   for (const std::string &name : names) {
-    std::cout << nls2::from_utf16(locale, bundle.string("greeting")) << ", " << name << "!\n";
+    std::cout << nls2::from_utf16(utf8, messages.string("greeting")) << ", " << name << "!\n";
   }
-  std::cout << nls2::from_utf16(locale, bundle.string("farewell")) << ".\n";
+  std::cout << nls2::from_utf16(utf8, messages.string("farewell")) << ".\n";
 }
 
 } // namespace
@@ -44,13 +37,13 @@ int main(int argc, char **argv) {
     return 2;
   }
   try {
-    nls2::field_translator translator(nls2::code_page(500), nls2::utf8_page,
-                                      {.padding = nls2::padding::strip});
+    nls2::translator to_utf8(nls2::code_page("ibm-500"), nls2::code_page("utf-8"),
+                             {.padding = nls2::padding::strip});
     std::vector<std::string> names;
     for (const char *field : {"\xE9\x96\x53\x40\x40\x40\x40\x40\x40\x40",    // Zoë
                               "\x71\x94\x89\x93\x85\x40\x40\x40\x40\x40",    // Émile
                               "\xEC\xA9\x93\x85\x94\x40\x40\x40\x40\x40"}) { // Özlem
-      names.push_back(fieldText(translator, field));
+      names.push_back(to_utf8.translate(field));
     }
     greet("de_DE", argv[1], names);
     greet("fr_FR", argv[1], names);

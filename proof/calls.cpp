@@ -6,7 +6,7 @@
 #include "support/dispatch.h"
 #include "support/functions.h"
 
-#include <nls2/field_translator.hpp>
+#include <nls2/translator.hpp>
 #include <regex>
 
 namespace proof {
@@ -20,8 +20,12 @@ std::string translateFields(const support::Words &words) {
                                   .bad = static_cast<nls2::on_bad>(words.number(2))};
   std::error_code error;
   support::aroundCall(true);
-  nls2::field_translator translator(nls2::code_page(words.number(0)), nls2::code_page(1208), policy,
-                                    error);
+  nls2::translator translator;
+  if (const nls2::code_page from(words.number(0), error); !error) {
+    if (const nls2::code_page to(1208, error); !error) {
+      translator = nls2::translator(from, to, policy, error);
+    }
+  }
   support::aroundCall(false);
   const std::string text = std::string(3000, '\xC1') + std::string(100, '\x40'); // A in EBCDIC
   std::string out(8000, '\0');
@@ -33,9 +37,7 @@ std::string translateFields(const support::Words &words) {
     support::aroundCall(true);
     const auto result = translator.translate(std::span(text).last(length), std::span(out));
     support::aroundCall(false);
-    error = result.problem == nls2::field_problem::no_memory ? nls2::make_status(NLS2_ERR_NO_MEMORY)
-            : result                                         ? std::error_code()
-                                                             : nls2::make_status(99);
+    error = result.error();
     answer += out.substr(0, result.written) + "|";
   }
   return answer;
@@ -46,9 +48,8 @@ std::string translateFields(const support::Words &words) {
 std::string Call::make(NLS2_Locale *in) const {
   const support::Words words(text, in);
   const std::string function = text.substr(0, text.find(' '));
-  const std::string answer = function == "field_translator"
-                                 ? translateFields(words)
-                                 : support::functions().at(function)(words);
+  const std::string answer =
+      function == "translator" ? translateFields(words) : support::functions().at(function)(words);
   return support::named(answer, words.names());
 }
 

@@ -1,116 +1,121 @@
-// code_page.hpp - code pages as a type, their names, and ICU's converters for them.
+// code_page.hpp - code pages, by name and by number.
 #ifndef NLS2_CODE_PAGE_HPP
 #define NLS2_CODE_PAGE_HPP
 
 #include "nls2/detail/common.hpp"
+#include "nls2/error.hpp"
 
 #include <cstddef>
 #include <cstdint>
 #include <span>
 #include <string>
 #include <string_view>
-#include <unicode/ucnv.h>
+#include <vector>
 
 namespace nls2 {
+inline namespace NLS2_MODE {
 
-// A code page by its number: a CCSID, or one of the private numbers from 57352 up that
-// NLS2_MapCodepageIdToName lists. Any number may be held; a converter shows whether it opens.
-class code_page {
-public:
-  constexpr explicit code_page(std::int32_t number) noexcept : number_(number) {}
-
-  // The code page of a converter name, by ICU's rules for names ("ibm-1141", "UTF-8", any case):
-  // ICU's CCSID for it, or else the number of ccsidMap. Number 0 on failure. Errors: 4
-  // (unknown_code_page) for a name that ICU does not know; NLS2_ERR_INVALID_PARAMETER for an empty
-  // name, one with a null inside and a converter that has no number; 31 (too_long) from 256 bytes
-  // up; ICU's.
-  //
-  // Surprise: 874, 932, 936, 949 and 950 open Windows tables, so the number of "ibm-932" is 932,
-  // but code page 932 is Shift-JIS. To open exactly what a name says, use ucnv_open().
-  static code_page from_name(std::string_view name, std::error_code &error) noexcept;
-#if NLS2_HAS_EXCEPTIONS
-  static code_page from_name(std::string_view name);
-#endif
-
-  constexpr std::int32_t number() const noexcept { return number_; }
-  friend constexpr bool operator==(code_page, code_page) noexcept = default;
-
-private:
-  std::int32_t number_;
+enum class page_kind : std::int32_t {
+  single_byte = NLS2F_PAGE_SINGLE_BYTE, // every byte is a character
+  mixed = NLS2F_PAGE_MIXED,             // characters of one, two or more bytes
+  unicode = NLS2F_PAGE_UNICODE,         // UTF-8, UTF-16, UTF-32, CESU-8, UTF-7, SCSU, BOCU-1 ...
+  other = NLS2F_PAGE_OTHER              // ISO-2022, HZ, ISCII, LMBCS ...
 };
 
-inline constexpr code_page utf8_page{1208};
-
-namespace detail {
-inline void close_converter(UConverter *owned) noexcept { ucnv_close(owned); }
-} // namespace detail
-
-// Owns an open converter of ICU's. Move-only; may own none.
-class converter : public detail::owner<UConverter, detail::close_converter> {
-public:
-  using owner::owner;
+struct page_facts {
+  std::string name;        // ICU's canonical name: "ibm-37_P100-1995"
+  std::int32_t number = 0; // one that opens the same table, or 0
+  page_kind kind = page_kind::other;
+  bool has_states = false;    // what a byte means depends on those before it
+  bool has_signature = false; // a text begins with a byte-order mark
 };
 
-// Opens the converter of a code page (NLS2_MapCodepageIdToName); null on failure. Errors: 4
-// (unknown_code_page) for a number that this ICU has no converter for; ICU's.
-//
-// Surprise: ICU reads -37 as 37.
-inline converter open_converter(code_page page, std::error_code &error) noexcept {
-  std::int32_t two_nulls = 0;
-  std::int32_t status = 0;
-  converter opened(NLS2_MapCodepageIdToName(page.number(), &two_nulls, &status));
-  error = make_status(status);
-  return opened;
+// ICU's names that look like one that does not open: "cp037, ibm-37"; empty if there are none.
+[[nodiscard]] inline std::string near_page_names(std::string_view name) {
+  const detail::terminated<256> text(name);
+  char names[192] = "";
+  return text.status() == 0 && NLS2F_NearPageNames(text.c_str(), names, sizeof names) <= 0
+             ? std::string(names)
+             : std::string();
 }
 
-// ICU's canonical name of a code page's converter: "UTF-8" for 1208. Empty on failure. Errors:
-// open_converter's; 2 (not_found) where ICU has no name.
-inline std::string name_of(code_page page, std::error_code &error) {
-  char name[UCNV_MAX_CONVERTER_NAME_LENGTH] = "";
-  error = make_status(NLS2_GetCodepageName(page.number(), name, sizeof name));
-  return error ? std::string() : std::string(name);
+namespace detail {
+inline void close_page(NLS2F_Page *owned) noexcept { NLS2F_ClosePage(owned); }
+} // namespace detail
+
+// Owns an open code page, which any number of threads may use at once. Move-only; may be empty. It
+// may be destroyed before what was opened with it. Compare and store pages by their names.
+class code_page : public detail::owner<NLS2F_Page, detail::close_page> {
+public:
+  using owner::owner;
+
+  // By one of ICU's names, with its options: exactly what ICU opens for it. Digits alone are a
+  // number. Empty on failure. Errors:
+  //
+  //   4   unknown_code_page: ICU does not know the name. The exception has similar ones
+  //   37  invalid_argument: an empty name, or one with a null inside
+  //   31  too_long: 256 bytes or more
+  //   other  ICU's
+  explicit code_page(std::string_view name, error_ref error NLS2_MAY_OMIT) {
+    const detail::terminated<256> text(name);
+    NLS2F_Page *opened = nullptr;
+    const std::int32_t status =
+        text.status() != 0 ? text.status() : NLS2F_OpenPageByName(text.c_str(), &opened);
+    reset(opened);
+    std::string named(name);
+    if (status == U_FILE_ACCESS_ERROR) {
+      const std::string similar = near_page_names(name);
+      named += similar.empty() ? "" : " (similar: " + similar + ")";
+    }
+    error.report(status, "cannot open the code page", named);
+  }
+
+  // By number: a CCSID, or one of the library's own from 57352 up (NLS2_MapCodepageIdToName). Empty
+  // on failure. Errors: 4 (unknown_code_page) for a number that this ICU has no converter for;
+  // ICU's.
+  //
+  // Surprise: 874, 932, 936, 949 and 950 open other tables than the names "ibm-874" and so on. If a
+  // name is known, use it.
+  explicit code_page(std::int32_t number, error_ref error NLS2_MAY_OMIT) {
+    NLS2F_Page *opened = nullptr;
+    const std::int32_t status = NLS2F_OpenPageByNumber(number, &opened);
+    reset(opened);
+    error.report(status, "cannot open the code page", std::to_string(number));
+  }
+
+  // Error: 37 (invalid_argument) for an empty page.
+  [[nodiscard]] page_facts facts(error_ref error NLS2_MAY_OMIT) const {
+    NLS2F_PageFacts c{};
+    c.size = sizeof c;
+    if (!error.report(NLS2F_PageInfo(get(), &c), "cannot describe the code page")) {
+      return {};
+    }
+    return {c.name, c.number, static_cast<page_kind>(c.kind), c.hasStates != 0,
+            c.hasSignature != 0};
+  }
+};
+
+// The names of all pages that ICU has, for lists; code_page() opens each. Static texts.
+[[nodiscard]] inline std::vector<std::string_view> page_names(error_ref error NLS2_MAY_OMIT) {
+  std::vector<std::string_view> names;
+  std::int64_t count = 0;
+  std::int32_t status = NLS2F_PageCount(&count);
+  for (std::int64_t i = 0; i < count && status <= 0; ++i) {
+    const char *name = nullptr;
+    status = NLS2F_PageAt(i, &name);
+    names.emplace_back(name != nullptr ? name : "");
+  }
+  return error.report(status, "cannot list the code pages") ? names
+                                                            : std::vector<std::string_view>();
 }
 
 // The records of ccsidMap: Windows names and their code pages, in the order in which they are
-// searched. A search finds a name inside a longer one, so from_name() asks ICU first.
-inline std::span<const CcsidMapEntry> windows_names() noexcept {
+// searched (NLS2_MapWindowsNameToCCSID).
+[[nodiscard]] inline std::span<const CcsidMapEntry> windows_names() noexcept {
   return {ccsidMap, NLS2_CCSID_MAP_RECORDS - 1};
 }
 
-inline code_page code_page::from_name(std::string_view name, std::error_code &error) noexcept {
-  const detail::terminated<256> text(name);
-  if (name.empty() || text.status() != 0) {
-    error = make_status(name.empty() ? NLS2_ERR_INVALID_PARAMETER : text.status());
-    return code_page(0);
-  }
-  UErrorCode failure = U_ZERO_ERROR;
-  const converter opened(ucnv_open(text.c_str(), &failure));
-  std::int32_t number = opened ? ucnv_getCCSID(opened.get(), &failure) : 0;
-  std::int32_t status = failure;
-  if (status <= 0 && number == 0) {
-    number = static_cast<std::int32_t>(NLS2_MapWindowsNameToCCSID(text.c_str(), &status));
-  }
-  error = make_status(status);
-  return code_page(error ? 0 : number);
-}
-
-#if NLS2_HAS_EXCEPTIONS
-inline code_page code_page::from_name(std::string_view name) {
-  return detail::or_throw("cannot find the code page's number",
-                          [=](std::error_code &error) { return from_name(name, error); });
-}
-
-inline converter open_converter(code_page page) {
-  return detail::or_throw("cannot open a converter for the code page",
-                          [=](std::error_code &error) { return open_converter(page, error); });
-}
-
-inline std::string name_of(code_page page) {
-  return detail::or_throw("cannot name the code page",
-                          [=](std::error_code &error) { return name_of(page, error); });
-}
-#endif
-
+} // namespace NLS2_MODE
 } // namespace nls2
 
 #endif

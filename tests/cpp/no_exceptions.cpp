@@ -1,13 +1,11 @@
-// Compiled with -fno-exceptions: the forms that take an error code are there, and only they.
+// Compiled with -fno-exceptions: an error code must be passed.
 
 #include "nls2.hpp"
+#include "nls2/bundle.hpp"
+#include "nls2/stream.hpp"
 
-template <class Page>
-constexpr bool throws = requires(Page page) {
-  nls2::open_converter(page);
-};
-template <class Page>
-constexpr bool reports = requires(Page page, std::error_code &e) {
-  nls2::open_converter(page, e);
-};
-static_assert(!throws<nls2::code_page> && reports<nls2::code_page>);
+using Code = std::error_code &;
+static_assert(!std::is_constructible_v<nls2::code_page, const char *>);
+static_assert(std::is_constructible_v<nls2::code_page, const char *, Code>);
+static_assert(!std::is_copy_constructible_v<nls2::translator>);
+static_assert(std::is_constructible_v<nls2::translator, const nls2::translator &, Code>);

@@ -1,6 +1,6 @@
-// Streams on real files: lines of every end, and who owns the file.
+// Streams on real files: lines of every end, and what does not convert.
 
-#include "nls2.hpp"
+#include "nls2/stream.hpp"
 
 #include <fstream>
 #include <gtest/gtest.h>
@@ -11,14 +11,17 @@ namespace {
 using namespace std::string_literals;
 using namespace nls2;
 
+static_assert(!std::is_constructible_v<stream, locale, const char *, const char *, const char *>);
+
 class Streams : public testing::Test {
 protected:
   ~Streams() override { unlink(path.c_str()); }
-  stream open(std::string_view mode, std::string_view encoding = "UTF-8") {
-    return open_stream(where, path, mode, encoding);
+  stream open(std::string_view mode, std::string_view encoding = "UTF-8", on_bad bad = {}) {
+    return {where, path, mode, encoding, bad};
   }
+  std::string bytes() { return {std::istreambuf_iterator(std::ifstream(path).rdbuf()), {}}; }
 
-  locale where = default_locale();
+  locale where = locale::of_process();
   const std::string path = testing::TempDir() + "nls2_cpp_" + std::to_string(getpid());
 };
 
@@ -47,17 +50,25 @@ TEST_F(Streams, LinesEndWhereTheyEnd) {
   }
 }
 
-TEST_F(Streams, OwnTheirFile) {
-  stream file = open("w", "ibm-1141");
-  file.write_line(u"Gr\u00FC\u00DFe");
-  file.flush();
-  std::string bytes;
-  std::getline(std::ifstream(path, std::ios::binary), bytes, '\0');
-  EXPECT_EQ(bytes, "\xC7\x99\xD0\xA1\x85\x25");
-  stream other(std::move(file));
-  other = std::move(*&other);
-  other.reset(other.get());
-  EXPECT_TRUE(!file && other);
+TEST_F(Streams, CountOrReportWhatTheyReplace) {
+  stream first = open("w+", "ibm-1141", on_bad::replace);
+  first.write(u"\u00DF\u0416\u200B");
+  stream counting = std::move(first);
+  counting.write_line(u"\u0416");
+  EXPECT_TRUE(!first && counting.replaced() == 3);
+  counting.close();
+  EXPECT_EQ(bytes(), "\xA1\x3F\x3F\x25");
+  std::error_code cause;
+  stream strict = open("w+", "ibm-37");
+  strict.write(u"\u0416", cause);
+  EXPECT_EQ(cause, errc::invalid_text);
+  strict.write(u"A"); // reported once
+  std::ofstream(path) << "x\n\xFF\n";
+  std::u16string line;
+  EXPECT_FALSE(open("r").read_line(line, cause));
+  EXPECT_EQ(cause, errc::invalid_text);
+  stream lossy = open("r", "UTF-8", on_bad::replace);
+  EXPECT_TRUE(lossy.read_line(line) && lossy.read_line(line) && line == u"\uFFFD");
 }
 
 } // namespace

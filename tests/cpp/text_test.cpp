@@ -1,4 +1,4 @@
-// Conversion, comparison and search: the C interface's answers, with lengths and nulls checked.
+// Text: the ranges that functions take, whole texts, fields, columns, chunks, order and search.
 
 #include "nls2.hpp"
 
@@ -9,72 +9,69 @@ namespace {
 using namespace std::string_literals;
 using namespace nls2;
 
-locale in(int page, std::string_view name = "de_DE") {
-  return make_locale(language_id::from_name(name), code_page(page));
+// An array of characters may be all text or end at a null, so only literals convert.
+template <class Source>
+constexpr bool converts = std::is_constructible_v<byte_view, Source>;
+static_assert(!converts<char (&)[3]> && !converts<char8_t (&)[3]> && converts<std::byte (&)[3]>);
+static_assert(!converts<std::vector<int>> && !std::is_constructible_v<byte_room, std::string &>);
+static_assert(!std::is_constructible_v<byte_room, const std::vector<char> &>);
+static_assert(byte_view("A\0B").size() == 3 && byte_view(u8"\u00E9").size() == 2);
+
+TEST(Bytes, AreAnyContiguousRange) {
+  const char *pointer = "ab";
+  unsigned char raw[4] = {};
+  const auto sizes = [](auto... views) { return (std::to_string(views.size()) + ...); };
+  EXPECT_EQ(sizes(byte_view("abc"), byte_view(pointer), byte_view("ab\0"s), byte_view(u8"12345"s),
+                  byte_view(raw), byte_view(std::vector<std::byte>(6)), byte_view()),
+            "3235460");
+  EXPECT_TRUE(byte_room(raw).size() == 4 && byte_room(std::span(raw).first(2)).data() == raw);
 }
 
-// The whole output fits a span of its size, and no smaller one.
-template <class Output, class Convert>
-void expectSpans(const Output &expected, Convert convert) {
-  Output out = expected;
-  std::error_code none;
-  EXPECT_EQ(convert(out, none), expected.size());
-  EXPECT_EQ(out, expected);
-  if (!out.empty()) {
-    out.pop_back();
-    convert(out, none);
-    EXPECT_EQ(none, errc::no_room);
-  }
+TEST(Translator, TranslatesFieldsInEveryForm) {
+  translator first(code_page(37), code_page("utf-8"), {.padding = padding::strip});
+  translator strip = first;
+  const translator taken = std::move(first);
+  EXPECT_TRUE(strip && taken && !first);
+  std::array<std::byte, 9> out{};
+  const field_result result = strip.translate("\xC1\x51\x40", out);
+  EXPECT_TRUE(result && result.written == 3 && result.replaced == 0 && !result.error());
+  EXPECT_EQ(std::memcmp(out.data(), "A\xC3\xA9", 4), 0);
+  std::string text = "before";
+  EXPECT_TRUE(strip.translate("\xC1\x40", text) && text == "beforeA");
+  EXPECT_EQ(strip.translate("\xC1\xC2"), "AB");
+  EXPECT_EQ(strip.translate(text, text).status, 37) << "the field would move";
+  EXPECT_TRUE(strip.translate("\xC1\x00\xC2", text).error() == errc::bad_field &&
+              text == "beforeA");
 }
 
-TEST(Text, ConvertsByteForByteInEveryForm) {
-  const code_page utf8(1208);
-  for (const int number : {37, 930, 1141, 1200, 1204, 1208, 57361, 57363, 57369}) {
-    const locale where = in(number);
-    const code_page page(number);
-    const std::string grows(100, 'x'); // to four bytes each in UTF-32
-    for (const std::string &text : {""s, "A"s, "Gr\u00FC\u00DFe \u65E5"s, "a\0b"s, grows}) {
-      SCOPED_TRACE(std::to_string(number) + " " + text);
-      std::string c(2000, '?');
-      int32_t status = 0;
-      const auto length = static_cast<int32_t>(text.size());
-      c.resize(static_cast<std::size_t>(
-          NLS2_fromUTF8(where.get(), c.data(), 2000, text.data(), length, &status)));
-      EXPECT_EQ(from_utf8(where, text), c);
-      EXPECT_EQ(translate(page, utf8, text), c);
-      const std::string back = to_utf8(where, c);
-      EXPECT_EQ(translate(utf8, page, c), back);
-      const std::u16string units = to_utf16(where, c);
-      EXPECT_EQ(to_utf16(in(1208), back), units);
-      EXPECT_EQ(from_utf16(where, units), c);
-      expectSpans(c, [&](auto &out, auto &e) { return from_utf8(where, text, out, e); });
-      expectSpans(back, [&](auto &out, auto &e) { return to_utf8(where, c, out, e); });
-      expectSpans(units, [&](auto &out, auto &e) { return to_utf16(where, c, out, e); });
-      expectSpans(c, [&](auto &out, auto &e) { return from_utf16(where, units, out, e); });
-      expectSpans(c, [&](auto &out, auto &e) { return translate(page, utf8, text, out, e); });
-    }
-  }
+TEST(Translator, ReportsProblemsWithPlaceBytesAndWords) {
+  translator to(code_page("utf-8"), code_page("ibm-37"));
+  std::array<char, 3> out{};
+  const field_result lacks = to.translate("AB\u0416", out);
+  const problem &found = lacks.problem;
+  EXPECT_TRUE(!lacks && found.kind() == problem_kind::not_in_page && found.offset() == 2);
+  EXPECT_TRUE(found.code_point() == 0x416 && found.bytes() == "\u0416");
+  EXPECT_EQ(to.translate("ABCD", out).problem.needed(), 4U);
+  EXPECT_EQ(to.translate("ABCD", out).error(), errc::no_room);
+  EXPECT_EQ(to.translate("\xFF", out).error(), std::errc::illegal_byte_sequence);
 }
 
-TEST(Text, IsComparedByTheRulesOfTheLanguage) {
-  using enum trailing_blanks;
-  const locale german = in(1208);
-  EXPECT_TRUE(compare(german, "\u00E4", "z") < 0 && compare(in(1208, "sv_SE"), "\u00E4", "z") > 0);
-  EXPECT_TRUE(compare(german, "a ", "a") > 0 && compare(german, "a \t", "a", ignore) == 0);
-  EXPECT_TRUE(compare(german, "a\0"s, "a") == 0 && compare(german, "a\0b"s, "ac") < 0);
-  const std::string most(32767, 'x');
-  EXPECT_TRUE(compare(german, most, most.substr(1)) > 0 && compare(german, "", most) < 0);
+TEST(Text, ConvertsStrictlyOrCounts) {
+  const code_page utf8("utf-8"), mixed(930), latin(819);
+  const std::string text = "a\0\u65E5"s;
+  const std::string bytes = translate(utf8, mixed, text);
+  EXPECT_EQ(bytes, "\x62\0\x0E\x45\x62\x0F"s);
+  EXPECT_EQ(translate(mixed, utf8, bytes), text);
+  EXPECT_EQ(to_utf16(mixed, bytes), u"a\0\u65E5"s);
+  std::size_t replaced = 9;
+  EXPECT_TRUE(translate(utf8, latin, "x\u65E5\u65E5", replaced) == "x\x1A\x1A" && replaced == 2);
+  EXPECT_TRUE(to_utf16(utf8, "x\xFF", replaced) == u"x\uFFFD" && replaced == 1);
+  EXPECT_TRUE(from_utf16(latin, u"x", replaced) == "x" && replaced == 0);
 }
 
-TEST(Text, IsFound) {
-  using enum letter_case;
-  const locale german = in(1208);
-  EXPECT_TRUE(contains(german, "Stra\u00DFe", "\u00DF") && contains(german, "", ""));
-  EXPECT_FALSE(contains(german, "Stra\u00DFe", "STRA"));
-  EXPECT_TRUE(contains(german, "Stra\u00DFe", "STRA", ignore));
+TEST(Text, MayBeginWithASignature) {
   const unicode_signature signature = detect_unicode_signature("\xEF\xBB\xBFx");
   EXPECT_TRUE(signature.encoding == "UTF-8" && signature.length == 3);
-  EXPECT_TRUE(detect_unicode_signature({}).encoding.empty());
 }
 
 } // namespace

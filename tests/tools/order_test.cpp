@@ -55,8 +55,7 @@ std::string joined(const Lines &lines, const std::string &end) {
 
 void expectLibraryOrder(const Order &order, bool ignoreTrailing) {
   SCOPED_TRACE(std::string(order.locale) + (ignoreTrailing ? " --ignore-trailing" : ""));
-  const nls2::locale locale =
-      nls2::make_locale(nls2::language_id::from_name(order.locale), nls2::code_page(order.page));
+  const nls2::locale locale(nls2::language_id(order.locale), order.page);
   const auto collate = [&](const std::string &a, const std::string &b) {
     int32_t status = 0;
     const uint32_t option = ignoreTrailing ? uint32_t{SORT_IGNORETRAILING} : 0;

@@ -19,9 +19,9 @@ namespace {
 constexpr int32_t fewBytes = 64;
 
 // Null if ICU does not know the name. (ICU would open its default converter for an empty name.)
-nls2::converter openNamed(const std::string &name, UErrorCode &status) {
+Converter openNamed(const std::string &name, UErrorCode &status) {
   status = U_ZERO_ERROR;
-  nls2::converter opened(name.empty() ? nullptr : ucnv_open(name.c_str(), &status));
+  Converter opened(name.empty() ? nullptr : ucnv_open(name.c_str(), &status));
   requireMemory(make_status(status));
   return opened;
 }
@@ -96,24 +96,30 @@ Error unknownPage(const char *option, const std::string &text) {
 } // namespace
 
 std::optional<std::string> converterOf(int32_t number) {
-  std::error_code error;
-  std::string name = name_of(nls2::code_page(number), error);
+  std::array<char, UCNV_MAX_CONVERTER_NAME_LENGTH> name{};
+  const std::error_code error =
+      make_status(NLS2_GetCodepageName(number, name.data(), static_cast<uint32_t>(name.size())));
   requireMemory(error);
-  return error ? std::nullopt : std::optional(std::move(name));
+  return error ? std::nullopt : std::optional<std::string>(name.data());
 }
 
 std::optional<std::string> converterOf(const std::string &name) {
   UErrorCode status = U_ZERO_ERROR;
-  const nls2::converter converter = openNamed(name, status);
+  const Converter converter = openNamed(name, status);
   const char *canonical = converter ? ucnv_getName(converter.get(), &status) : nullptr;
   return canonical != nullptr ? std::optional<std::string>(canonical) : std::nullopt;
 }
 
 std::optional<int32_t> ccsidOf(const std::string &name) {
-  std::error_code error;
-  const int32_t number = nls2::code_page::from_name(name, error).number();
-  requireMemory(error);
-  return error ? std::nullopt : std::optional(number);
+  UErrorCode error = U_ZERO_ERROR;
+  const Converter opened = openNamed(name, error);
+  const int32_t number = opened ? ucnv_getCCSID(opened.get(), &error) : 0;
+  if (!opened || U_FAILURE(error) || number != 0) {
+    return opened && U_SUCCESS(error) ? std::optional(number) : std::nullopt;
+  }
+  int32_t status = 0;
+  const auto windows = static_cast<int32_t>(NLS2_MapWindowsNameToCCSID(name.c_str(), &status));
+  return windows != 0 ? std::optional(windows) : std::nullopt;
 }
 
 std::optional<int32_t> windowsPage(const std::string &name) {
@@ -159,23 +165,24 @@ int32_t parsePage(const char *option, const std::string &text) {
   throw unknownPage(option, text);
 }
 
-converter openEncoding(const char *option, const std::string &text) {
+Converter openEncoding(const char *option, const std::string &text) {
   if (const auto number = wholeNumber<int32_t>(text)) {
     return CodePage(*number, option).take();
   }
   UErrorCode error = U_ZERO_ERROR;
-  if (nls2::converter opened = openNamed(text, error)) {
+  if (Converter opened = openNamed(text, error)) {
     return opened;
   }
   throw unknownPage(option, text);
 }
 
 CodePage::CodePage(int32_t number, const char *option) : number_(number) {
-  std::error_code error;
-  converter_ = open_converter(nls2::code_page(number), error);
+  int32_t twoNulls = 0;
+  int32_t status = 0;
+  converter_.reset(NLS2_MapCodepageIdToName(number, &twoNulls, &status));
   if (!converter_) {
     throw usageError("{}: code page {} does not open: {}{}; `nls2 codepages` lists the numbers",
-                     option, number, error.message(), nearPages(std::to_string(number)));
+                     option, number, statusText(status), nearPages(std::to_string(number)));
   }
 }
 

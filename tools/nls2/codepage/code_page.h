@@ -6,14 +6,21 @@
 
 #include <array>
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <set>
 #include <string>
+#include <unicode/ucnv.h>
 #include <utility>
 
 namespace nls2::tool {
 
 constexpr int32_t utf8Page = 1208;
+
+struct CloseConverter {
+  void operator()(UConverter *owned) const { ucnv_close(owned); }
+};
+using Converter = std::unique_ptr<UConverter, CloseConverter>;
 
 // The numbers that nls2.h lists. What they open is found by asking the library.
 inline constexpr std::array<int32_t, 25> pagesWithNames{
@@ -25,7 +32,7 @@ inline constexpr std::array<int32_t, 25> pagesWithNames{
 std::optional<std::string> converterOf(int32_t number);
 std::optional<std::string> converterOf(const std::string &name);
 
-// The number that code_page::from_name() finds for a name.
+// ICU's CCSID for a name, or else the number of the Windows name in it.
 std::optional<int32_t> ccsidOf(const std::string &name);
 
 // The number of a Windows name of the library, spelled exactly so.
@@ -50,7 +57,7 @@ Option pageValue(const char *name, const char *help, Page &page) {
 
 // Opens a page that an option gives by number or by any name that ICU opens, even an ambiguous name
 // or one without a number. Throws usageError.
-converter openEncoding(const char *option, const std::string &text);
+Converter openEncoding(const char *option, const std::string &text);
 
 // The bytes of a character inside a text.
 struct EncodedCharacter {
@@ -66,14 +73,14 @@ public:
 
   int32_t number() const { return number_; }
   UConverter *converter() const { return converter_.get(); }
-  nls2::converter take() { return std::move(converter_); }
+  Converter take() { return std::move(converter_); }
 
   // Nothing if the page lacks the character.
   std::optional<EncodedCharacter> encoded(char16_t character) const;
 
 private:
   int32_t number_;
-  nls2::converter converter_;
+  Converter converter_;
 };
 
 } // namespace nls2::tool

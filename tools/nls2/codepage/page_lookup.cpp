@@ -31,7 +31,7 @@ struct PageFacts {
 PageFacts factsOf(int32_t number) {
   PageFacts facts;
   facts.number = number;
-  const nls2::converter opened(NLS2_MapCodepageIdToName(number, &facts.twoNulls, &facts.status));
+  const Converter opened(NLS2_MapCodepageIdToName(number, &facts.twoNulls, &facts.status));
   requireMemory(make_status(facts.status));
   if (opened) {
     facts.opens = true;

@@ -123,7 +123,7 @@ private:
   }
 
   const std::string encoding_;
-  const converter source_, utf8_;
+  const Converter source_, utf8_;
   uint64_t replaced_ = 0; // byte sequences and lone surrogates of the file
   std::array<char, std::size_t{64} * 1024> bytes_;
   std::array<char, std::size_t{64} * 1024> utf8Bytes_;

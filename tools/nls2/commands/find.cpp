@@ -4,7 +4,7 @@
 #include "base/options.h"
 #include "io/output_file.h"
 #include "locale/locale_option.h"
-#include "nls2/field_translator.hpp"
+#include "nls2/text.hpp"
 #include "text/decoder.h"
 #include "text/record_reader.h"
 
@@ -42,12 +42,12 @@ bool foldAscii(std::u16string_view text, char16_t *folded) {
 
 // Checks the pattern as a whole: a page may have a pair of characters but not each of them alone.
 void requireCharacters(const std::string &pattern, int32_t page) {
-  field_translator translator(utf8_page, code_page(page), {});
+  translator translator(code_page(utf8Page), code_page(page), {});
   std::string encoded;
   const field_result result = translator.translate(pattern, encoded);
-  if (result.problem == field_problem::not_in_page) {
+  if (result.problem.kind() == problem_kind::not_in_page) {
     throw usageError("PATTERN: the character U+{:04X} is not in code page {}",
-                     static_cast<uint32_t>(result.code_point), page);
+                     static_cast<uint32_t>(result.problem.code_point()), page);
   }
 }
 
@@ -65,7 +65,8 @@ public:
   // Throws usageError if the code page lacks a character of the pattern.
   explicit TextSearch(const Arguments &arguments)
       : decoder_(arguments.locale.codepage),
-        encoder_(utf8_page, code_page(arguments.locale.codepage), {.bad = on_bad::replace}),
+        encoder_(code_page(utf8Page), code_page(arguments.locale.codepage),
+                 {.bad = on_bad::replace}),
         ignoreCase_(arguments.ignoreCase), pattern_(decodedPattern(arguments.pattern)) {
     requireCharacters(arguments.pattern, arguments.locale.codepage);
     if (ignoreCase_) {
@@ -91,11 +92,7 @@ public:
   std::string lineFeed() const { return lineFeedOf(decoder_.page(), true); }
 
   // Converts UTF-8 to the code page of the lines.
-  std::string encode(const std::string &utf8) {
-    std::string bytes;
-    encoder_.translate(utf8, bytes);
-    return bytes;
-  }
+  std::string encode(const std::string &utf8) { return encoder_.translate(utf8); }
 
 private:
   std::u16string_view folded(std::u16string_view text) {
@@ -118,7 +115,7 @@ private:
   }
 
   Decoder decoder_;
-  field_translator encoder_;
+  translator encoder_;
   const bool ignoreCase_;
   uint32_t folding_ = 0; // U_FOLD_CASE_*
   std::u16string pattern_;

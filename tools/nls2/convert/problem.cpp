@@ -13,7 +13,7 @@ namespace nls2::tool {
 namespace {
 
 std::string codePointText(const Problem &problem) {
-  return fmt::format("U+{:04X}", static_cast<uint32_t>(problem.found.code_point));
+  return fmt::format("U+{:04X}", static_cast<uint32_t>(problem.found.code_point()));
 }
 
 // Of a text that does not fit, by what limits it.
@@ -31,7 +31,7 @@ const char *wasOrWere(uint64_t count) { return count == 1 ? "was" : "were"; }
 
 Json jsonOf(const Problem &problem) {
   constexpr std::array kinds{"none",           "invalid bytes", "not in the page", "too long",
-                             "null inside",    "no exact fill", "no memory",       "too long",
+                             "null inside",    "no exact fill", "too long",        "no memory",
                              "not reversible", "short record"};
   const bool hasCharacter =
       problem.kind == ProblemKind::notInPage || problem.kind == ProblemKind::nullInside;
@@ -39,8 +39,7 @@ Json jsonOf(const Problem &problem) {
       {{"record", problem.record},
        {"byte", problem.byte},
        {"column", problem.column + 1},
-       {"hex",
-        problem.found.byte_count == 0 ? Json() : Json(hexOf(problem.found.source_bytes(), " "))},
+       {"hex", problem.found.bytes().empty() ? Json() : Json(hexOf(problem.found.bytes(), " "))},
        {"kind", kinds[static_cast<std::size_t>(problem.kind)]},
        {"code_point", hasCharacter ? Json(codePointText(problem)) : Json()}});
 }
@@ -71,28 +70,28 @@ std::string placeOf(const Problem &problem, std::string_view unit) {
 
 Explanation explain(const Problem &problem) {
   constexpr std::array limits{"--out-length is", "the width is", "the field has"};
-  const nls2::field_result &found = problem.found;
-  const std::string bytes = bytesText(found.source_bytes());
+  const nls2::problem &found = problem.found;
+  const std::string bytes = bytesText(found.bytes());
   const std::string in = fmt::format("code page {}", problem.page);
   switch (problem.kind) {
   case ProblemKind::invalidBytes:
-    return {notValidText(found.source_bytes(), problem.page),
+    return {notValidText(found.bytes(), problem.page),
             "; is this the right page? --on-error replace writes a substitution character instead"};
   case ProblemKind::notInPage:
     return {fmt::format("the character {}{} is not in {}", codePointText(problem),
-                        found.byte_count > 0 ? " (" + bytes + ")" : "", in),
+                        !found.bytes().empty() ? " (" + bytes + ")" : "", in),
             "; --on-error replace writes a substitution character instead"};
   case ProblemKind::tooLong:
-    return {fmt::format("the text needs {} bytes, but {} {}{}", found.needed,
+    return {fmt::format("the text needs {} bytes, but {} {}{}", found.needed(),
                         limits[static_cast<std::size_t>(problem.limitedBy)], problem.limit,
-                        found.byte_count > 0 ? "; no room for the " + bytes : ""),
+                        !found.bytes().empty() ? "; no room for the " + bytes : ""),
             widthAdvice(problem.limitedBy, "; use a larger --out-length")};
   case ProblemKind::nullInside:
     return {fmt::format("a null (U+0000, {}) is inside the text and would end it", bytes),
             "; replace it, or do not use --strip, --fill, --keep-blanks, --csv or widths"};
   case ProblemKind::noExactFill:
     return {fmt::format("filled with blanks the text can be {} bytes long, but not {}",
-                        found.needed, problem.limit),
+                        found.needed(), problem.limit),
             widthAdvice(problem.limitedBy, "; use another --out-length")};
   case ProblemKind::notReversible:
     if (problem.cameBack >= 0) {
@@ -100,13 +99,13 @@ Explanation explain(const Problem &problem) {
                           problem.cameBack),
               ""};
     }
-    return {"not reversible: " + (found.needed == 0
+    return {"not reversible: " + (found.needed() == 0
                                       ? "it does not come back from " + in
                                       : fmt::format("its {} bytes come back from {} as {}",
-                                                    problem.limit, in, found.needed)),
+                                                    problem.limit, in, found.needed())),
             ""};
   case ProblemKind::shortRecord:
-    return {fmt::format("the input ends after {} of {} bytes", found.needed, problem.limit),
+    return {fmt::format("the input ends after {} of {} bytes", found.needed(), problem.limit),
             fmt::format("; is --record-length {} right?", problem.limit)};
   case ProblemKind::beyondLimit:
     return {"the field is longer than 1 GiB", ""};

@@ -8,7 +8,7 @@
 
 namespace nls2::tool {
 
-// Those of nls2::field_problem come first, with its numbers.
+// Those of nls2::problem_kind come first, with its numbers.
 enum class ProblemKind {
   none,
   invalidBytes,
@@ -16,8 +16,8 @@ enum class ProblemKind {
   tooLong,
   nullInside,
   noExactFill,
-  noMemory,
   beyondLimit,
+  noMemory,
   notReversible,
   shortRecord
 };
@@ -27,13 +27,13 @@ enum class Limit { outLength, fieldWidth, ownLength };
 
 struct Problem {
   ProblemKind kind = ProblemKind::invalidBytes;
-  uint64_t record = 0;      // its number, from 1
-  uint64_t byte = 0;        // the record's offset in the input
-  std::size_t column = 0;   // the offset in the record
-  std::size_t field = 0;    // of --fields, from 1; 0 without it
-  int32_t page = 0;         // the one whose rules the text breaks
-  nls2::field_result found; // the bytes and the character at fault, and the bytes needed
-  std::size_t limit = 0;    // bytes that it may take, or should have
+  uint64_t record = 0;    // its number, from 1
+  uint64_t byte = 0;      // the record's offset in the input
+  std::size_t column = 0; // the offset in the record
+  std::size_t field = 0;  // of --fields, from 1; 0 without it
+  int32_t page = 0;       // the one whose rules the text breaks
+  nls2::problem found;    // the bytes and the character at fault, and the bytes needed
+  std::size_t limit = 0;  // bytes that it may take, or should have
   Limit limitedBy = Limit::outLength;
   int cameBack = -1; // notReversible: the byte in place of the one found; -1: not that many came
 };

@@ -15,9 +15,9 @@ namespace nls2::tool {
 
 namespace {
 
-nls2::field_translator makeTranslator(int32_t from, int32_t to, const nls2::field_policy &policy) {
+nls2::translator makeTranslator(int32_t from, int32_t to, const nls2::field_policy &policy) {
   std::error_code error;
-  nls2::field_translator made(nls2::code_page(from), nls2::code_page(to), policy, error);
+  nls2::translator made(nls2::code_page(from), nls2::code_page(to), policy, error);
   if (error) { // the pages have been opened before
     throw std::bad_alloc();
   }
@@ -69,11 +69,11 @@ bool padsWithBlanks(const TranslateOptions &options) {
 } // namespace
 
 OutputField::OutputField(const FieldSpec &spec, std::size_t number, const TranslateOptions &options)
-    : spec_(spec), number_(number), verifies_(options.verify && spec.kind == FieldSpec::Kind::text),
-      csv_(options.csv) {
-  nls2::field_policy policy;
-  policy.bad = options.onError == OnError::replace ? nls2::on_bad::replace : nls2::on_bad::stop;
-  policy.drop_ignorable = false; // nothing is lost without a mark
+    : spec_(spec), number_(number), to_(options.to),
+      verifies_(options.verify && spec.kind == FieldSpec::Kind::text), csv_(options.csv) {
+  nls2::field_policy &policy = policy_;
+  policy.bad =
+      options.onError == OnError::replace ? nls2::on_bad::replace_visibly : nls2::on_bad::stop;
   if (spec.width != 0) {
     policy.padding = nls2::padding::fill;
     policy.width = spec.width;
@@ -125,22 +125,24 @@ Problem OutputField::newProblem(ProblemKind kind) const {
   problem.kind = kind;
   problem.column = spec_.begin;
   problem.field = number_;
-  problem.page = forward_->to().number();
+  problem.page = to_;
   problem.limitedBy = limitedBy_;
-  problem.limit = forward_->policy().width;
+  problem.limit = policy_.width;
   return problem;
 }
 
 Problem OutputField::describe(const nls2::field_result &failed) const {
-  Problem problem = newProblem(static_cast<ProblemKind>(failed.problem));
-  problem.found = failed;
+  const nls2::problem_kind kind = failed.problem.kind();
+  Problem problem = newProblem(kind == nls2::problem_kind::none ? ProblemKind::noMemory
+                                                                : static_cast<ProblemKind>(kind));
+  problem.found = failed.problem;
   if (problem.kind == ProblemKind::invalidBytes) {
     problem.page = spec_.from;
   }
   if (spec_.kind == FieldSpec::Kind::text) {
-    problem.column += failed.offset;
+    problem.column += failed.problem.offset();
   } else { // the digits of a hex field are not in the record
-    problem.found.byte_count = 0;
+    problem.found.get()->byteCount = 0;
   }
   return problem;
 }
@@ -151,12 +153,13 @@ std::optional<Problem> OutputField::verify(std::string_view field, std::string_v
     return {};
   }
   nls2::field_policy policy;
-  if (forward_->policy().padding != nls2::padding::as_is) {
+  if (policy_.padding != nls2::padding::as_is) {
     policy.padding = nls2::padding::fill;
     policy.width = field.size();
   }
-  if (!back_ || back_->policy().width != policy.width) {
-    back_ = makeTranslator(forward_->to().number(), spec_.from, policy);
+  if (!back_ || backWidth_ != policy.width) {
+    back_ = makeTranslator(to_, spec_.from, policy);
+    backWidth_ = policy.width;
   }
   cameBack_.clear();
   const bool comesBack = static_cast<bool>(back_->translate(translated, cameBack_));
@@ -164,14 +167,14 @@ std::optional<Problem> OutputField::verify(std::string_view field, std::string_v
     return {};
   }
   Problem problem = newProblem(ProblemKind::notReversible);
-  problem.found.needed = cameBack_.size();
+  problem.found.get()->needed = static_cast<int64_t>(cameBack_.size());
   problem.limit = field.size();
   const auto [wrong, back] =
       std::mismatch(field.begin(), field.end(), cameBack_.cbegin(), cameBack_.cend());
   if (comesBack && wrong != field.end() && back != cameBack_.cend()) {
     problem.column += static_cast<std::size_t>(wrong - field.begin());
-    problem.found.bytes[0] = *wrong;
-    problem.found.byte_count = 1;
+    problem.found.get()->bytes[0] = static_cast<uint8_t>(*wrong);
+    problem.found.get()->byteCount = 1;
     problem.cameBack = static_cast<unsigned char>(*back);
   }
   return problem;
@@ -200,7 +203,7 @@ std::optional<Problem> RecordTranslator::translate(std::string_view record, Byte
   if (record.size() < options_->recordLength) {
     Problem problem;
     problem.kind = ProblemKind::shortRecord;
-    problem.found.needed = record.size();
+    problem.found.get()->needed = static_cast<int64_t>(record.size());
     problem.limit = options_->recordLength;
     return problem;
   }

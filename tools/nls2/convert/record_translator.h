@@ -3,7 +3,7 @@
 
 #include "convert/problem.h"
 #include "io/byte_buffer.h"
-#include "nls2/field_translator.hpp"
+#include "nls2/translator.hpp"
 
 #include <optional>
 #include <string>
@@ -30,11 +30,14 @@ private:
 
   FieldSpec spec_;
   std::size_t number_;
+  int32_t to_;
+  nls2::field_policy policy_;
+  std::size_t backWidth_ = 0; // of back_'s policy
   bool verifies_;
   bool csv_;
   Limit limitedBy_ = Limit::outLength;
-  std::optional<nls2::field_translator> forward_; // none for raw bytes
-  std::optional<nls2::field_translator> back_;
+  std::optional<nls2::translator> forward_; // none for raw bytes
+  std::optional<nls2::translator> back_;
   std::string digits_;
   std::string cameBack_;
 };

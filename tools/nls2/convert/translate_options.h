@@ -1,7 +1,7 @@
 // The options of `nls2 translate`.
 #pragma once
 
-#include "nls2/field_types.hpp"
+#include "nls2/translator.hpp"
 
 #include <cstdint>
 #include <limits>

@@ -25,7 +25,7 @@ const LocaleMapEntry *recordNamed(const std::string &name) {
     }
   }
   std::error_code error;
-  const language_id id = language_id::from_name(name, error);
+  const language_id id(name, error);
   return error ? nullptr : find_record(id);
 }
 
