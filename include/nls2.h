@@ -1,7 +1,7 @@
 /* nls2.h - the interface of libzelnls2: text in many languages and code pages.
  *
  * Translates fields between numbered code pages, and compares, searches and reads text by the rules
- * of a language, over ICU. examples/translate_field.c shows the shortest use; C++ programs have
+ * of a language, with ICU. examples/translate_field.c is the shortest use; for C++ there is
  * nls2.hpp as well.
  *
  * Conventions. They hold for every function unless its comment says otherwise.
@@ -17,21 +17,24 @@
  *  5. A status is a signed 32-bit word: 0 is success, a positive value a failure, a negative value
  *     an ICU warning and therefore a success. Values 32 and 36 to 39 are this library's
  *     (NLS2_ERR_*), all others are ICU's UErrorCode, passed on unchanged. nls2_status_name() names
- *     both.
+ *     them all.
  *  6. A status comes back in one of two ways: stored through a last argument pStatus, with a result
- *     of 0 or null on failure; or as the result itself. NLS2_Findstr alone has no status: its
- *     result is the answer, or -1.
+ *     of 0 or null on failure; or as the result itself. Some functions have no status; their
+ *     comments describe what the result then means.
  *  7. Outputs on failure are as they were, except where "partial output" is noted.
  *  8. No pointer argument is tested for null. Passing null is undefined behaviour unless noted.
  *  9. Buffers without a length argument, or with one that is not used or only traced, are written
  *     without a bound: the comment says how much room is needed.
- * 10. Handles that a function returns belong to the caller, who closes them as its comment says.
+ * 10. Handles that a function returns belong to the caller, who closes them as the function's
+ *     comment describes.
  * 11. Threads. Every function may be called from any thread at any time, but not from a signal
  *     handler: a release there can wait for ever for a validation that it interrupted. One object
  *     or handle must not be used by two threads while one of them changes or closes it.
- * 12. The library reads no environment and no configuration, and has no state but its list of live
- *     locale objects. Every call but NLS2_BuildStamp is traced through the host's facility
- *     (trc1.h); tracing changes no result unless noted.
+ * 12. Make a locale object once and keep it. Making one opens a converter, and after each release
+ *     every thread has to search the list of objects again.
+ * 13. The library reads no environment variables and no configuration. Its only state is the list
+ *     of live locale objects, and what each thread remembers of it. Every call but NLS2_BuildStamp
+ *     is traced through the host's facility (trc1.h); tracing changes no result unless noted.
  */
 #ifndef NLS2_H
 #define NLS2_H
@@ -69,8 +72,8 @@ enum {
   NLS2_ERR_LANGUAGE_NOT_FOUND = 39 /* a language id that localeMap does not hold */
 };
 
-/* The name of a status: "NLS2_ERR_NO_MEMORY", or what ICU calls it (u_errorName): "U_ZERO_ERROR" for
- * 0, "[BOGUS UErrorCode]" for a number that ICU does not know. */
+/* The name of a status: "NLS2_ERR_NO_MEMORY", or what ICU calls it (u_errorName): "U_ZERO_ERROR"
+ * for 0, "[BOGUS UErrorCode]" for a number that ICU does not know. */
 static inline const char *nls2_status_name(int32_t status) {
   switch (status) {
   case NLS2_ERR_NO_MEMORY:
@@ -121,10 +124,11 @@ NLS2_API const LocaleMapEntry *NLS2_GetLocaleMapEntry(uint32_t languageId);
 
 /* A locale object: a language and a code page. An object is valid ("live") from its creation until
  * NLS2_ReleaseLocale; all live objects are on a list. Every function that takes an object refuses a
- * pointer that is not on the list, without looking at what it points to.
+ * pointer that is not on the list, without reading what it points to.
  *
  * Warning: the heap may give a released object's address to a new object. An old pointer is then
- * live again, and releasing it twice takes the new object from its owner. */
+ * live again, and releasing it twice takes the new object from its owner. Set a pointer to null
+ * when you release its object. */
 typedef struct NLS2_Locale {
   uint32_t languageId;       /* of a record of localeMap */
   uint32_t codepage;         /* as given, not checked against anything */
@@ -132,8 +136,9 @@ typedef struct NLS2_Locale {
   struct NLS2_Locale *pNext; /* the library's */
 } NLS2_Locale;
 
-/* The live objects in order of creation, linked by pNext; null if there is none. For debuggers:
- * the list changes under LocaleObjectList_Lock, 28 bytes that belong to the host's lock service. */
+/* The live objects in order of creation, linked by pNext; null if there is none. For debuggers: the
+ * list changes under LocaleObjectList_Lock, 28 bytes that belong to the host's lock service. A
+ * program may set the head aside and put it back, but must not change the other links. */
 extern NLS2_API NLS2_Locale *pLocaleObjectList;
 extern NLS2_API uint32_t LocaleObjectList_Lock[7];
 
@@ -151,27 +156,33 @@ NLS2_API NLS2_Locale *NLS2_allocateLocale(int32_t *pStatus);
  * first record of localeMap whose name occurs anywhere in the default's base name
  * (uloc_getBaseName). If there is no default code page, it is US EBCDIC (37).
  *
- * Status, as the result; on failure the object is partly filled:
+ * Status, as the result:
  *   0   done
- *   37  NLS2_ERR_INVALID_PARAMETER: no record matches, or ICU gives no base name (more than 132
- *       characters)
- *   or that of NLS2_GetCodepageId for the default code page's name
+ *   37  NLS2_ERR_INVALID_PARAMETER: no record matches, or the base name has more than 132
+ *       characters; the object is as it was
+ *   or that of NLS2_GetCodepageId for the default code page's name, which can also be 37; the
+ *   object then has its language, and 0 for its code page
  *
  * Surprises: a default locale that the table does not hold, such as "en" or "nb_NO", makes every
- * creation of an object fail with NLS2_ERR_INVALID_PARAMETER. Short names match inside longer ones:
- * the default locale "ses_ML" (Koyraboro Senni) is found as "es". */
+ * creation of an object fail with NLS2_ERR_INVALID_PARAMETER. Set one that it holds, with ICU's
+ * uloc_setDefault(). Short names match inside longer ones: the default locale "ses_ML" (Koyraboro
+ * Senni) is found as "es". Pass NLS2_GetLocale the language id that you want. */
 NLS2_API int32_t NLS2_initLocaleObject(NLS2_Locale *pLocale);
 
 /* Whether an object is live. Status, as the result: 0 if it is, NLS2_ERR_INVALID_LOCALE otherwise,
- * also for null. Any pointer will do; it is compared, not followed. Takes no lock. */
+ * also for null. Any pointer will do; it is compared, not followed. Takes no lock. A thread that
+ * has just validated an object a few times does it in a few nanoseconds, until the next release. */
 NLS2_API int32_t NLS2_ValidateLocale(const NLS2_Locale *pLocale);
 
 /* Releases an object. Status, as the result: 0, or NLS2_ERR_INVALID_PARAMETER (not INVALID_LOCALE
  * as elsewhere) if it is not live. If two threads release one object at once, one gets 0 and the
- * other 0 or the failure. Waits for validations in progress on other threads. */
+ * other 0 or the failure.
+ *
+ * Waits for validations in progress on other threads, until those threads are scheduled again;
+ * meanwhile, threads that make or release other objects wait as well. */
 NLS2_API int32_t NLS2_ReleaseLocale(NLS2_Locale *pNLS2_Locale);
 
-/* Starts ICU (u_init). Nothing here depends on it. Status, as the result: ICU's. */
+/* Starts ICU (u_init). The other functions do not need it. Status, as the result: ICU's. */
 NLS2_API int32_t NLS2_Init(void);
 
 /* Options. */
@@ -185,8 +196,8 @@ enum {
  *
  *   languageId  of a record of localeMap, or 0
  *   codepage    stored as it is, unchecked; 0: the process's default
- *   options     0, or NLS2_LOCALE_DEFAULT (bit 0x2 does the same): the object keeps the defaults,
- *               but the table search must still succeed. Ignored if both numbers are 0
+ *   options     0, or NLS2_LOCALE_DEFAULT (bit 0x2 has the same effect): the object keeps the
+ *               defaults, but the table search must still succeed. Ignored if both numbers are 0
  *
  * The first record with this id, or with this code page in both its columns, is used.
  *
@@ -195,9 +206,10 @@ enum {
  *   37  NLS2_ERR_INVALID_PARAMETER: there is no such record
  *   or that of NLS2_allocateLocale
  *
- * Surprises: hr_HR is the one record with a code page in both columns, so code page 912 makes an
- * hr_HR object for every language whose record comes after hr_HR's, such as pl_PL. Since every
- * object starts from the defaults, whatever makes NLS2_initLocaleObject fail makes this fail. */
+ * Surprises: hr_HR is the only record with one code page in both columns, so code page 912 makes an
+ * hr_HR object for every language whose record comes after hr_HR's, such as pl_PL, and for ids that
+ * no record has. Pass code page 0, and then set 912 with NLS2_SetLocaleNumInfo. Since every object
+ * starts from the defaults, whatever makes NLS2_initLocaleObject fail makes this fail. */
 NLS2_API NLS2_Locale *NLS2_GetLocale(uint32_t languageId, uint32_t codepage, uint32_t options,
                                      int32_t *pStatus);
 
@@ -218,8 +230,8 @@ NLS2_API uint32_t NLS2_GetLocaleNumInfo(const NLS2_Locale *pLocale, uint32_t typ
                                         int32_t *pStatus);
 
 /* Changes a number of an object. A new language id sets its record's locale name as well and leaves
- * the code page; a new code page is not checked. A value of 255 changes nothing and is a success.
- * `options` is only traced.
+ * the code page; a new code page is not checked. For either attribute a value of 255 changes
+ * nothing and is a success. `options` is only traced.
  *
  * Status, as the result: 0, or NLS2_ERR_INVALID_LOCALE: the object is not live, localeMap does not
  * hold the language id, or the attribute is not a selector (for which NLS2_GetLocaleNumInfo gives
@@ -236,18 +248,19 @@ NLS2_API uint32_t NLS2_GetLocaleCodepageId(const NLS2_Locale *pLocale, int32_t *
  * Status, as the result:
  *   0   the name is known
  *   38  NLS2_ERR_INVALID_LOCALE: no record's name occurs; with NLS2_THREAD_LOCALE also: no object
- *       can be made
- *   or, with NLS2_THREAD_LOCALE, that of NLS2_GetCodepageId for the process's default code page
+ *       can be made, because the process's default locale or code page is not known
+ *   or, with NLS2_THREAD_LOCALE, that of NLS2_GetCodepageId, if the default code page changes
+ *   during the call
  *
  * Surprise: NLS2_THREAD_LOCALE applies the record and the default code page to a new object that
- * the caller never receives. It is leaked: it stays on the list. */
+ * the caller never receives. It is leaked: it stays on the list. Use NLS2_GetLocale instead. */
 NLS2_API int32_t NLS2_SetLocaleFromNative(const char *pPosixID, uint32_t options);
 
 /* NLS2_allocateLocale under another name. `pNativeLocale` is not read; `options` must have
  * NLS2_LOCALE_DEFAULT. Null on failure. Status: 0, or NLS2_ERR_INVALID_PARAMETER without that
  * option.
  *
- * Surprise: if the object cannot be made, the result is null and the status 0. */
+ * Surprise: if the object cannot be made, the result is null and the status 0. Check the result. */
 NLS2_API NLS2_Locale *NLS2_ConvertNativeLocale(const void *pNativeLocale, uint32_t options,
                                                int32_t *pStatus);
 
@@ -311,8 +324,9 @@ extern NLS2_API const CcsidMapEntry ccsidMap[NLS2_CCSID_MAP_RECORDS];
  *         with ICU's standard data, and 57364)
  *   or ICU's other failures
  *
- * Surprises: ICU reads -37 as 37. 57372 opens ICU's UTF-16 with a signature, and it, 57360, 57361
- * and 57369 leave the flag at 0 although their strings end in more than one zero byte. */
+ * Surprises: ICU reads -37 as 37. 57372 opens ICU's UTF-16 with a signature. 57360, 57361, 57369
+ * and 57372 leave the flag at 0 although their strings end in two or four zero bytes: store those
+ * yourself. */
 NLS2_API struct UConverter *NLS2_MapCodepageIdToName(int32_t codepage, int32_t *twoNullTerminator,
                                                      int32_t *status);
 
@@ -320,7 +334,8 @@ NLS2_API struct UConverter *NLS2_MapCodepageIdToName(int32_t codepage, int32_t *
  * occurs anywhere in `name`, byte for byte; 0 if there is none. Status: 0, or
  * NLS2_ERR_INVALID_PARAMETER if there is none.
  *
- * Surprises: "windows-9501" is found as windows-950; "big5" and "Windows-936" are not found. */
+ * Surprises: "windows-9501" is found as windows-950; "big5" and "Windows-936" are not found. For
+ * other names use NLS2_GetCodepageId. */
 NLS2_API uint32_t NLS2_MapWindowsNameToCCSID(const char *name, int32_t *status);
 
 /* ICU's canonical name of a code page's converter: "UTF-8" for 1208. bufferLength is not used:
@@ -331,8 +346,8 @@ NLS2_API uint32_t NLS2_MapWindowsNameToCCSID(const char *name, int32_t *status);
  *   2  U_MISSING_RESOURCE_ERROR: ICU has no name for the converter
  *   or ICU's failure to give one, or that of NLS2_MapCodepageIdToName
  *
- * Surprise: with detail tracing on, the converter's CCSID is queried too, and if that fails, its
- * failure is the result. */
+ * Surprise: with detail tracing on, ICU is also asked for the converter's CCSID, and if that fails,
+ * its status is the result. */
 NLS2_API int32_t NLS2_GetCodepageName(int32_t codepageId, char *nameBuffer, uint32_t bufferLength);
 
 /* The CCSID of a converter name, by ICU's rules for names (aliases, any case, null for the
@@ -375,15 +390,19 @@ enum {
  * are cut off, and so is everything from the first remaining null on; the rest, the text, must fit
  * in destLen less the terminator's 1 or 2 bytes. Then, by the option:
  *   STRIP_TRAILING  The text alone. The result is its length in UTF-16 units, not bytes, plus 1 or
- *                   2 with TERMINATE, which however stores no null itself (ICU stores one zero byte
- *                   after the text if there is room).
+ *                   2 with TERMINATE, which however stores no null itself: ICU stores one zero byte
+ *                   after the text if destLen has room for it besides the reserved 1 or 2. For the
+ *                   length in bytes, leave that room and look for the zero byte; in UTF-16 it is
+ *                   twice the units.
  *   TRAILING        The text and as many U+0020 as the source had trailing blanks, as fit.
  *   FILL            The text and U+0020 up to destLen; wins over TRAILING.
  * TRAILING and FILL return destLen, whatever was written, and store the terminator at its end;
  * bytes between a shorter output and that end are as they were.
  *
- * Surprise: TRAILING and FILL compare destLen with counts of UTF-16 units, which is right only for
- * pages whose blank is one byte. Into other pages they lose letters with status 0. In UTF-16
+ * Surprise: TRAILING and FILL compare destLen with counts of UTF-16 units, which is right only if
+ * each unit of the field becomes one byte. They lose letters with status 0 in pages whose blank
+ * takes more than a byte, and if a character beyond U+FFFF, which is two units, becomes one byte:
+ * "zz" at the end of "\U0001F600\U0001F600zz" from 1208 to 819 with FILL and destLen 4. In UTF-16
  * without a signature (1200, 1202, 13488, 57358, 57359 and other such CCSIDs) the first byte of the
  * field, or of a later unit, becomes zero as soon as blanks have to be dropped to fit; FILL always
  * drops some. Into 57359 from 819:
@@ -391,8 +410,8 @@ enum {
  *   "ABCD" and 4 blanks, TRAILING, destLen 8   00 00 42 00 43 00 44 00
  *   "AB" and 3 blanks, TRAILING, destLen 6     41 00 00 00 20 00
  * Into UTF-32 and pages with a signature (57360, 57361, 57368, 57369, 57372, and CCSIDs such as
- * 1204 and 1232) FILL fails with status 1 for any text. Strip into such pages, and append the
- * blanks yourself.
+ * 1204 and 1232) FILL fails with status 1 for any text. Use STRIP_TRAILING for all of these, and
+ * append the blanks yourself.
  *
  * Result: the count described above; 0 on failure and for an empty source.
  *
@@ -408,7 +427,8 @@ enum {
  *       with a source, or a code page 0
  *   or ICU's failure to open a converter (4: unknown page) or to convert; partial output
  * Bytes that do not convert are not a failure: ICU's default callbacks replace them with the target
- * page's substitution character. */
+ * page's substitution character, without a report. To find them, use nls2::field_translator of
+ * nls2.hpp, or open the converters with NLS2_MapCodepageIdToName and set ICU's callbacks. */
 NLS2_API int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t destLen,
                                       int32_t sourceCodePage, const char *source, int32_t sourceLen,
                                       int32_t *pSourceConsumed, uint32_t options, int32_t *pStatus);
@@ -416,7 +436,7 @@ NLS2_API int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t 
 /* Common to the six functions below. pLocale is a live object, whose code page is the other end of
  * the conversion. A length of -1 means null-terminated input. The result is the output's length,
  * without the terminator that ICU adds if there is room; 0 on failure. Bytes or characters that do
- * not convert are replaced by ICU's substitutes and are not a failure.
+ * not convert are replaced by ICU's substitutes and are not a failure (see NLS2_TranslateString).
  *
  * Status:
  *   0   done
@@ -457,23 +477,29 @@ NLS2_API int32_t NLS2_fromUTF16(const NLS2_Locale *pLocale, const UChar *pSource
  *
  * Surprises: the output is written from src on, over the input. Only dest + dlen is used, as the
  * output's limit; it must lie in src's buffer, at or after src. The layout to use is dest == src
- * and dlen the buffer's size. Text that grows is sound up to 1,024 UTF-16 units; beyond that the
- * output can overtake the input, and the result is garbled at status 0. The return value is not a
- * length but the output's end minus the input's end: -2 if two bytes fewer were written. Status 1
- * (U_ILLEGAL_ARGUMENT_ERROR) also if dest + dlen lies before src. Use NLS2_toUTF8. */
+ * and dlen the buffer's size. The return value is not a length but the output's end minus the
+ * input's end: -2 if two bytes fewer were written. Status 1 (U_ILLEGAL_ARGUMENT_ERROR) also if dest
+ * + dlen lies before src.
+ *
+ * The output can overtake input that ICU has not read yet. It is then garbled at status 0, or the
+ * status is 15 although there is room. That happens to texts of more than 1,000 UTF-16 units, to
+ * invalid text under 1208 (34 bytes are enough), and with some pages, such as 5478, to short texts.
+ * Use NLS2_toUTF8, which takes two buffers. */
 NLS2_API int32_t NLS2_StringToUnicode(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
                                       const char *src, int32_t slen, int32_t *status);
 
-/* UTF-8 to code page, in place. Like NLS2_StringToUnicode, but the other way. Use NLS2_fromUTF8. */
+/* UTF-8 to code page, in place. Like NLS2_StringToUnicode, but the other way, with all its
+ * surprises. Use NLS2_fromUTF8. */
 NLS2_API int32_t NLS2_UnicodeToString(const NLS2_Locale *pLocale, char *dest, int32_t dlen,
                                       const char *src, int32_t slen, int32_t *status);
 
 /* ---- Lengths --------------------------------------------------------------------------------- */
 
 /* How many bytes of the destination's code page to reserve for a byte of the source's, from ICU's
- * largest character sizes D and S (ucnv_getMaxCharSize): 1 if both pages are the same, D if S
- * divides D, else the least multiple of S above D. Usually too large, but signatures and shifts
- * back to the initial state come on top: U+00D7 from 819 to 930 is 4 bytes, the ratio 3.
+ * largest character sizes D and S (ucnv_getMaxCharSize): 1 if both objects have the same number, D
+ * if S divides D, else the least multiple of S above D. Usually too large, but it counts neither
+ * signatures nor shifts back to the initial state: reserve 8 bytes more for those. U+00D7 from 819
+ * to 930 takes 4 bytes, and the ratio is 3.
  *
  * Status:
  *   0   done
@@ -483,8 +509,9 @@ NLS2_API int32_t NLS2_ConversionRatio(const NLS2_Locale *pDestinationLocale,
                                       const NLS2_Locale *pSourceLocale, int32_t *pStatus);
 
 /* The UTF-16 units of a null-terminated string in the object's code page, up to its first null
- * character; 0 on failure. `ignored` is not read. The code page goes to ICU as a CCSID, so the
- * private numbers fail.
+ * character; 0 on failure. `ignored` is not read. The code page goes to ICU as a CCSID, as with
+ * NLS2_StringToUnicode: the private numbers and 936 fail, and 874, 932, 949 and 950 are other
+ * tables.
  *
  * Status, stored on failure only, so preset it to 0:
  *   32  NLS2_ERR_NO_MEMORY
@@ -507,7 +534,7 @@ NLS2_API double NLS2_StringToDouble(const void *ignored1, const void *ignored2);
 /* Options of NLS2_Strcoll; they combine. */
 enum {
   CHARBASED = 0x80,             /* count each string's bytes by its UTF-8 characters first */
-  SORT_IGNORETRAILING = 0x20000 /* trailing blanks (u_isblank) do not count */
+  SORT_IGNORETRAILING = 0x20000 /* ignore trailing blanks (u_isblank), but not after a null */
 };
 
 /* Compares two strings in the object's code page by the rules of its language, at tertiary strength
@@ -537,14 +564,15 @@ NLS2_API int32_t NLS2_Strcoll(const NLS2_Locale *pLoc, const char *pString1, int
 enum { IGNORECASE = 0x40 /* lower-case both strings by the language's rules first */ };
 
 /* Whether string 2 occurs in string 1, both in the object's code page, unit for unit in UTF-16
- * (u_strstr). Lengths in bytes. Both end at their first null character; an empty string 2 occurs
- * everywhere.
+ * (u_strstr), except that half of a surrogate pair is not found in a whole one. Lengths in bytes.
+ * Both end at their first null character; an empty string 2 occurs everywhere.
  *
  * Result: 1 if it does, 0 if not, -1 on any failure: no live object, a code page that does not
  * open, bad lengths, no memory.
  *
  * Surprises: with IGNORECASE a string that grows in lower case ("\u0130" outside Turkish) is a
- * failure. A failure to measure or to store string 2 leaks a buffer. */
+ * failure. A failure to measure or to store string 2 leaks a buffer. To search many texts, use
+ * ICU's usearch_open(). */
 NLS2_API int32_t NLS2_Findstr(const NLS2_Locale *pLocale, const char *pString1, int32_t len1,
                               const char *pString2, int32_t len2, uint32_t options);
 
@@ -552,9 +580,11 @@ NLS2_API int32_t NLS2_Findstr(const NLS2_Locale *pLocale, const char *pString1, 
 enum { NLS2_MAP_FOLDCASE = 0x10, NLS2_MAP_UPPERCASE = 0x400, NLS2_MAP_LOWERCASE = 0x800 };
 
 /* Meant for case mapping, but unusable: every text of one character or more fails with 15
- * (U_BUFFER_OVERFLOW_ERROR) and leaves dest as it was, whatever the options. Only an empty src is
- * mapped; it must be null-terminated, and slen is only traced. It becomes two null characters of
- * the code page, after a signature if the page writes one. ICU adds a zero byte if dest has room.
+ * (U_BUFFER_OVERFLOW_ERROR) and leaves dest as it was, whatever the options. Use NLS2_toUTF16 and
+ * ICU's u_strToUpper(), u_strToLower() or u_strFoldCase(). Only a src without a character is
+ * mapped: an empty one, or one of shifts alone ("\x0E" in 930). It must be null-terminated; slen is
+ * only traced. It becomes two null characters of the code page, after a signature if the page
+ * writes one. ICU adds a zero byte if dest has room.
  *
  * Result: the bytes written without that one (2 for 819, 4 for 1200, 6 for 1204), or a status.
  * Lengths and statuses share the numbers:
@@ -573,11 +603,11 @@ NLS2_API int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t 
  * the encoding that NLS2_OpenStream names. pLocale must be live and has no other effect: no stream
  * uses its code page or its name. A stream belongs to one thread at a time.
  *
- * Surprises. None of these functions reports read or write errors; use ferror(u_fgetfile(stream)).
- * A write to a full disk returns its full count, and a directory opens for reading and reads as
- * empty. Bytes that do not convert become U+FFFD or U+001A, and characters that the file's encoding
- * lacks become its substitution character. A null stream makes ICU crash, except in
- * NLS2_CloseStream. */
+ * Surprises. None of these functions reports read or write errors: check
+ * ferror(u_fgetfile(stream)). A write to a full disk returns its full count, and a directory opens
+ * for reading and reads as empty. Bytes that do not convert become U+FFFD or U+001A, and characters
+ * that the file's encoding lacks become its substitution character. A null stream crashes in every
+ * function but NLS2_CloseStream. */
 
 /* Opens a file.
  *
@@ -593,8 +623,8 @@ NLS2_API int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t 
  * second one in the middle of the file with mode "a", and reads with or without one (then
  * big-endian); "UTF-16LE", "UTF-16BE" and "UTF-8" write none, and read one as the unit U+FEFF. With
  * an empty encoding there is no converter: a character outside ICU's invariant set, such as
- * @ # $ [ ~ ! | and all beyond ASCII, is written as a zero byte, and a byte is read as the
- * character with its number (E4 as U+00E4). */
+ * @ # $ [ ~ ! |, the line feed and all beyond ASCII, is written as a zero byte, and a byte is read
+ * as the character with its number (E4 as U+00E4). Name an encoding. */
 NLS2_API struct UFILE *NLS2_OpenStream(const NLS2_Locale *pLocale, const char *filename,
                                        const char *permissions, const char *encoding);
 
@@ -607,9 +637,12 @@ NLS2_API int32_t NLS2_CloseStream(const NLS2_Locale *pLocale, struct UFILE *file
 NLS2_API int32_t NLS2_WriteString(const NLS2_Locale *pLocale, const UChar *pSource, int32_t len,
                                   struct UFILE *fileHandle);
 
-/* Reads up to `len` units, 0 or more; no terminator is stored. Result: the units read, fewer than
- * `len` only at the end of the file; 0 there and for a locale that is not live. A surrogate pair
- * may be cut between two reads.
+/* Reads up to `len` units, 0 or more; no terminator is stored. Result: the units read; 0 at the end
+ * of the file and for a locale that is not live. A surrogate pair may be cut between two reads.
+ *
+ * Surprise: the result can be 0, or less than `len`, in the middle of a file, if a kilobyte of it
+ * has no character (shifts, or changes of a window in SCSU). Only feof(u_fgetfile(stream)) is
+ * certain.
  *
  * Warning: the stream is the second argument here and in NLS2_Fgets, the last in the two functions
  * that write. A negative len is undefined behaviour. */
@@ -627,8 +660,9 @@ NLS2_API int32_t NLS2_Fputs(const NLS2_Locale *pLocale, const UChar *pString,
  * U+2029. pDest needs room for `len` units, and is traced as it is before the call.
  *
  * Result: pDest; null at the end of the file, with a len below 1, and for a locale that is not
- * live. A len of 1 gives an empty text until the end of the file. A null inside a line looks like
- * the terminator: use NLS2_ReadString, which counts. */
+ * live; null also in the middle of a file, as NLS2_ReadString returns 0 there. A len of 1 returns
+ * an empty text until the end of the file. A null inside a line looks like the terminator: use
+ * NLS2_ReadString, which counts. */
 NLS2_API UChar *NLS2_Fgets(const NLS2_Locale *pLocale, struct UFILE *fileHandle, UChar *pDest,
                            int32_t len);
 
@@ -655,20 +689,22 @@ NLS2_API const char *NLS2_detectUnicodeSignature(const char *source, int32_t sou
 
 /* Opens ICU's resource bundle (<unicode/ures.h>) for an object's locale name.
  *
- *   packageName  the data's package or path, as for ures_open: a directory of .res files, or
- *                one and a basename; null for ICU's own data
+ *   packageName  as for ures_open: a directory of .res files, or a .dat file with its path and
+ *                without ".dat"; null for ICU's own data
  *
  * Result: the bundle, which NLS2_ResourceClose closes; null on failure.
  *
  * Status:
  *   0     done
- *   -128  U_USING_FALLBACK_WARNING: the bundle is that of a parent of the locale
+ *   -128  U_USING_FALLBACK_WARNING: the bundle is that of a parent of the locale, which for some
+ *         languages (zh_Hant, sr_Latn) is the root bundle
  *   -127  U_USING_DEFAULT_WARNING: it is that of the process's default locale, or the root bundle
  *   2     U_MISSING_RESOURCE_ERROR: there is no bundle at all
  *   38    NLS2_ERR_INVALID_LOCALE
  *   or ICU's other failures
  *
- * Surprise: for a language without a bundle the process's default locale comes before the root. */
+ * Surprise: for a language without a bundle the process's default locale comes before the root. Ask
+ * ICU's ures_getLocaleByType() which bundle it is. */
 NLS2_API struct UResourceBundle *NLS2_ResourceOpen(const char *packageName,
                                                    const NLS2_Locale *pLocale, int32_t *pStatus);
 
