@@ -3,6 +3,8 @@
 # not name its host either.
 
 file(READ ${OPTIONS_FILE} options)
+string(STRIP "${options}" options)
+string(REGEX REPLACE " +" " " options "${options}")
 string(TIMESTAMP date "%Y-%m-%dT%H:%M:%SZ" UTC)
 set(host "")
 if(NOT DEFINED ENV{SOURCE_DATE_EPOCH})
