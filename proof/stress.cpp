@@ -61,7 +61,7 @@ void churn() {
   for (NLS2_Locale *&object : objects) {
     object = make();
   }
-  for (const size_t i : {2, 0, 4, 1, 3}) {
+  for (const size_t i : {2U, 0U, 4U, 1U, 3U}) {
     expect(NLS2_ValidateLocale(objects[i]) == 0, "a live object is valid");
     expect(NLS2_ValidateLocale(shared) == 0, "the shared object is valid");
     expect(NLS2_ReleaseLocale(objects[i]) == 0, "a live object is released");
