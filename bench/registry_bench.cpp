@@ -38,6 +38,7 @@ public:
   Objects(const Objects &) = delete;
   Objects &operator=(const Objects &) = delete;
 
+  NLS2_Locale *at(std::size_t i) const { return live_[i]; }
   NLS2_Locale *last() const { return live_.back(); }
   NLS2_Locale *lastPlain() const { return plain_.back(); }
   NLS2_Locale *plainHead() const { return plainHead_; }
@@ -72,7 +73,26 @@ void validatePlain(benchmark::State &state) {
   }
 }
 
-void getAndRelease(benchmark::State &state) {
+// Eight objects in turn.
+void validateInTurn(benchmark::State &state) {
+  const Objects objects(8);
+  std::size_t i = 0;
+  for (auto _ : state) {
+    benchmark::DoNotOptimize(NLS2_ValidateLocale(objects.at(i++ % 8)));
+  }
+}
+
+// One validation after each release of another object; subtract makeAndRelease.
+void validateAfterRelease(benchmark::State &state) {
+  const Objects objects(state.range(0));
+  for (auto _ : state) {
+    NLS2_ReleaseLocale(make());
+    benchmark::DoNotOptimize(NLS2_ValidateLocale(objects.at(0)));
+  }
+}
+
+void makeAndRelease(benchmark::State &state) {
+  const Objects objects(state.range(0));
   for (auto _ : state) {
     benchmark::DoNotOptimize(NLS2_ReleaseLocale(make()));
   }
@@ -90,7 +110,9 @@ void validateOwn(benchmark::State &state) {
 
 BENCHMARK(validate)->Arg(1)->Arg(100)->Arg(10000);
 BENCHMARK(validatePlain)->Arg(1)->Arg(100)->Arg(10000);
-BENCHMARK(getAndRelease);
+BENCHMARK(validateInTurn);
+BENCHMARK(validateAfterRelease)->Arg(1)->Arg(100)->Arg(10000);
+BENCHMARK(makeAndRelease)->Arg(1)->Arg(100)->Arg(10000);
 BENCHMARK(validateOwn)->Threads(1)->Threads(2)->UseRealTime();
 
 } // namespace
