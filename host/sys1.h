@@ -1,12 +1,12 @@
-/* sys1.h - the lock service that the library asks of its host.
+/* sys1.h - the lock service that the library needs from its host.
  *
  * A lock object is 28 bytes of storage, all zero at first and aligned for a 32-bit word. What they
- * hold is the service's business: nothing initialises or destroys them. The library holds its one
- * lock while it changes its list of locale objects, and never while it calls ICU.
+ * hold is up to the service; nothing initialises or destroys them. The library has one lock. It
+ * holds it while it changes its list of locale objects, and never while it calls ICU.
  *
- * It also holds the lock across fork(2): the thread that forks gets the lock before, and releases it
- * in the parent and in the child. In the child, a lock must therefore be releasable by the one
- * thread that is left, although its thread id has changed.
+ * It also holds the lock across fork(2): the thread that forks gets the lock before, and releases
+ * it afterwards, in the parent and in the child. So the child's one thread must be able to release
+ * it, although it has another thread id than the thread that got it.
  *
  * As with trc1.h, a host's own definitions replace those of libzelhost.so.
  */

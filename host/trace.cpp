@@ -1,8 +1,8 @@
-// The default trace facility: one line an event, to a file or to standard error.
+// The default trace facility: one line per event, to a file or to standard error.
 //
-// It is off unless the environment asks for it when the process starts:
-//   ZELHOST_TRACE       "events", "detail" or "all": what to write
-//   ZELHOST_TRACE_FILE  the file to append to; standard error if it is not set
+// It is off unless these environment variables are set when the process starts:   ZELHOST_TRACE
+// "events", "detail" or "all": what to write   ZELHOST_TRACE_FILE  the file to append to; standard
+// error if it is not set
 
 #include "trc1.h"
 
@@ -70,10 +70,10 @@ const Settings &settings() {
   return theSettings;
 }
 
-// One line: the constructor opens it with what all lines share, the destructor ends it. Lines of
-// several threads do not mix, since the stream stays locked in between. Thread cancellation is held
-// back for as long: writing is a cancellation point, and a cancelled thread would leave the stream
-// locked for ever.
+// One line: the constructor writes what all lines begin with, the destructor ends the line. Lines
+// of several threads do not mix, since the stream stays locked in between. Thread cancellation is
+// disabled meanwhile: writing is a cancellation point, and a cancelled thread would leave the
+// stream locked for ever.
 class Line {
 public:
   Line(const TRC1_EntryBlock *anchor, uint32_t line) : file_(settings().file) {

@@ -1,4 +1,4 @@
-/* trc1.h - the trace facility that the library asks of its host.
+/* trc1.h - the trace facility that the library needs from its host.
  *
  * A host defines the four functions, in the program or in a library of its own; libzelhost.so
  * holds a default implementation that its definitions replace.
@@ -6,7 +6,7 @@
  * Each function of the library owns one TRC1_EntryBlock, its anchor. On entry the library compares
  * the word that `sync` points at with `cachedSync`; if they are equal it uses `cachedFlags`, and
  * otherwise it calls TRC1_Sync. A host that changes its trace settings therefore changes the word
- * that `sync` points at, and the next call of each function asks anew.
+ * that `sync` points at, and the next call of each function calls TRC1_Sync again.
  *
  * Rules for a host:
  *   - Any thread may call at any time, several with the same anchor. Read and write `cachedFlags`,

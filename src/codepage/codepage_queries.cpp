@@ -14,8 +14,8 @@ using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
-// If a converter has no CCSID and its name no record, the converter has always been leaked; callers
-// that count converters rely on it.
+// Leaks a converter that has no CCSID, and no record for its name: the library always did, and
+// callers that count converters rely on it.
 void leaveOpen(icu::LocalUConverterPointer &converter) { converter.orphan(); }
 
 // Called only under detail tracing. A failure then ends the query, so tracing can change its

@@ -14,7 +14,7 @@ inline UConverter *openMapped(const NLS2_Locale *pLocale, int32_t *status) {
   return mapCodepageIdToName(static_cast<int32_t>(pLocale->codepage), &twoNull, status);
 }
 
-// Past those names: every number goes to ICU as a CCSID.
+// Without those names: every number goes to ICU as a CCSID.
 inline UConverter *openAsCcsid(const NLS2_Locale *pLocale, UErrorCode *error) {
   return ucnv_openCCSID(static_cast<int32_t>(pLocale->codepage), UCNV_IBM, error);
 }

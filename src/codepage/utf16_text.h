@@ -14,8 +14,8 @@ struct Utf16Text {
   trace::Block<UChar> units;
   int32_t length = 0; // in units, without the terminator
 
-  // The units before the first null. Where ICU writes a unit more than it measured, as for a text
-  // that ends within its signature, it leaves out the terminator.
+  // The units before the first null. There may be no null: if a UTF-32 text ends within its
+  // signature, ICU writes a unit more than it measured, and no terminator.
   int32_t lengthToNull() const {
     const UChar *begin = units.get();
     return static_cast<int32_t>(std::find(begin, begin + length + 1, u'\0') - begin);
@@ -47,8 +47,8 @@ inline UErrorCode convert(const Utf16Text &text, UConverter *converter, const ch
   return error;
 }
 
-// Walks back from `end` while `isTrailing` holds for the code point there, and puts a zero unit in
-// the place of each, the first unit of a pair of surrogates.
+// Walks back from `end` while `isTrailing` holds for the code point there, and clears the first
+// unit of each: in a surrogate pair, the lead.
 template <class IsTrailing>
 void clearTrailing(UChar *units, int32_t end, IsTrailing isTrailing) {
   while (end > 0) {

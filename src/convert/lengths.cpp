@@ -25,8 +25,8 @@ int32_t ratioOf(int32_t destSize, int32_t sourceSize) {
   return destSize == quotient * sourceSize ? destSize : sourceSize * (quotient + 1);
 }
 
-// By the lead bytes of UTF-8 up to the last one of Unicode's range; C0 and C1 count as lead bytes,
-// and any byte that is not a lead byte counts as one character.
+// The length that a UTF-8 lead byte announces. C0 and C1 count as lead bytes; any other byte that
+// is not one is a character by itself.
 int32_t byteLengthOf(uint8_t first) {
   if (first < 0xC0 || first > 0xF4) {
     return 1;
@@ -81,7 +81,7 @@ int32_t NLS2_Strlen(const NLS2_Locale *pLocale, const char *pString, int32_t /*i
     return frame.result(0);
   }
   NLS2_TRACE(frame, "Open the code page converter.");
-  nls2::codepage::Utf16Text text; // given back after the converter
+  nls2::codepage::Utf16Text text; // released after the converter
   UErrorCode error = U_ZERO_ERROR;
   const LocalUConverterPointer converter(nls2::codepage::openAsCcsid(pLocale, &error));
   if (failed(error)) {

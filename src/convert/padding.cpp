@@ -23,7 +23,7 @@ struct Field {
   int32_t sourceLength = 0;        // units of the whole source
   int32_t textLength = 0;          // units up to the first null, trailing blanks cut off
   int32_t trailingBlanks = 0;
-  int32_t room = 0; // bytes of the destination beside the terminator
+  int32_t room = 0; // bytes of the destination without the terminator
 };
 
 bool isFailedPreflight(UErrorCode status) {
@@ -44,7 +44,7 @@ bool measureSource(const PaddedTranslation &call, Field &field) {
   return true;
 }
 
-// As many units as the source has, or as the destination has bytes if that is more, and a zero
+// As many units as the source has units or the destination has bytes, whichever is more, and a zero
 // unit.
 bool allocateUnits(const PaddedTranslation &call, Field &field) {
   NLS2_TRACE(call.trace, "Allocate memory to hold entire utf16 string.");
@@ -84,7 +84,7 @@ void trim(const PaddedTranslation &call, Field &field) {
   NLS2_TRACE(call.trace, "Resulting non-space filled string length is %d.", field.textLength);
 }
 
-// The text must fit beside the terminator whatever the options.
+// The text must fit together with the terminator, whatever the options.
 bool fitText(const PaddedTranslation &call, Field &field) {
   UErrorCode status = U_ZERO_ERROR;
   const int32_t needed = ucnv_fromUChars(call.destConverter.getAlias(), nullptr, 0,
@@ -138,8 +138,8 @@ int32_t writeStripped(PaddedTranslation &call, Field &field) {
   return finish(call, field, field.textLength + terminator);
 }
 
-// This path has always leaked its buffer and both converters, and callers' leak accounting expects
-// it. TERMINATE with meaningless bits is a bug of the caller's.
+// Leaks the buffer and both converters: the library always did, and callers that count leaks expect
+// it. Only TERMINATE with unknown bits leads here, a bug in the caller.
 int32_t refuseOptionAndLeak(PaddedTranslation &call, Field &field) {
   NLS2_TRACE(call.trace, "Invalid option specified.");
   static_cast<void>(field.units.release());
@@ -172,8 +172,8 @@ void appendBlanks(Field &field, int32_t paddedUnits) {
   }
 }
 
-// Text of several bytes a unit can leave too little room for all blanks. Then retry once with one
-// unit fewer for each byte too many: exact while a blank is one byte.
+// If units of the text take several bytes, the blanks may not all fit. Then retries once with one
+// unit fewer for each byte too many, which is exact if a blank is one byte.
 bool writePadded(const PaddedTranslation &call, const Field &field, int32_t paddedUnits) {
   UErrorCode status = U_ZERO_ERROR;
   const int32_t written = writeUnits(call, field, paddedUnits, status);

@@ -17,7 +17,7 @@ struct Buffers {
   int32_t sourceLen;
 };
 
-// One call: arguments past their checks, open converters.
+// One call, with checked arguments and open converters.
 struct PaddedTranslation {
   trace::Trace trace;
   Buffers buffers;
@@ -29,7 +29,7 @@ struct PaddedTranslation {
 
   bool has(uint32_t option) const { return (options & option) != 0; }
   int32_t terminatorLength() const { return twoNullTerminator ? 2 : 1; }
-  // False, for a step to return.
+  // Returns false, for a step to return in turn.
   bool fail(int32_t status) const {
     *pStatus = status;
     return false;

@@ -29,14 +29,14 @@ constexpr const char *utf8 = "utf-8";
 
 std::uintptr_t addressOf(const void *pointer) { return reinterpret_cast<std::uintptr_t>(pointer); }
 
-// A length may reach beyond its buffer, so this adds addresses: ICU compares them and refuses what
-// does not fit.
+// A length may reach outside its buffer, so no pointer arithmetic: ICU compares the addresses and
+// rejects bad ranges.
 template <class Pointer>
 Pointer limitOf(Pointer start, int32_t length) {
   return reinterpret_cast<Pointer>(addressOf(start) + static_cast<std::uintptr_t>(length));
 }
 
-// How long a range is; negative if ICU refuses it.
+// How long a range is; negative if ICU rejects it.
 int64_t rangeLength(const char *start, const char *limit) {
   const bool refused = start == nullptr || addressOf(limit) < addressOf(start) ||
                        addressOf(limit) - addressOf(start) > INT32_MAX;
@@ -46,9 +46,9 @@ int64_t rangeLength(const char *start, const char *limit) {
 // Converts from the source to the source: the output starts where the input does and may go on to
 // dest + dlen. The result is how far the output's end is from the input's.
 //
-// From UTF-8 to UTF-8 ICU works in a copy, of which the output goes back: as invalid bytes grow to
-// U+FFFD, the output overtakes the input, and ICU writes up to 4 bytes past the limit. Without
-// memory for a copy it works in the caller's buffer.
+// UTF-8 to UTF-8 is converted in a copy, and the output is copied back: in place, ICU would write
+// up to 4 bytes past the limit, when invalid bytes grow to U+FFFD and the output overtakes the
+// input. Without memory for a copy it is converted in place all the same.
 int32_t convertInPlace(UConverter *to, UConverter *from, char *dest, int32_t dlen, const char *src,
                        int32_t slen, UErrorCode &error) {
   constexpr int64_t overrun = 16;
@@ -58,7 +58,7 @@ int32_t convertInPlace(UConverter *to, UConverter *from, char *dest, int32_t dle
   const char *input = src;
   const char *inputLimit = limitOf(src, slen);
   int64_t room = rangeLength(begin, outputLimit);
-  // No byte makes less than a byte of output, so what the room cannot hold need not be copied.
+  // Each byte becomes at least one byte of output, so ICU does not get further than the room.
   const int64_t size = std::min(rangeLength(src, inputLimit), room + overrun);
   nls2::trace::Block<char> copy;
   if (room >= 0 && size >= 0 && ucnv_getType(to) == UCNV_UTF8 && ucnv_getType(from) == UCNV_UTF8) {

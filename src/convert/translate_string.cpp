@@ -66,7 +66,7 @@ void traceSource(Trace trace, const char *source, int32_t sourceLen) {
 int32_t countTerminator(Trace trace, char *dest, int32_t amountWritten, bool twoNull) {
   if (twoNull) {
     dest[amountWritten + 1] = 0;
-    // Unsigned, since an output of 2 GB less 2 bytes leaves no room for the sum.
+    // Unsigned, because the sum may exceed 2 GB.
     amountWritten = static_cast<int32_t>(static_cast<uint32_t>(amountWritten) + 2U);
     NLS2_TRACE(trace, "Amount written includes utf-16 nulls %d.", amountWritten);
   } else {
@@ -76,9 +76,9 @@ int32_t countTerminator(Trace trace, char *dest, int32_t amountWritten, bool two
   return amountWritten;
 }
 
-// Options 0 and NLS2_STRING_TERMINATE alone: the source as it is. Closes both converters. Inline,
-// and with its arguments apart: in a struct such as the padding path's they go through memory,
-// which was measured at 3 to 8 ns a call, up to 3 % of a short translation.
+// Options 0 and NLS2_STRING_TERMINATE alone: the source as it is. Closes both converters. Inline
+// and with separate arguments: a struct, as the padding path has, goes through memory, which costs
+// 3 to 8 ns a call, up to 3 % of a short translation (measured).
 inline int32_t translateDirectly(Trace trace, Buffers buffers,
                                  LocalUConverterPointer &destConverter,
                                  LocalUConverterPointer &sourceConverter, uint32_t options,
@@ -131,7 +131,7 @@ int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t destLen,
     return frame.result(0);
   }
 
-  // Of the two pages' two-null flags only the destination's counts.
+  // Only the destination page's two-null flag counts.
   int32_t twoNull = 0;
   int32_t status = U_ZERO_ERROR;
   LocalUConverterPointer sourceConverter(mapCodepageIdToName(sourceCodePage, &twoNull, &status));

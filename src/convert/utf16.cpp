@@ -18,7 +18,7 @@ using nls2::trace::Trace;
 
 enum class Direction { toUtf16, fromUtf16 };
 
-// `convert` does ICU's part with the open converter; its result is the length.
+// `convert` calls ICU with the open converter and returns the length.
 template <Direction direction, class Convert>
 int32_t throughConverter(Trace trace, const NLS2_Locale *pLocale, int32_t *status,
                          Convert convert) {

@@ -24,8 +24,8 @@ constexpr const char *utf8 = "utf-8";
 
 enum class Direction { toUtf8, fromUtf8 };
 
-// One line for both directions; it labels its arguments as NLS2_toUTF8 has them. An output with a
-// negative capacity has no text at all.
+// One line serves both directions, with the labels of NLS2_toUTF8. An output with a negative
+// capacity prints as empty.
 template <Direction direction>
 void traceInput(Trace trace, const NLS2_Locale *pLocale, const char *second, int32_t third,
                 const char *fourth, int32_t fifth) {
@@ -37,7 +37,7 @@ void traceInput(Trace trace, const NLS2_Locale *pLocale, const char *second, int
       BoundedText(fourth, toUtf8 ? std::max(fifth, 0) : fifth).c_str(), fifth);
 }
 
-// The converter opened here only lends its name; ucnv_convert opens its own by that name.
+// The converter opened here only provides its name; ucnv_convert opens its own by that name.
 template <Direction direction>
 int32_t convertByName(Trace trace, const NLS2_Locale *pLocale, char *target, int32_t targetLength,
                       const char *source, int32_t sourceLength, int32_t *status) {
@@ -99,7 +99,7 @@ int32_t NLS2_toUTF8(const NLS2_Locale *pLocale, const char *pSource, int32_t sou
                                                        pSource, sourceLength, status));
 }
 
-// Its status is only ever set to a failure: callers preset it.
+// Stores a status on failure only, so callers preset it.
 int32_t NLS2_fromUTF8(const NLS2_Locale *pLocale, char *pTarget, int32_t targetLength,
                       const char *pSource, int32_t sourceLength, int32_t *status) {
   static constinit TRC1_EntryBlock anchor = nls2::trace::anchorOf("NLS2_fromUTF8");

@@ -16,7 +16,7 @@ using nls2::failed;
 using nls2::trace::Frame;
 using nls2::trace::Trace;
 
-// The table's end mark; as a new value it means that nothing is to change.
+// The table's end mark. As a new value it means: change nothing.
 constexpr uint32_t keepValue = NLS2_LANGUAGE_ID_END;
 
 int32_t setLanguage(Trace trace, NLS2_Locale *pLocale, uint32_t languageId) {

@@ -19,8 +19,7 @@ using nls2::trace::Trace;
 // With either of them the new object keeps the defaults.
 constexpr uint32_t keepDefaultOptions = 0x2 | NLS2_LOCALE_DEFAULT;
 
-// A record is found by its id, or by a code page that is in both its columns, whichever comes
-// first in the table.
+// The first record with this id, or with this code page in both columns.
 const LocaleMapEntry *findRequested(uint32_t languageId, uint32_t codepage) {
   return nls2::locale::findEntry([=](const LocaleMapEntry &entry) {
     return entry.languageId == languageId ||

@@ -29,8 +29,8 @@ const char *identifierOf(Trace trace, const char *pPosixID, PosixName &buffer) {
   return buffer;
 }
 
-// Writes into an object that GetThreadLocale has just made and that nobody will release: there is
-// no locale of a thread's own to write into.
+// Writes into a new object from GetThreadLocale, which nobody will release: a thread has no locale
+// of its own.
 int32_t applyToThreadLocale(Trace trace, const LocaleMapEntry &entry) {
   NLS2_Locale *pLocale = NLS2_GetThreadLocale();
   if (pLocale == nullptr) {

@@ -28,12 +28,12 @@ void countRemoval() {
   removalCount.store(next != 0 ? next : 1, std::memory_order_seq_cst);
 }
 
-// Like `follow`, for a change.
+// Changes a link; see `follow`.
 void set(NLS2_Locale *&link, NLS2_Locale *object) {
   __atomic_store_n(&link, object, __ATOMIC_SEQ_CST);
 }
 
-// What a thread does about the lock around a fork, and what a fork in a signal handler must know.
+// What a thread knows about the lock when it forks, perhaps in a signal handler.
 struct Forking {
   bool changesList; // the thread holds the lock, or waits for it
   bool tookLock;
@@ -42,9 +42,9 @@ struct Forking {
 constinit thread_local Forking forking __attribute__((tls_model("initial-exec"))) = {};
 static_assert(sizeof remembered + sizeof detail::ownCounts + sizeof forking <= 256);
 
-// A child has no thread that would release the lock for another, so the thread that forks holds it.
-// Unless it is a signal handler's fork, and what it interrupted holds the lock or keeps its holder
-// waiting: that is, changes the list or walks.
+// If another thread held the lock during the fork, nobody would release it in the child. So the
+// forking thread takes it first, unless it forks in a signal handler that interrupted a change of
+// the list, which may hold the lock, or a walk, for which the holder may be waiting.
 void beforeFork() {
   pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &forking.cancelState);
   forking.tookLock = !forking.changesList && !isWalking();
@@ -69,7 +69,7 @@ __attribute__((constructor)) void watchForks() {
   pthread_atfork(beforeFork, afterFork, afterForkInChild);
 }
 
-// Holds the list's lock, and thread cancellation back with it: a host's trace call may be a
+// Holds the list's lock, with thread cancellation disabled: a host's trace call may be a
 // cancellation point, and a cancelled thread runs no destructor of this library, which is built
 // without exceptions. The lock would never be released.
 class ListLock {

@@ -13,14 +13,14 @@ void append(trace::Trace trace, NLS2_Locale *object);
 // Unlinks and frees an object. Does nothing if another thread already removed it.
 void remove(trace::Trace trace, NLS2_Locale *object);
 
-// True while the object is on the list; its contents are not looked at. Takes no lock.
+// True while the object is on the list; its contents are not read. Takes no lock.
 bool contains(const NLS2_Locale *object);
 
 // NLS2_ValidateLocale in its trace frame.
 int32_t validateInFrame(TRC1_EntryBlock &anchor, const NLS2_Locale *pLocale);
 
-// NLS2_ValidateLocale, to be compiled into callers that count nanoseconds: an object that the thread
-// remembers is valid, and while tracing is off there is nothing else to do.
+// NLS2_ValidateLocale, compiled into hot callers: while tracing is off and the thread remembers the
+// object, there is nothing else to do.
 [[gnu::always_inline]] inline int32_t validateLocale(const NLS2_Locale *pLocale) {
   static constinit TRC1_EntryBlock anchor = trace::anchorOf("NLS2_ValidateLocale");
   if (trace::Frame::isOff(anchor) && isRemembered(pLocale)) [[likely]] {

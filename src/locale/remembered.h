@@ -12,8 +12,8 @@
 // A validation during a removal may find the object or not, with or without a search.
 //
 // A removal pays for the glances that it must expect. So a thread remembers nothing until its
-// searches since the last removal have taken some time themselves: where objects come and go all the
-// time, it does not get that far.
+// searches since the last removal have taken some time themselves: where objects come and go all
+// the time, it does not get that far.
 //
 // A signal handler may validate at any time: it trusts nothing that it interrupted half written,
 // and does not write it.
@@ -30,7 +30,7 @@ namespace nls2::locale {
 
 using Link = NLS2_Locale *const *;
 
-// The thread's own: atomic only for its signal handlers.
+// Of one thread; atomic only for that thread's signal handlers.
 struct Remembered {
   std::atomic<std::size_t> removals; // 0, which is never the count: do not trust the rest
   std::atomic<const NLS2_Locale *> head;
@@ -43,9 +43,9 @@ struct Remembered {
 extern constinit std::atomic<std::size_t> removalCount;
 extern constinit thread_local Remembered remembered __attribute__((tls_model("initial-exec")));
 
-// A link of the list. Links are read by walks that take no lock; that they are sequentially
-// consistent with the counts of walkers.h is what makes a removal see every walk that can still see
-// the removed object. A load pays nothing for it on x86 and little elsewhere.
+// Reads a link of the list, with or without the lock. Links and the counts of walkers.h are
+// sequentially consistent, so that a removal sees every walk that can still see the removed object.
+// Such a load costs nothing on x86 and little elsewhere.
 inline NLS2_Locale *follow(NLS2_Locale *const &link) {
   return __atomic_load_n(&link, __ATOMIC_SEQ_CST);
 }
@@ -57,8 +57,8 @@ inline std::size_t firstPlace(const NLS2_Locale *object) {
   return reinterpret_cast<std::uintptr_t>(object) / 32 % 16;
 }
 
-// Call in a walk, which found the object at this link after so many. The count and the head are from
-// before the search.
+// Call in a walk, which found the object at this link after so many. The count and the head are
+// from before the search.
 void remember(const NLS2_Locale *object, Link link, std::size_t linksFollowed, std::size_t removals,
               const NLS2_Locale *head);
 

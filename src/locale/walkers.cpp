@@ -42,8 +42,8 @@ bool membarrier(int command) { return syscall(SYS_membarrier, command, 0, 0) == 
 
 const bool barriersWork = membarrier(MEMBARRIER_CMD_REGISTER_PRIVATE_EXPEDITED);
 
-// A walk takes microseconds, so mostly the processor is only offered to it. Where that does not
-// help, the walk may belong to a thread of lower real-time priority that a yield never lets run.
+// A walk takes microseconds, so yielding the processor is usually enough. If it is not, the walk
+// may belong to a thread of lower real-time priority, which a yield never lets run.
 void giveWay(unsigned attempt) {
   constexpr unsigned yields = 1000;
   if (attempt < yields) {

@@ -58,15 +58,15 @@ int32_t NLS2_MapString(const NLS2_Locale *pLocale, char *dest, int32_t dlen, con
   if (failed(nls2::locale::validateLocale(pLocale))) {
     return frame.result(int32_t{NLS2_ERR_INVALID_LOCALE});
   }
-  Utf16Text text; // the converter goes first
+  Utf16Text text; // released after the converter
   Utf16Text mapped;
   UErrorCode error = U_ZERO_ERROR;
   LocalUConverterPointer converter(nls2::codepage::openAsCcsid(pLocale, &error));
   if (failed(error)) {
     return frame.result(int32_t{error});
   }
-  // Unlike elsewhere, ICU's report that a first pass has no room is a failure here, so that only an
-  // empty text is ever mapped.
+  // Unlike elsewhere, the first pass fails if ICU reports an overflow, so only an empty text is
+  // ever mapped.
   const auto length = static_cast<int32_t>(std::strlen(src));
   error = U_ZERO_ERROR;
   text.length = ucnv_toUChars(converter.getAlias(), nullptr, 0, src, length, &error);

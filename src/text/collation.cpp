@@ -26,7 +26,8 @@ using nls2::trace::Trace;
 
 // The byte length in whole characters: up to the null if `given` is negative, else up to the end of
 // the first character that ends at or after `given`. It wraps at 16 bits. NLS2_ByteLength is called
-// twice because both calls are in the known traces; its status is ignored, since the object is live.
+// twice because both calls are in the known traces. Its status is ignored, since the object is
+// live.
 int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, int16_t given,
                      int number) {
   if (given < 0) {
@@ -48,8 +49,8 @@ int16_t walkedLength(Trace trace, const NLS2_Locale *pLoc, const char *string, i
   return static_cast<int16_t>(length);
 }
 
-// Both passes, into a cleared block. Without room for string 2 the converter goes first, then
-// string 1.
+// Both passes, into a cleared block. If there is no memory for string 2, the converter is closed
+// before string 1 is freed.
 bool convertString(Trace trace, LocalUConverterPointer &converter, Utf16Text &text,
                    const char *string, int16_t length, int number, int32_t *pStatus) {
   UErrorCode error = nls2::codepage::measure(text, converter.getAlias(), string, length);
@@ -83,7 +84,7 @@ bool convertString(Trace trace, LocalUConverterPointer &converter, Utf16Text &te
   return true;
 }
 
-// Blanks become nulls, which the collator ignores; its lengths stay.
+// Turns trailing blanks into nulls, which the collator ignores. The length stays.
 void trim(Utf16Text &text) {
   nls2::codepage::clearTrailing(text.units.get(), text.lengthToNull(),
                                 [](UChar32 character) { return u_isblank(character) != 0; });

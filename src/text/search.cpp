@@ -24,7 +24,7 @@ using nls2::trace::Trace;
 
 constexpr int32_t searchFailed = -1;
 
-// Everything a call owns. Known traces fix whether it is released before or after a line.
+// Everything that a call owns. The known traces show whether it is released before or after a line.
 struct Search {
   Trace trace;
   const NLS2_Locale *pLocale;
@@ -42,8 +42,8 @@ struct Search {
     converter.adoptInstead(nullptr);
   }
 
-  // If string 2 cannot be measured or allocated, the first string's block has always been leaked,
-  // and callers' leak accounting expects it.
+  // Leaks the first string's block if string 2 cannot be measured or allocated: the library always
+  // did, and callers that count leaks expect it.
   void releaseAllButText1() {
     converter.adoptInstead(nullptr);
     static_cast<void>(text1.units.release());

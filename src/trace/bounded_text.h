@@ -13,9 +13,9 @@ namespace nls2::trace {
 // first zero byte, whichever comes first. A negative length means a null-terminated text; a
 // null pointer prints as "(null)". UTF-16 text prints as the bytes it consists of.
 //
-// Make it inside the NLS2_TRACE that prints it, where it lives as long as the call of the host and
-// is not made at all while detail tracing is off:
-//   NLS2_TRACE(frame, "source %s", BoundedText(source, length).c_str());
+// Construct it inside the NLS2_TRACE that prints it: it then lives until the host returns, and is
+// not constructed while detail tracing is off:   NLS2_TRACE(frame, "source %s", BoundedText(source,
+// length).c_str());
 class BoundedText {
 public:
   BoundedText(const char *bytes, int32_t byteLength) : BoundedText(bytes, int64_t{byteLength}) {}

@@ -16,9 +16,8 @@ struct FreeBlock {
 template <class Unit>
 using Block = std::unique_ptr<Unit[], FreeBlock>;
 
-// realloc(3) in its own trace frame. A failure is reported under the calling function's
-// anchor and line; the old block is then as it was. The name is the one that its trace events
-// carry.
+// realloc(3) in its own trace frame. A failure is reported under the calling function's anchor and
+// line; the old block is then as it was. Its trace events carry this name.
 inline void *realloc_mem(TRC1_EntryBlock *caller, uint32_t line, void *old, uint32_t size) {
   static constinit TRC1_EntryBlock anchor = anchorOf("realloc_mem", TRC1_ENTRY_PRIVATE);
   const Frame frame(anchor);
@@ -30,7 +29,7 @@ inline void *realloc_mem(TRC1_EntryBlock *caller, uint32_t line, void *old, uint
   return block;
 }
 
-// A new block of `bytes` bytes, not cleared; null also for a size that 32 bits cannot carry.
+// A new block of `bytes` bytes, not cleared; null without memory, or if the size exceeds 32 bits.
 template <class Unit>
 Block<Unit> allocate(Trace trace, uint64_t bytes, uint32_t line = __builtin_LINE()) {
   if (bytes > UINT32_MAX) {

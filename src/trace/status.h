@@ -5,7 +5,7 @@
 
 namespace nls2 {
 
-// True for a failure: ICU's warnings are negative, and successes. For UErrorCode as well.
+// True for a failure. ICU's warnings are negative and count as success. A UErrorCode will do, too.
 constexpr bool failed(int32_t status) { return status > 0; }
 
 } // namespace nls2

@@ -6,7 +6,7 @@
 
 namespace nls2::trace {
 
-// The date and time are fixed texts of the interface; NLS2_BuildStamp gives the true ones.
+// The date and time are fixed texts of the interface; NLS2_BuildStamp reports the true ones.
 constinit TRC1_UnitBlock unit = {
     .formatVersion = 400,
     .attributes = 0x30000000,
