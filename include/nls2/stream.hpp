@@ -101,7 +101,7 @@ public:
 
   // Reads units until the span is full or the file ends, and returns how many: fewer than fit only
   // at the end. A surrogate pair may be cut between two reads.
-  std::size_t read(std::span<char16_t> out, error_ref error NLS2_MAY_OMIT) {
+  [[nodiscard]] std::size_t read(std::span<char16_t> out, error_ref error NLS2_MAY_OMIT) {
     if (!check(cannot_read, out.size(), error) || out.empty()) {
       return 0;
     }
@@ -119,7 +119,7 @@ public:
   // Reads a line without its end. False at the end of the file and on failure, when `line` holds
   // what could be read. A line ends in U+000A, U+000B, U+000C, U+000D (with a U+000A that follows),
   // U+0085, U+2028 or U+2029; the last one may have no end. Nulls inside are text.
-  bool read_line(std::u16string &line, error_ref error NLS2_MAY_OMIT) {
+  [[nodiscard]] bool read_line(std::u16string &line, error_ref error NLS2_MAY_OMIT) {
     line.clear();
     if (!check(cannot_read, 0, error)) {
       return false;

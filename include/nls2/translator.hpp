@@ -33,18 +33,22 @@ enum class padding : std::int32_t {
   as_is = NLS2F_AS_IS, // the field as it is, blanks and nulls too
   strip = NLS2F_STRIP, // the text alone
   fill = NLS2F_FILL,   // the text and U+0020 up to exactly `width` bytes
-  keep_blanks =
-      NLS2F_KEEP_BLANKS // the text and one U+0020 for each blank, as many as fit in `width`
+  // The text and one U+0020 for each blank, as many as fit in `width`.
+  keep_blanks = NLS2F_KEEP_BLANKS
 };
 
 // What to do with bytes that are not valid in the source page, and with characters that the
 // destination page lacks.
 enum class on_bad : std::int32_t {
-  stop = NLS2F_STOP,       // the field fails
-  replace = NLS2F_REPLACE, // as ICU does, which drops ignorable characters (U+200B ...)
-  replace_visibly = NLS2F_REPLACE_VISIBLY // a substitution character for ignorable ones, too
+  stop = NLS2F_STOP, // the field fails
+  // U+FFFD or the page's substitution character takes their place; characters that are ignorable by
+  // default (U+00AD, U+200B ...) disappear, as ICU does it. All are counted.
+  replace = NLS2F_REPLACE,
+  // The same, but ignorable characters are substituted, too.
+  replace_visibly = NLS2F_REPLACE_VISIBLY
 };
 
+// How a translator treats fields.
 struct field_policy {
   nls2::padding padding = nls2::padding::as_is;
   std::size_t width = 0; // bytes: the exact size with fill, otherwise the maximum; 0: no limit
@@ -90,8 +94,8 @@ private:
   NLS2F_Problem found_{sizeof(NLS2F_Problem), 0, 0, 0, 0, 0, 0, {}};
 };
 
-// What became of a field. With a status of NLS2F_ERR_FIELD (40) `problem` says what is wrong;
-// others are 32 (no memory) and 37 (an empty translator, or an argument that is not valid).
+// The result of a field. If the status is NLS2F_ERR_FIELD (40), `problem` is what is wrong; others
+// are 32 (no memory) and 37 (an empty translator, or an argument that is not valid).
 struct [[nodiscard]] field_result {
   std::int32_t status = 0;
   std::size_t written = 0;  // bytes of the output; 0 on failure
@@ -99,9 +103,9 @@ struct [[nodiscard]] field_result {
   nls2::problem problem;
 
   explicit operator bool() const noexcept { return status <= 0; }
-  // The status; for a problem one that says what kind it is: 10, 12, 15, 31, or 40.
+  // The status; instead of 40 that of the kind of problem, if there is one: 10, 12, 15 or 31.
   [[nodiscard]] std::error_code error() const noexcept {
-    switch (problem.kind()) {
+    switch (status == NLS2F_ERR_FIELD ? problem.kind() : problem_kind::none) {
     case problem_kind::invalid_bytes:
       return make_status(U_ILLEGAL_CHAR_FOUND);
     case problem_kind::not_in_page:
@@ -116,7 +120,7 @@ struct [[nodiscard]] field_result {
   }
 };
 
-// What became of a piece of a text.
+// The result of a piece of a text.
 struct [[nodiscard]] chunk_result : field_result {
   std::size_t read = 0; // bytes of the piece that were used: all on success
 };
@@ -128,7 +132,8 @@ struct column {
   std::size_t stride = 0; // bytes from one field to the next: the records' length
 };
 
-// What became of a column. `written` is the bytes of the rows done, on failure too.
+// The result of a column. `written` counts the bytes of the rows done, on failure too. With
+// `good` and a status of 0, `problem` is that of the first row that failed, if any did.
 struct [[nodiscard]] column_result : field_result {
   std::size_t done = 0;   // rows whose bytes, offsets and bits are final
   std::size_t failed = 0; // of these, rows with a problem
@@ -155,7 +160,11 @@ public:
     NLS2F_Translator *opened = nullptr;
     const std::int32_t status = NLS2F_OpenTranslator(from.get(), to.get(), &c, &opened);
     reset(opened);
-    error.report(status, "cannot open a translator");
+    if (status > 0) {
+      std::error_code ignored;
+      const std::string pages = from.facts(ignored).name + " to " + to.facts(ignored).name;
+      error.report(status, "cannot open a translator from", pages);
+    }
   }
 
   // A copy has learned what the other one has, and is at the beginning of a text. Empty on failure.
@@ -177,7 +186,8 @@ public:
   [[nodiscard]] std::size_t max_size(std::size_t length) const noexcept {
     std::int64_t size = 0;
     NLS2F_MaxSize(get(), detail::to_int64(length), &size);
-    return static_cast<std::size_t>(size);
+    constexpr std::int64_t most = PTRDIFF_MAX;
+    return static_cast<std::size_t>(size < most ? size : most);
   }
 
   // Translates a field into `out`. result.written is the number of bytes written; the rest of
@@ -199,7 +209,7 @@ public:
   // is refused (37, invalid_argument).
   field_result translate(byte_view field, std::string &out) {
     const std::size_t before = out.size();
-    const std::size_t room = max_size(field.size());
+    const std::size_t room = field.size() <= detail::max_length ? max_size(field.size()) : 0;
     field_result result;
     if (holds(out, field) || room > out.max_size() - before) {
       result.status = holds(out, field) ? NLS2_ERR_INVALID_PARAMETER : NLS2_ERR_NO_MEMORY;
@@ -269,8 +279,8 @@ public:
   }
 
   // Reports a result as other functions report errors. True if it is a success.
-  bool report(const field_result &result, error_ref error) const {
-    if (result.problem.kind() == problem_kind::none) {
+  bool report(const field_result &result, error_ref error NLS2_MAY_OMIT) const {
+    if (result.status != NLS2F_ERR_FIELD) {
       return error.report(result.status, "cannot translate the text");
     }
     const std::string place = "offset " + std::to_string(result.problem.offset()) + ": ";
