@@ -1,10 +1,16 @@
 // The default trace facility, as a program's environment asks for it.
 
+#include "nls2.h"
+#include "trc1.h"
+
+#include <array>
 #include <cstdio>
 #include <fstream>
 #include <gmock/gmock.h>
+#include <latch>
 #include <string>
 #include <sys/wait.h>
+#include <thread>
 #include <unistd.h>
 
 namespace {
@@ -13,23 +19,83 @@ using testing::MatchesRegex;
 
 const std::string path = testing::TempDir() + "zelhost_trace_" + std::to_string(getpid());
 
-// Both standard streams of the program under these settings, and nothing else from outside.
-std::string run(const std::string &environment, const std::string &action) {
-  const std::string command = "env -u ZELHOST_TRACE -u ZELHOST_TRACE_FILE " + environment +
-                              " '" TRACED_PROGRAM "' " + action + " 2>&1";
-  FILE *output = popen(command.c_str(), "r");
-  std::string text;
-  for (int c = std::fgetc(output); c != EOF; c = std::fgetc(output)) {
-    text.push_back(static_cast<char>(c));
+TRC1_UnitBlock unit = {};
+uint32_t syncWord = 7;
+TRC1_EntryBlock anchor = {&unit, "Example", 7, 30, &syncWord, TRC1_ENTRY_EXPORTED, 0, 0, {0, 0}};
+
+void callLibrary() {
+  int32_t status = 0;
+  NLS2_MapWindowsNameToCCSID("windows-936", &status);
+}
+
+// Whatever the library may ask for, asked directly.
+void callHost() {
+  TRC1_Printf(&anchor, 31, "%s, %d\n", "two\nlines", -5);
+  TRC1_Event(&anchor, 32, TRC1_EVENT_EXIT_VALUE, 0xFFFFFFFDU);
+  TRC1_Event(&anchor, 33, TRC1_EVENT_EXIT);
+  TRC1_Dump(&anchor, 34, "\x00\x7F\xFF", 3, 0);
+}
+
+void callFromThreads() {
+  std::latch allAreReady(8);
+  std::vector<std::jthread> threads;
+  for (const char letter : std::string("abcdefgh")) {
+    threads.emplace_back([letter, &allAreReady] {
+      const std::string text(3000, letter);
+      allAreReady.arrive_and_wait();
+      for (int i = 0; i < 200; ++i) {
+        TRC1_Printf(&anchor, 40, "%s\n", text.c_str());
+      }
+    });
   }
-  EXPECT_EQ(WEXITSTATUS(pclose(output)), 0) << command;
+}
+
+// A thread that is cancelled while it writes a line leaves the stream to the others.
+void callCancelled() {
+  alarm(30); // a stream that stays locked would make the next line wait for ever
+  std::jthread([] {
+    pthread_cancel(pthread_self());
+    TRC1_Printf(&anchor, 50, "held back\n");
+    pthread_testcancel();
+    TRC1_Printf(&anchor, 51, "not cancelled\n");
+  }).join();
+  TRC1_Printf(&anchor, 52, "next\n");
+}
+
+using Action = void (*)();
+
+// Both standard streams of a process with these two settings, or without those that are null: its
+// trace flags, and what the action writes.
+std::string run(const char *trace, const char *file, Action action) {
+  std::array<int, 2> ends{};
+  EXPECT_EQ(pipe(ends.data()), 0);
+  const pid_t child = fork();
+  if (child == 0) {
+    dup2(ends[1], 1);
+    dup2(ends[1], 2);
+    trace == nullptr ? unsetenv("ZELHOST_TRACE") : setenv("ZELHOST_TRACE", trace, 1);
+    file == nullptr ? unsetenv("ZELHOST_TRACE_FILE") : setenv("ZELHOST_TRACE_FILE", file, 1);
+    const uint32_t flags = TRC1_Sync(&anchor);
+    std::printf("%X %X %u\n", flags, anchor.cachedFlags, anchor.cachedSync);
+    std::fflush(stdout);
+    action();
+    std::fflush(nullptr);
+    _exit(0);
+  }
+  close(ends[1]);
+  std::string text;
+  for (char c = 0; read(ends[0], &c, 1) == 1;) {
+    text.push_back(c);
+  }
+  close(ends[0]);
+  int status = -1;
+  EXPECT_TRUE(waitpid(child, &status, 0) == child && status == 0);
   return text;
 }
 
 std::string contentOfFile() {
-  std::ifstream file(path);
   std::string text;
-  std::getline(file, text, '\0');
+  std::getline(std::ifstream(path), text, '\0');
   std::remove(path.c_str());
   return text;
 }
@@ -48,42 +114,43 @@ const std::string found = name + "Found matching name windows-936 in the table\\
 TEST(Trace, FollowsTheEnvironment) {
   const struct {
     const char *reason;
-    std::string environment, action, output;
+    const char *trace, *file;
+    Action action;
+    std::string output;
   } rows[] = {
-      {"off by default", "", "library", off},
-      {"empty is off", "ZELHOST_TRACE=", "library", off},
-      {"events alone", "ZELHOST_TRACE=events", "library", events + entry + leave},
-      {"details alone", "ZELHOST_TRACE=detail", "library", "10 10 7\n" + locate + found},
-      {"all", "ZELHOST_TRACE=all", "library", "50 50 7\n" + entry + locate + found + leave},
-      {"a wrong request is reported and off", "ZELHOST_TRACE=everything", "library",
+      {"off by default", nullptr, nullptr, callLibrary, off},
+      {"empty is off", "", nullptr, callLibrary, off},
+      {"events alone", "events", nullptr, callLibrary, events + entry + leave},
+      {"details alone", "detail", nullptr, callLibrary, "10 10 7\n" + locate + found},
+      {"all", "all", nullptr, callLibrary, "50 50 7\n" + entry + locate + found + leave},
+      {"a wrong request is reported and off", "everything", nullptr, callLibrary,
        "zelhost: ZELHOST_TRACE is \"everything\"; it may be events, detail or all\n" + off},
-      {"a file alone asks for nothing", "ZELHOST_TRACE_FILE=/dev/full", "library", off},
-      {"an empty file name is standard error",
-       "ZELHOST_TRACE=events ZELHOST_TRACE_FILE=", "library", events + entry + leave},
-      {"a file that does not open is reported, and standard error takes its place",
-       "ZELHOST_TRACE=events ZELHOST_TRACE_FILE=/nonexistent/t", "library",
+      {"a file alone asks for nothing", nullptr, "/dev/full", callLibrary, off},
+      {"an empty file name is standard error", "events", "", callLibrary, events + entry + leave},
+      {"a file that does not open is reported, and standard error takes its place", "events",
+       "/nonexistent/t", callLibrary,
        "zelhost: cannot open ZELHOST_TRACE_FILE \"/nonexistent/t\": No such file or directory\n" +
            events + entry + leave},
-      {"one line each: text, signed value, exit without one, dump", "ZELHOST_TRACE=all", "host",
+      {"one line each: text, signed value, exit without one, dump", "all", nullptr, callHost,
        "50 50 7\n" + head + "Example:31 two lines, -5\n" + head +
            "Example:32 exit -3 \\(0xFFFFFFFD\\)\n" + head + "Example:33 exit\n" + head +
            "Example:34 dump of 3 bytes at 0x[0-9a-f]+: 00 7F FF\n"},
-      {"a cancelled thread ends its line, and others go on", "ZELHOST_TRACE=detail", "cancelled",
+      {"a cancelled thread ends its line, and others go on", "detail", nullptr, callCancelled,
        "10 10 7\n" + head + "Example:50 held back\n" + head + "Example:52 next\n"},
   };
   for (const auto &row : rows) {
-    EXPECT_THAT(run(row.environment, row.action), MatchesRegex(row.output)) << row.reason;
+    EXPECT_THAT(run(row.trace, row.file, row.action), MatchesRegex(row.output)) << row.reason;
   }
 }
 
 TEST(Trace, AppendsToItsFile) {
   std::ofstream(path) << "before\n";
-  EXPECT_EQ(run("ZELHOST_TRACE=events ZELHOST_TRACE_FILE='" + path + "'", "library"), events);
+  EXPECT_EQ(run("events", path.c_str(), callLibrary), events);
   EXPECT_THAT(contentOfFile(), MatchesRegex("before\n" + entry + leave));
 }
 
 TEST(Trace, LinesOfThreadsDoNotMix) {
-  run("ZELHOST_TRACE=all ZELHOST_TRACE_FILE='" + path + "'", "threads");
+  run("all", path.c_str(), callFromThreads);
   std::istringstream lines(contentOfFile());
   int count = 0;
   for (std::string line; std::getline(lines, line); ++count) {

@@ -147,7 +147,7 @@ std::string shortened(const std::string &text) {
   return result;
 }
 
-std::string run(const Settings &settings, TraceFlags flags) {
+std::string run(const Settings &settings, uint32_t flags) {
   world = {};
   for (int i = 0; i < settings.made; ++i) {
     int32_t status = 0;
@@ -191,7 +191,7 @@ std::string broken(std::string text) {
   return text;
 }
 
-void expectCall(const std::string &expected, const Settings &settings, TraceFlags flags,
+void expectCall(const std::string &expected, const Settings &settings, uint32_t flags,
                 const std::string &place) {
   if (!canHappen(settings, expected)) {
     return;

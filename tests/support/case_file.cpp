@@ -89,15 +89,9 @@ std::string CaseLine::bytes() const {
 }
 
 long long CaseLine::number() const {
-  std::size_t end = 0;
-  try {
-    const long long number = std::stoll(value, &end, value.find("0x") == 0 ? 16 : 10);
-    if (end == value.size()) {
-      return number;
-    }
-  } catch (const std::logic_error &) { // reported below
-  }
-  throw error("not a number");
+  char *end = nullptr;
+  const long long number = std::strtoll(value.c_str(), &end, 0);
+  return *end == '\0' ? number : throw error("not a number");
 }
 
 std::pair<std::string, CaseLine> CaseLine::split(const std::string &separator) const {
@@ -111,36 +105,28 @@ std::pair<std::string, CaseLine> CaseLine::split(const std::string &separator) c
 std::vector<Case> readCases(const std::string &path, const std::vector<std::string> &keys) {
   std::ifstream file(path);
   std::vector<Case> cases;
-  bool inside = false;
   int number = 0;
   for (std::string line; std::getline(file, line);) {
-    const std::size_t blank = line.find(' ');
-    const CaseLine read{line.substr(0, blank),
-                        blank == std::string::npos ? "" : line.substr(blank + 1),
+    const std::size_t blank = std::min(line.find(' '), line.size());
+    const CaseLine read{line.substr(0, blank), line.substr(std::min(blank + 1, line.size())),
                         path + ":" + std::to_string(++number)};
-    if (inside && line[0] == ' ' && !cases.back().lines.empty()) {
-      cases.back().lines.back().value += line;
-    } else if (line.empty()) {
-      inside = false;
-    } else if (line[0] == '#') {
+    if (line.empty() || line[0] == '#') {
       continue;
-    } else if (read.value.empty()) {
-      throw read.error("no value");
-    } else if (read.key == "==") {
-      inside = true;
+    }
+    if (read.value.empty() || (cases.empty() && read.key != "==")) {
+      throw read.error("no value, or no case begins before");
+    }
+    if (read.key == "==") {
       cases.push_back({read.value, read.place, {}});
-    } else if (!inside) {
-      throw read.error("no case begins before");
-    } else if (std::ranges::find(keys, read.key) == keys.end()) {
-      throw read.error("no such key");
-    } else {
+    } else if (read.key.empty() && !cases.back().lines.empty()) {
+      cases.back().lines.back().value += line;
+    } else if (std::ranges::find(keys, read.key) != keys.end()) {
       cases.back().lines.push_back(read);
+    } else {
+      throw read.error("no such key");
     }
   }
-  if (cases.empty()) {
-    throw std::runtime_error(path + ": no cases");
-  }
-  return cases;
+  return cases.empty() ? throw std::runtime_error(path + ": no cases") : cases;
 }
 
 std::vector<std::string> caseFiles(const std::string &folder) {
@@ -151,10 +137,7 @@ std::vector<std::string> caseFiles(const std::string &folder) {
     }
   }
   std::ranges::sort(files);
-  if (files.empty()) {
-    throw std::runtime_error(folder + ": no case files");
-  }
-  return files;
+  return files.empty() ? throw std::runtime_error(folder + ": no case files") : files;
 }
 
 std::vector<std::string> split(const std::string &text, char separator) {

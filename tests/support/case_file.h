@@ -5,9 +5,8 @@
 //   key value
 //    that goes on here
 //
-// A key may occur several times. A line that begins with a blank is added to the one before. An empty
-// line ends a case. Whatever does not fit this is an error
-// that names the file and the line.
+// A key may occur several times. A line that begins with a blank is added to the one before. Anything
+// else is an error that names the file and the line.
 #pragma once
 
 #include <stdexcept>
@@ -24,7 +23,6 @@ struct CaseLine {
   // The value with its escapes decoded: \n \t \0 \\ \xHH, \uHHHH and \UHHHHHHHH (a unit in the
   // machine's byte order), \*COUNTc and \*COUNT(TEXT) (that many times).
   std::string bytes() const;
-  // The value as a number, in hex after 0x.
   long long number() const;
   // The value's two parts before and after the first separator.
   std::pair<std::string, CaseLine> split(const std::string &separator) const;

@@ -4,22 +4,22 @@
 
 #include "nls2.h"
 #include "sys1.h"
-#include "trc1.h"
 
+#include <algorithm>
 #include <atomic>
 #include <cstdarg>
 #include <cstdio>
-#include <cstdlib>
 #include <map>
 #include <mutex>
 
 namespace {
 
-std::mutex recordMutex;
-std::vector<std::string> recorded;
-bool recording = false;
+using Guard = std::lock_guard<std::mutex>;
 
-std::map<std::string, support::SeenFunction> seenFunctions;
+std::mutex recordMutex; // of these three
+std::vector<std::string> recorded;
+bool isRecording = false;
+std::map<std::string, support::SeenFunction> functions;
 
 // Every change of the flags changes this word, which anchors are pointed at by their first sync.
 std::atomic<uint32_t> currentFlags{0};
@@ -31,54 +31,50 @@ std::string nameOf(const TRC1_EntryBlock *anchor) {
   return {anchor->functionName, anchor->functionNameLength};
 }
 
-// Adds a line to the recording that is open, if any.
-void mark(const std::string &line) {
-  const std::lock_guard<std::mutex> guard(recordMutex);
-  if (recording) {
+void record(const std::string &line) {
+  const Guard guard(recordMutex);
+  if (isRecording) {
     recorded.push_back(line);
   }
-}
-
-void setFlags(uint32_t flags) {
-  currentFlags = flags;
-  __atomic_add_fetch(&hostSync, 1, __ATOMIC_RELAXED);
 }
 
 } // namespace
 
 namespace support {
 
-Recording::Recording(TraceFlags flags) {
-  const std::lock_guard<std::mutex> guard(recordMutex);
+Recording::Recording(uint32_t flags) {
+  const Guard guard(recordMutex);
   recorded.clear();
-  recording = true;
-  setFlags(flags);
+  isRecording = true;
+  currentFlags = flags;
+  changeSyncWord();
 }
 
 Recording::~Recording() {
-  const std::lock_guard<std::mutex> guard(recordMutex);
-  recording = false;
-  setFlags(traceOff);
+  const Guard guard(recordMutex);
+  isRecording = false;
+  currentFlags = 0;
+  changeSyncWord();
 }
 
 std::vector<std::string> Recording::lines() const {
-  const std::lock_guard<std::mutex> guard(recordMutex);
+  const Guard guard(recordMutex);
   return recorded;
 }
 
 SeenFunction seen(const std::string &function) {
-  const std::lock_guard<std::mutex> guard(recordMutex);
-  return seenFunctions[function];
+  const Guard guard(recordMutex);
+  return functions[function];
 }
 
-void changeSyncWord() { setFlags(currentFlags); }
+void changeSyncWord() { __atomic_add_fetch(&hostSync, 1, __ATOMIC_RELAXED); }
 
 } // namespace support
 
 uint32_t TRC1_Sync(TRC1_EntryBlock *anchor) {
   {
-    const std::lock_guard<std::mutex> guard(recordMutex);
-    support::SeenFunction &function = seenFunctions[nameOf(anchor)];
+    const Guard guard(recordMutex);
+    support::SeenFunction &function = functions[nameOf(anchor)];
     if (function.syncs++ == 0) {
       function.anchor = anchor;
       function.atFirstSync = *anchor;
@@ -95,8 +91,8 @@ uint32_t TRC1_Sync(TRC1_EntryBlock *anchor) {
 
 void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t line, uint32_t kind, ...) {
   if (kind == TRC1_EVENT_ENTRY) {
-    const std::lock_guard<std::mutex> guard(recordMutex);
-    seenFunctions[nameOf(anchor)].entryEventLine = line;
+    const Guard guard(recordMutex);
+    functions[nameOf(anchor)].entryEventLine = line;
   }
   std::string text = nameOf(anchor) + (kind == TRC1_EVENT_ENTRY ? "> entry" : "=");
   if (kind == TRC1_EVENT_EXIT_VALUE) {
@@ -105,22 +101,21 @@ void TRC1_Event(TRC1_EntryBlock *anchor, uint32_t line, uint32_t kind, ...) {
     text += " " + std::to_string(static_cast<int32_t>(va_arg(arguments, uint32_t)));
     va_end(arguments);
   }
-  mark(text);
+  record(text);
 }
 
 void TRC1_Printf(TRC1_EntryBlock *anchor, uint32_t /*line*/, const char *format, ...) {
-  char *line = nullptr;
+  char text[4096]; // no case has more
   va_list arguments;
   va_start(arguments, format);
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wformat-nonliteral"
-  const int length = vasprintf(&line, format, arguments);
+  const int length = std::min(vsnprintf(text, sizeof text, format, arguments), 4095);
 #pragma GCC diagnostic pop
   va_end(arguments);
-  const std::string text(line, static_cast<std::size_t>(length));
-  std::free(line);
-  mark(nameOf(anchor) + ": " +
-       (text.ends_with('\n') ? text.substr(0, text.size() - 1) : text + "(no newline)"));
+  const bool isLine = length > 0 && text[length - 1] == '\n';
+  text[isLine ? length - 1 : length] = '\0';
+  record(nameOf(anchor) + ": " + text + (isLine ? "" : "(no newline)"));
 }
 
 void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t /*line*/, const void *address, uint32_t length,
@@ -131,15 +126,15 @@ void TRC1_Dump(TRC1_EntryBlock *anchor, uint32_t /*line*/, const void *address, 
     std::snprintf(digits, sizeof digits, " %02X", static_cast<const unsigned char *>(address)[i]);
     text += digits;
   }
-  mark(zero == 0 ? text : text + " (last argument not 0)");
+  record(zero == 0 ? text : text + " (last argument not 0)");
 }
 
 void SYS1_GetLock(void *lock) {
   listMutex.lock();
-  mark(lock == &LocaleObjectList_Lock ? "host lock" : "host lock of another");
+  record(lock == &LocaleObjectList_Lock ? "host lock" : "host lock of another");
 }
 
 void SYS1_ReleaseLock(void *lock) {
-  mark(lock == &LocaleObjectList_Lock ? "host unlock" : "host unlock of another");
+  record(lock == &LocaleObjectList_Lock ? "host unlock" : "host unlock of another");
   listMutex.unlock();
 }

@@ -10,15 +10,13 @@
 
 namespace support {
 
-enum TraceFlags : uint32_t {
-  traceOff = 0,
-  traceDetail = 0x10,
-  traceEvents = 0x40,
-  traceAll = 0x50
-};
+constexpr uint32_t traceOff = 0;
+constexpr uint32_t traceDetail = TRC1_FLAG_DETAIL;
+constexpr uint32_t traceEvents = TRC1_FLAG_EVENTS;
+constexpr uint32_t traceAll = traceDetail | traceEvents;
 
-// Sets the flags that the library's functions see from here on and collects what they trace, until
-// it goes out of scope; outside of every Recording tracing is off. One at a time.
+// Sets the flags that the library's functions see and collects what they trace, until it goes out of
+// scope; outside of every Recording tracing is off. One at a time.
 //
 // A line is one trace call, written as
 //   NLS2_Name> entry            NLS2_Name= 37        NLS2_Name=
@@ -27,7 +25,7 @@ enum TraceFlags : uint32_t {
 // "host unlock".
 class Recording {
 public:
-  explicit Recording(TraceFlags flags);
+  explicit Recording(uint32_t flags);
   ~Recording();
   Recording(const Recording &) = delete;
   Recording &operator=(const Recording &) = delete;

@@ -4,7 +4,6 @@
 #include "support/recording_host.h"
 
 #include <algorithm>
-#include <cstring>
 #include <gtest/gtest.h>
 
 namespace {
@@ -21,13 +20,11 @@ int32_t translate(uint32_t options) {
                               options, &status);
 }
 
-// What the library does of each kind of flag; without the marks of the probe.
+// What the library traces with each kind of flag.
 std::vector<std::string> linesOf(uint32_t flags, uint32_t options) {
-  const Recording recording(static_cast<support::TraceFlags>(flags));
+  const Recording recording(flags);
   EXPECT_EQ(translate(options), options == 0 ? 3 : options == NLS2_STRING_FILL ? 16 : 0);
-  std::vector<std::string> lines = recording.lines();
-  std::erase_if(lines, [](const std::string &line) { return line.starts_with("icu "); });
-  return lines;
+  return recording.lines();
 }
 
 TEST(Frame, AnchorsAreAsTheLibraryDescribesItself) {
@@ -40,11 +37,10 @@ TEST(Frame, AnchorsAreAsTheLibraryDescribesItself) {
     const TRC1_EntryBlock &anchor = function.atFirstSync;
     ASSERT_GT(function.syncs, 0U);
     EXPECT_EQ(anchor.unit, seen("NLS2_TranslateString").atFirstSync.unit);
-    EXPECT_STREQ(anchor.functionName, name);
-    EXPECT_EQ(anchor.functionNameLength, std::strlen(name));
+    EXPECT_EQ(std::string(anchor.functionName), name);
+    EXPECT_EQ(anchor.functionNameLength, std::string(name).size());
     EXPECT_EQ(anchor.attributes, attributes);
-    EXPECT_EQ(anchor.entryLine, function.entryEventLine);
-    EXPECT_GT(anchor.entryLine, 0U);
+    EXPECT_TRUE(anchor.entryLine == function.entryEventLine && anchor.entryLine > 0);
     EXPECT_EQ(function.wordAtFirstSync, 1U);
     EXPECT_EQ(anchor.cachedFlags | anchor.cachedSync | anchor.reserved[0] | anchor.reserved[1], 0U);
   }
@@ -67,11 +63,11 @@ TEST(Frame, SyncsOnTheFirstCallAndWheneverTheWordHasChanged) {
   translate(0);
   const SeenFunction before = seen("NLS2_TranslateString");
   EXPECT_NE(before.anchor->sync, before.atFirstSync.sync) << "the host has moved the pointer";
-  const TRC1_EntryBlock settled = *before.anchor;
+  const uint32_t cached = before.anchor->cachedSync;
   translate(0);
   EXPECT_EQ(seen("NLS2_TranslateString").syncs, before.syncs);
-  EXPECT_EQ(before.anchor->cachedFlags, settled.cachedFlags);
-  EXPECT_EQ(before.anchor->cachedSync, settled.cachedSync) << "stored by the host alone";
+  EXPECT_EQ(before.anchor->cachedFlags, support::traceEvents);
+  EXPECT_EQ(before.anchor->cachedSync, cached) << "stored by the host alone";
   support::changeSyncWord();
   translate(0);
   translate(0);
@@ -89,7 +85,7 @@ TEST(Frame, EachKindOfLineHasItsFlagAndNoFlagChangesAResult) {
     EXPECT_TRUE(std::ranges::all_of(events, isEvent));
     EXPECT_TRUE(!details.empty() && std::ranges::none_of(details, isEvent));
     EXPECT_EQ(events.size() + details.size(), linesOf(support::traceAll, options).size());
-    EXPECT_TRUE(linesOf(~uint32_t{support::traceAll}, options).empty());
+    EXPECT_TRUE(linesOf(~support::traceAll, options).empty());
   }
 }
 
