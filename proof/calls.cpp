@@ -4,7 +4,6 @@
 
 #include "support/case_file.h"
 #include "support/dispatch.h"
-#include "support/functions.h"
 
 #include <nls2/translator.hpp>
 #include <regex>

@@ -3,9 +3,9 @@
 #include "support/call_cases.h"
 
 #include "support/case_file.h"
-#include "support/functions.h"
 #include "support/probe.h"
 #include "support/recording_host.h"
+#include "support/words.h"
 
 #include <algorithm>
 #include <gtest/gtest.h>

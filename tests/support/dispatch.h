@@ -104,41 +104,25 @@ struct Slot<const UResourceBundle *> : Slot<UResourceBundle *> {
 };
 
 // A result as the answer has it, by its name if it is a pointer. Handles are closed.
-template <class Number>
-std::string answered(const Words & /*words*/, Number result) {
-  return shown(result);
-}
-template <class Handle>
-std::string answered(const Words &words, Handle *result, const char *name,
-                     void (*close)(Handle *)) {
-  words.name(result, name);
-  close(result);
-  return shown(result);
-}
-inline std::string answered(const Words &words, UConverter *result) {
-  return answered(words, result, "converter", ucnv_close);
-}
-inline std::string answered(const Words &words, UFILE *result) {
-  return answered(words, result, "file", u_fclose);
-}
-inline std::string answered(const Words &words, UResourceBundle *result) {
-  return answered(words, result, "bundle", ures_close);
-}
-inline std::string answered(const Words &words, NLS2_Locale *result) {
-  words.made(result);
-  return shown(result);
-}
-inline std::string answered(const Words &words, const LocaleMapEntry *result) {
-  words.name(result, "row " + shown(result - localeMap));
-  return shown(result);
-}
-inline std::string answered(const Words &words, const char *result) {
-  words.name(result, result == nullptr ? "" : result);
-  return shown(result);
-}
-inline std::string answered(const Words &words, const UChar *result) {
-  std::string text;
-  words.name(result, icu::UnicodeString(result == nullptr ? u"" : result).toUTF8String(text));
+template <class Result>
+std::string answered(const Words &words, Result result) {
+  if constexpr (std::is_same_v<Result, UConverter *>) {
+    words.name(result, "converter");
+    ucnv_close(result);
+  } else if constexpr (std::is_same_v<Result, UFILE *>) {
+    words.name(result, "file");
+    u_fclose(result);
+  } else if constexpr (std::is_same_v<Result, UResourceBundle *>) {
+    words.name(result, "bundle");
+    ures_close(result);
+  } else if constexpr (std::is_same_v<Result, NLS2_Locale *>) {
+    words.made(result);
+  } else if constexpr (std::is_same_v<Result, const LocaleMapEntry *>) {
+    words.name(result, "row " + shown(result - localeMap));
+  } else if constexpr (std::is_pointer_v<Result>) { // a text
+    std::string text;
+    words.name(result, icu::UnicodeString(result).toUTF8String(text));
+  }
   return shown(result);
 }
 

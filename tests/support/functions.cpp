@@ -1,7 +1,5 @@
 // The table of all functions.
 
-#include "support/functions.h"
-
 #include "support/dispatch.h"
 
 namespace support {

@@ -86,6 +86,11 @@ std::string shown(const std::string &bytes);
 // "819 03480001 en_US": code page, language id, ICU's name.
 std::string shown(const NLS2_Locale &object);
 
+// Every function of the library by the name that it has in traces, and "lengths-by-byte": makes the
+// call and returns its answer.
+using Functions = std::map<std::string, std::string (*)(const Words &)>;
+const Functions &functions();
+
 // The text with pointers, in hex or as signed numbers, replaced by their names.
 std::string named(const std::string &text, const Names &names);
 
