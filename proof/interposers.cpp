@@ -130,7 +130,7 @@ using interpose::Call;
     return interpose::passedOn({#function, 0, CALLER}, error, [&] { return original arguments; }); \
   }
 #define CLOSING(function, Handle)                                                                  \
-  extern "C" void function(Handle *handle) {                                                       \
+  extern "C" void function(Handle handle) {                                                        \
     ORIGINAL(function)                                                                             \
     interpose::handles.remove(handle);                                                             \
     original(handle);                                                                              \
@@ -141,10 +141,10 @@ ICU(UConverter *, ucnv_open, (const char *name, UErrorCode *error), (name, error
 ICU(UConverter *, ucnv_openCCSID, (int32_t number, UConverterPlatform platform, UErrorCode *error), (number, platform, error))
 ICU(UCollator *, ucol_open, (const char *locale, UErrorCode *error), (locale, error))
 ICU(UResourceBundle *, ures_open, (const char *package, const char *locale, UErrorCode *error), (package, locale, error))
-CLOSING(ucnv_close, UConverter)
-CLOSING(ucol_close, UCollator)
-CLOSING(ures_close, UResourceBundle)
-CLOSING(u_fclose, UFILE)
+CLOSING(ucnv_close, UConverter *)
+CLOSING(ucol_close, UCollator *)
+CLOSING(ures_close, UResourceBundle *)
+CLOSING(u_fclose, UFILE *)
 ICU(void, u_init, (UErrorCode *error), (error))
 ICU(int32_t, ucnv_getCCSID, (const UConverter *with, UErrorCode *error), (with, error))
 ICU(const char *, ucnv_getName, (const UConverter *with, UErrorCode *error), (with, error))

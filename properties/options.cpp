@@ -60,6 +60,7 @@ void commandLine(property::Input &input) {
     at = end + 1;
   }
   std::vector<char *> argv;
+  argv.reserve(words.size() + 1);
   for (std::string &word : words) {
     argv.push_back(word.data());
   }

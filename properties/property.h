@@ -71,6 +71,11 @@ private:
   const uint8_t *end_;
 };
 
+// The text up to its first zero byte, and that.
+inline std::string terminated(const std::string &text) {
+  return text.substr(0, text.find('\0')) + '\0';
+}
+
 inline void check(bool holds, const char *what) {
   if (!holds) {
     std::fprintf(stderr, "property: does not hold: %s\n", what);

@@ -133,7 +133,7 @@ void inPlace(const NLS2_Locale *in, const std::string &text, int32_t room) {
 }
 
 void names(const std::string &text) {
-  const auto name = exact(text.c_str() + std::string(1, '\0'));
+  const auto name = exact(property::terminated(text));
   int32_t status = 0;
   NLS2_MapWindowsNameToCCSID(name.get(), &status);
   NLS2_LanguageIDFromShortPosixName(name.get(), &status);
@@ -145,7 +145,7 @@ void names(const std::string &text) {
 }
 
 void measureAndMap(const NLS2_Locale *in, const std::string &text, int32_t room) {
-  const auto terminated = exact(text.c_str() + std::string(1, '\0'));
+  const auto terminated = exact(property::terminated(text));
   const Output<char> mapped(static_cast<size_t>(room));
   int32_t status = 0;
   NLS2_Strlen(in, terminated.get(), 0, &status);

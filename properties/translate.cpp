@@ -125,8 +125,8 @@ void compare(const Request &request, int32_t destLen) {
   const std::string before(static_cast<size_t>(destLen) + (isLonger ? 1 : 0), '#');
   const property::Output<char> dest(before.size());
   std::copy(before.begin(), before.end(), dest.get());
-  const auto source = property::exact(
-      request.sourceLen < 0 ? request.bytes.c_str() + std::string(1, '\0') : request.bytes);
+  const auto source =
+      property::exact(request.sourceLen < 0 ? property::terminated(request.bytes) : request.bytes);
   int32_t consumed = -1;
   int32_t status = -1;
   const int32_t result =
