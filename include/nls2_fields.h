@@ -315,8 +315,7 @@ NLS2_API int32_t NLS2F_Find(NLS2F_Collator *collator, const void *text, int64_t 
 
 /* ---- Layouts and numbers --------------------------------------------------------------------- */
 
-/* Kinds of fields. */
-enum {
+enum { /* kinds of fields */
   NLS2F_TEXT = 0,
   NLS2F_RAW = 1,
   NLS2F_HEX = 2,
@@ -347,7 +346,6 @@ typedef struct NLS2F_Field {
 
 typedef struct NLS2F_Layout NLS2F_Layout;
 enum { NLS2F_LAYOUT_SHORT = 1, NLS2F_LAYOUT_WRITES = 2 }; /* options */
-
 /* Opens a layout: UTF-8, a line a field, # begins a comment. Bytes count from 1; a length alone
  * begins after the field before. KIND: text (if none), raw, hex, packed, zoned, binary, page:NAME.
  * OPTION: unsigned, blank=empty, sign=trailing|leading[-separate].
@@ -369,7 +367,7 @@ NLS2_API int32_t NLS2F_LayoutField(const NLS2F_Layout *layout, int64_t index, NL
 /* The number in the field's `bytes` as text, "-123.45": ASCII, `scale` decimals, at least one digit
  * before the point, no plus; -0 is 0. 34 bytes hold every number. And back: blanks and tabs around
  * it, a plus and fewer decimals are allowed; nothing is rounded or cut. Do not allocate. Status:
- * NLS2F_ERR_FIELD; 36 for a field that is no number, or whose kind has no such length or options. */
+ * NLS2F_ERR_FIELD; 36 for a field that is no number, or whose kind has no such length, options. */
 NLS2_API int32_t NLS2F_NumberToText(const NLS2F_Field *field, const void *bytes, char *text,
                                     int64_t room, int64_t *written, NLS2F_Problem *problem);
 NLS2_API int32_t NLS2F_TextToNumber(const NLS2F_Field *field, const char *text, int64_t length,
@@ -410,11 +408,11 @@ NLS2_API int32_t NLS2F_OpenWriter(const char *format, const NLS2F_Page *page, NL
 NLS2_API void NLS2F_CloseReader(NLS2F_Reader *reader);
 NLS2_API void NLS2F_CloseWriter(NLS2F_Writer *writer);
 
-/* Finds the records in a piece of the input. The next piece begins with what was not read, and is
- * longer if nothing was; `last` is 1 for the last one. The records are the same for all pieces.
- * `records` are places in the piece, without line ends and prefixes; `read` is the end of the last
- * one. Does not allocate. Status: NLS2F_ERR_FIELD if there is a problem and no record before it;
- * the problem's `record` and `offset` count from the beginning of the input. */
+/* Finds the records in a piece of the input: places without line ends and prefixes, the same ones
+ * for all pieces. `read` is the end of the last one. The next piece begins with what was not read,
+ * and is longer if nothing was. `last` is 1 for the last piece; it ends when a call finds no record.
+ * Does not allocate. Status: NLS2F_ERR_FIELD for a problem with no record before it; its `record`
+ * and `offset` count from the beginning of the input. */
 NLS2_API int32_t NLS2F_ReadRecords(NLS2F_Reader *reader, const void *piece, int64_t length,
                                    int32_t last, int64_t *read, NLS2F_Span *records,
                                    int64_t capacity, int64_t *count, NLS2F_Problem *problem);
