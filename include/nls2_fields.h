@@ -315,7 +315,7 @@ NLS2_API int32_t NLS2F_Find(NLS2F_Collator *collator, const void *text, int64_t 
 
 /* ---- Layouts and numbers --------------------------------------------------------------------- */
 
-enum { /* kinds of fields */
+enum {
   NLS2F_TEXT = 0,
   NLS2F_RAW = 1,
   NLS2F_HEX = 2,
@@ -410,8 +410,8 @@ NLS2_API void NLS2F_CloseWriter(NLS2F_Writer *writer);
 
 /* Finds the records in a piece of the input: places without line ends and prefixes, the same ones
  * for all pieces. `read` is the end of the last one. The next piece begins with what was not read,
- * and is longer if nothing was. `last` is 1 for the last piece; it ends when a call finds no record.
- * Does not allocate. Status: NLS2F_ERR_FIELD for a problem with no record before it; its `record`
+ * and is longer if nothing was. `last` is 1 for the last piece: call until no record is found. Does
+ * not allocate. Status: NLS2F_ERR_FIELD for a problem with no record before it; its `record`
  * and `offset` count from the beginning of the input. */
 NLS2_API int32_t NLS2F_ReadRecords(NLS2F_Reader *reader, const void *piece, int64_t length,
                                    int32_t last, int64_t *read, NLS2F_Span *records,
