@@ -7,6 +7,7 @@
 #include <map>
 #include <nls2.hpp>
 #include <tuple>
+#include <unicode/uchar.h>
 
 namespace {
 
@@ -94,6 +95,31 @@ void checkAgainstC(int32_t from, int32_t to, const Answer &answer, const std::st
         "the bytes of NLS2_TranslateString");
 }
 
+// With a padding, the text and as many blanks as there may be, converted by bare ICU as one.
+void checkPadding(const property::Page &from, const property::Page &to, const field_policy &policy,
+                  const Answer &answer, const std::string &field) {
+  std::u16string text = decode(from, field);
+  size_t end = text.size();
+  size_t blanks = 0;
+  for (; end > 0 && (text[end - 1] == 0 || u_isblank(text[end - 1]) != 0); --end) {
+    blanks += text[end - 1] != 0 ? 1 : 0;
+  }
+  text.resize(end);
+  if (text.find(u'\0') != text.npos) {
+    return check(answer.result.problem.kind() == problem_kind::embedded_null, "a null inside");
+  }
+  const bool fills = policy.padding == padding::fill;
+  blanks = fills ? policy.width : policy.padding == padding::strip ? 0 : blanks;
+  for (size_t tried = 0; tried <= blanks; ++tried) {
+    const std::u16string padded = text + std::u16string(fills ? tried : blanks - tried, u' ');
+    const std::string bytes = encode(to, padded);
+    if (fills ? bytes.size() == policy.width : policy.width == 0 || bytes.size() <= policy.width) {
+      return check(answer.result && answer.bytes == bytes, "text and blanks as bare ICU has them");
+    }
+  }
+  check(!answer.result, "no number of blanks fits");
+}
+
 field_policy policyFrom(property::Input &input) {
   constexpr padding paddings[] = {padding::as_is, padding::strip, padding::fill,
                                   padding::keep_blanks};
@@ -110,18 +136,14 @@ field_policy policyFrom(property::Input &input) {
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   property::Input input(data, size);
   const property::Page page = input.page();
+  const property::Page target = input.page();
   const int32_t from = page.number;
-  const int32_t to = input.page().number;
+  const int32_t to = target.number;
   const field_policy policy = policyFrom(input);
   const std::string field = input.text(page);
 
   if (made.size() > 2000) {
     made.clear();
-  }
-  if (std::getenv("FUZZ_SHOW") != nullptr) {
-    std::fprintf(stderr, "from %d to %d padding %d width %zu bad %d, %zu bytes\n", from, to,
-                 static_cast<int>(policy.padding), policy.width, static_cast<int>(policy.bad),
-                 field.size());
   }
   nls2::translator &fast = translator(from, to, policy);
   const size_t room = fast.max_size(field.size());
@@ -130,6 +152,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   const Answer slow = translated(fresh, field, room);
   check(same(answer.result, slow.result) && answer.bytes == slow.bytes, "what it learned is right");
   checkResult(answer, policy, field);
+  if (policy.padding != padding::as_is && policy.bad == on_bad::replace) {
+    checkPadding(page, target, policy, answer, field);
+  }
   std::string appended = "before";
   const field_result again = fast.translate(field, appended);
   check(same(again, answer.result) && appended == "before" + answer.bytes, "the string form");
