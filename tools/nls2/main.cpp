@@ -66,7 +66,7 @@ std::string generalHelp() {
     text += helpLine(entry.name, entry.summary);
   }
   return text + helpLine("help [COMMAND]", "Print this help, or the help of a command") +
-         helpLine("-h, --help", "The same; after a command, its help") +
+         helpLine("-h, --help", "Print this help; after COMMAND, its help") +
          helpLine("--version", "Print the library's build stamp") +
          "\nExit codes: 0 success, 1 a record or file failed, 2 wrong usage. For detect, compare and\n"
          "find, which answer a question: 0 yes, 1 no, 2 error.\nSee nls2(1).\n";

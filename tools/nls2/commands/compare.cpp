@@ -12,7 +12,7 @@ namespace {
 
 constexpr const char *notes =
     R"(Prints -1 if A sorts before B, 1 if B sorts before A, 0 if they are equal. Case, accents and
-punctuation count. A and B are in the code page.
+punctuation count. A and B are read in the code page.
 Exit codes: 0 equal, 1 not equal, 2 error.
 )";
 

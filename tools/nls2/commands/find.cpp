@@ -15,9 +15,9 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(PATTERN is plain text in UTF-8, whatever the code page of the files; an empty one is in every line.
-Lines end in the code page's line feed (U+000A) and are printed in the code page. A line with invalid
-bytes ends the search of its file; the other files are still searched.
+    R"(PATTERN is plain text in UTF-8, whatever the code page of the files; an empty one matches every
+line. Lines end in the code page's line feed (U+000A) and are printed in the code page. A line with
+invalid bytes ends the search of its file; the other files are still searched.
 Exit codes: 0 found, 1 not found, 2 error.
 )";
 
@@ -67,11 +67,12 @@ public:
       : decoder_(arguments.locale.codepage),
         encoder_(code_page(utf8Page), code_page(arguments.locale.codepage),
                  {.bad = on_bad::replace}),
-        ignoreCase_(arguments.ignoreCase), pattern_(decodedPattern(arguments.pattern)) {
+        ignoreCase_(arguments.ignoreCase),
+        folding_(hasDotlessI(arguments.locale) ? U_FOLD_CASE_EXCLUDE_SPECIAL_I
+                                               : U_FOLD_CASE_DEFAULT),
+        pattern_(decodedPattern(arguments.pattern)) {
     requireCharacters(arguments.pattern, arguments.locale.codepage);
     if (ignoreCase_) {
-      folding_ =
-          hasDotlessI(arguments.locale) ? U_FOLD_CASE_EXCLUDE_SPECIAL_I : U_FOLD_CASE_DEFAULT;
       pattern_ = folded(pattern_);
     } else if (decoder_.isUtf8()) {
       utf8Pattern_ = arguments.pattern;
@@ -117,7 +118,7 @@ private:
   Decoder decoder_;
   translator encoder_;
   const bool ignoreCase_;
-  uint32_t folding_ = 0; // U_FOLD_CASE_*
+  const uint32_t folding_; // U_FOLD_CASE_*
   std::u16string pattern_;
   std::string utf8Pattern_; // if ASCII lines may be searched as bytes; else empty
   std::u16string folded_;   // the last line

@@ -16,8 +16,8 @@ namespace {
 
 constexpr const char *notes =
     R"(Case, accents and punctuation count; equal lines keep their order. Lines end in the code page's line
-feed (U+000A); the last line gets one if it has none. A line with invalid bytes is an error, and then
-nothing is written. All lines are kept in memory. OUT may be one of the FILEs.
+feed (U+000A); the last line gets one if it has none. If a line has invalid bytes, nothing is
+written. All lines are kept in memory. OUT may be one of the FILEs.
 )";
 
 struct Arguments {

@@ -140,7 +140,8 @@ std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> ow
   const auto takeLocale = [&](const std::string &text) { options.locale = parseLocale(text); };
   own.insert(
       own.begin(),
-      {value("locale", "LOCALE", "whose rules apply: a name or id from `nls2 locales`", takeLocale),
+      {value("locale", "LOCALE", "locale whose rules apply: a name or id from `nls2 locales`",
+             takeLocale),
        pageValue("codepage", "code page of all texts; 1208 (UTF-8) by default", options.codepage)});
   return own;
 }
