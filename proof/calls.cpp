@@ -12,7 +12,7 @@ namespace proof {
 
 namespace {
 
-// A short field, one longer than the buffer that a translator begins with, and the short one again.
+// A short field, one that is longer than a new translator's buffer, and the short one again.
 std::string translateFields(const support::Words &words) {
   const nls2::field_policy policy{.padding = static_cast<nls2::padding>(words.number(1)),
                                   .width = 8000,

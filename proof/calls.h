@@ -1,4 +1,4 @@
-// A call of each exported function on a short input, for the programs that sweep and stress.
+// A call of each exported function on a short input, for library_faults and stress.
 #pragma once
 
 #include "nls2.h"
@@ -13,9 +13,9 @@ struct Call {
   std::string text;
   std::string onFailure;
 
-  // The answer. `in` is the object that the word "given" stands for.
+  // Makes the call and returns its answer. The word "given" means the object `in`.
   std::string make(NLS2_Locale *in) const;
-  // Whether it is the answer of a failure, with a status that the header documents.
+  // Whether this is the answer after a failure, with a documented status.
   bool isFailure(const std::string &answer) const;
 };
 

@@ -9,7 +9,7 @@
 
 namespace proof {
 
-// For a signal handler: the call of ICU's that crashed, the outermost one; without one, "the program".
+// For signal handlers: the outermost ICU function that was running, or "the program".
 inline const char *crashedCall() {
   void *frames[64];
   const int count = backtrace(frames, 64);
@@ -28,7 +28,7 @@ inline const char *crashedCall() {
   return call != nullptr ? call : "the program";
 }
 
-// The handler is called with the signal, and ends with it.
+// Reports a crash; then the signal ends the program as usual.
 template <void (*report)(const char *call)>
 void watchCrashes() {
   void *frame[1];

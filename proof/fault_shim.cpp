@@ -1,10 +1,10 @@
-// Loaded before a program, makes one of its calls fail, or all from one on. Counting begins at
-// main(), so that loaders and libraries start in peace.
+// Preloaded into a program, makes one of its calls fail, or all calls from one on. Counting begins at
+// main(), so that the loader and static objects are not affected.
 //
 //   FAULT_KIND  heap, icu, open, read, write, close, fsync, rename or link
 //   FAULT_AT    which call fails, from 1; FAULT_ON=1: that one and all that follow
-//   FAULT_HOW   the errno, or 0 for a short count; of icu the status
-//   FAULT_LOG   receives "reached" once a fault was injected, and the call of ICU's that crashed
+//   FAULT_HOW   the errno, or 0 for a short count; for icu the status
+//   FAULT_LOG   receives "reached" when a fault is injected, and the ICU function that crashed
 
 #include "crash.h"
 #include "interposers.h"
@@ -77,7 +77,7 @@ Function *next(Function * /*same*/, const char *name) {
 } // namespace
 
 bool interpose::refuses(const Call &call, UErrorCode *error) {
-  const bool cannotFail = std::strncmp(call.function, "ucnv_get", 8) == 0; // wants no memory
+  const bool cannotFail = std::strncmp(call.function, "ucnv_get", 8) == 0; // it allocates nothing
   const bool isRefused = !cannotFail && fails(error == nullptr ? "heap" : "icu");
   if (isRefused && error != nullptr) {
     *error = static_cast<UErrorCode>(how);

@@ -1,4 +1,4 @@
-// The functions in front of the heap's and ICU's.
+// Definitions of the heap's and ICU's functions that come before the libraries' own.
 
 #include "interposers.h"
 
@@ -22,7 +22,7 @@ namespace interpose {
 
 namespace {
 
-// Addresses, few at a time: what finds no place is not counted.
+// A few addresses. When it is full, more are not counted.
 class Ledger {
 public:
   void add(const void *address) { replace(nullptr, address); }
@@ -82,7 +82,7 @@ Result taken(const Call &call, Result result) {
   return result;
 }
 
-// A call of ICU's, which does nothing after a failure.
+// Calls ICU's function, unless it is to fail. After a failure ICU's functions do nothing.
 template <class Original>
 auto passedOn(const Call &call, UErrorCode *error, Original original) {
   using Result = decltype(original());
@@ -183,7 +183,7 @@ extern "C" UFILE *u_fopen(const char *name, const char *mode, const char *locale
 }
 
 #if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__) && !defined(FOREIGN_HEAP)
-// Under their other names: dlsym may allocate itself.
+// libc's other names for them: dlsym itself may allocate.
 // NOLINTBEGIN(bugprone-reserved-identifier,readability-identifier-naming)
 extern "C" void *__libc_malloc(size_t size) noexcept;
 extern "C" void *__libc_calloc(size_t count, size_t size) noexcept;

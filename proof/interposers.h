@@ -1,5 +1,5 @@
-// Functions in front of the heap's and ICU's, which a program lets fail and counts. Linking them into
-// a program, or loading them before it, puts them before libc's and ICU's own.
+// Replaces functions of the heap and of ICU, to count them and let them fail. A program links these
+// definitions or preloads them.
 #pragma once
 
 #include <cstddef>
@@ -9,20 +9,20 @@ namespace interpose {
 
 struct Call {
   const char *function; // "malloc", "ucnv_open"
-  std::size_t size;     // how many bytes a function of the heap is to give; 0 for ICU's
-  const void *caller;   // the address it returns to
+  std::size_t size;     // bytes requested from the heap; 0 for ICU
+  const void *caller;   // the return address
 };
 
-// The program defines these two. Whether this call fails: a function of the heap's has no `error`, for
-// one of ICU's it may be set.
+// The program defines these two. The first decides whether a call fails. For the heap `error` is null;
+// for ICU it is where the status goes.
 bool refuses(const Call &call, UErrorCode *error);
-// Somebody has opened a handle of ICU's, or null if that failed.
+// An ICU handle was opened; null if that failed.
 void opened(const void *handle);
 
-// Whether a call comes from libzelnls2 itself.
+// Whether libzelnls2 made a call.
 bool isLibrarys(const void *caller);
 
-// Blocks that the library has asked for and not given back, and handles of ICU that are open.
+// Blocks that the library allocated and did not free, and open ICU handles.
 struct Held {
   long blocks = 0;
   long handles = 0;

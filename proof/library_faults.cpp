@@ -1,9 +1,9 @@
-// Lets the nth heap request or the nth call of ICU fail in a call of each exported function, for
-// every n until a run has no fault: library_faults. Each run is a process of its own, cold (ICU
-// has loaded nothing) or warm.
+// Makes the nth heap request or the nth ICU call fail during a call of each exported function, for n = 1,
+// 2, ... until no fault occurs: library_faults. Each run is a separate process, cold (ICU has loaded
+// nothing yet) or warm.
 //
-// After a fault the answer must be the usual one or a documented failure's, and nothing of the
-// library's may be left behind but what the header calls a leak.
+// After a fault the answer must be the usual one or that of a documented failure, and the library may
+// leave nothing behind except the leaks that the header documents.
 
 #include "calls.h"
 #include "crash.h"
@@ -26,12 +26,12 @@ enum ExitCode { noFault = 10, absorbed, reported, wrong, leaked };
 
 enum class Kind { none, heap, icu };
 Kind armed = Kind::none;
-Kind kind = Kind::none; // is armed during each call of the library's
+Kind kind = Kind::none; // armed during calls of the library
 long toFault = 0;
 
 void arm(bool isBefore) { armed = isBefore ? kind : Kind::none; }
 
-// Where a crash was, for the process that started the one that crashed.
+// Where a child process crashed.
 char *const crash = static_cast<char *>(
     mmap(nullptr, 64, PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0));
 
@@ -42,7 +42,7 @@ NLS2_Locale *makeLocale() {
   return NLS2_GetLocale(0x01140002, 819, 0, &status); // German
 }
 
-// In a process of its own. Never returns.
+// Runs in a child process. Never returns.
 [[noreturn]] void runOnce(const Call &call, const std::string &usual, Kind of, long at, bool warm) {
   alarm(20);
   NLS2_Locale *in = makeLocale();
@@ -74,7 +74,7 @@ NLS2_Locale *makeLocale() {
   _exit(wrong);
 }
 
-// The answer without a fault, from a process of its own, so that ICU stays without its data here.
+// The answer without a fault. A child process makes the call, so that ICU stays cold here.
 std::string usualAnswer(const Call &call) {
   std::array<int, 2> ends{};
   if (pipe(ends.data()) != 0) {
@@ -121,7 +121,7 @@ void sweep(const Call &call, const std::string &usual, Kind of, bool warm, Total
     if (code == absorbed || code == reported) {
       ++(code == absorbed ? totals.absorbed : totals.reported);
     } else if (WIFSIGNALED(status) && std::string(crash).starts_with("ucol_open_")) {
-      ++totals.crashedInIcu; // its loader does not look at every allocation (ICU 72)
+      ++totals.crashedInIcu; // its loader does not check every allocation (ICU 72)
     } else {
       ++totals.wrong;
       std::printf("WRONG: %s, %s %ld, %s: %s %d %s\n", call.text.c_str(),

@@ -1,8 +1,8 @@
 // Eight threads call every function, half of them on one shared object, half on objects of their own:
 // stress SECONDS [cancel]
 //
-// With "cancel" the threads are cancelled at random, as pthread_cancel does it by default, and new
-// ones take their places. The program is meant for the thread sanitizer.
+// With "cancel", threads are cancelled at random at cancellation points, and new ones replace them. Run
+// it under the thread sanitizer.
 
 #include "calls.h"
 #include "support/dispatch.h"
@@ -41,7 +41,7 @@ void expect(bool holds, const char *what) {
   }
 }
 
-// Every function, with the answer that it had when it was alone.
+// Calls every function and expects the answer from before the threads began.
 void callAll(NLS2_Locale *in) {
   for (size_t i = 0; i < proof::calls().size(); ++i) {
     const proof::Call &call = proof::calls()[i];
@@ -50,7 +50,7 @@ void callAll(NLS2_Locale *in) {
   }
 }
 
-// What the program does itself is not cancelled: its destructors may not be.
+// Only calls of the library may be cancelled, because destructors must not be.
 void allowCancel(bool isAllowed) {
   pthread_setcancelstate(isAllowed ? PTHREAD_CANCEL_ENABLE : PTHREAD_CANCEL_DISABLE, nullptr);
 }

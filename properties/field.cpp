@@ -19,7 +19,7 @@ using nls2::padding;
 using nls2::problem_kind;
 using property::check;
 
-// Translators live from one input to the next, so that a state left behind shows.
+// Translators are kept for later inputs, so that state left behind shows.
 using Key = std::tuple<int32_t, int32_t, int, size_t, int>;
 std::map<Key, nls2::translator> made;
 
@@ -70,7 +70,7 @@ void checkResult(const Answer &answer, const field_policy &policy, const std::st
   }
 }
 
-// Room to the byte is enough, and a byte less is not.
+// Exactly enough room succeeds, and one byte less fails.
 void checkRoom(nls2::translator &with, const Answer &answer, const std::string &field) {
   const Answer tight = translated(with, field, answer.bytes.size());
   check(same(tight.result, answer.result) && tight.bytes == answer.bytes, "room to the byte");
@@ -80,7 +80,7 @@ void checkRoom(nls2::translator &with, const Answer &answer, const std::string &
   }
 }
 
-// With options 0 the C interface gives the same bytes.
+// NLS2_TranslateString with options 0 writes the same bytes.
 void checkAgainstC(int32_t from, int32_t to, const Answer &answer, const std::string &field) {
   if (field.empty()) {
     return;
@@ -95,7 +95,7 @@ void checkAgainstC(int32_t from, int32_t to, const Answer &answer, const std::st
         "the bytes of NLS2_TranslateString");
 }
 
-// With a padding, the text and as many blanks as there may be, converted by bare ICU as one.
+// With padding: bare ICU converts the text together with every possible number of blanks.
 void checkPadding(const property::Page &from, const property::Page &to, const field_policy &policy,
                   const Answer &answer, const std::string &field) {
   std::u16string text = decode(from, field);

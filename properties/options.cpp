@@ -12,7 +12,7 @@ namespace {
 using property::check;
 using namespace nls2::tool;
 
-// Any bytes, or pieces of what the command takes.
+// Any bytes, or words that the command knows.
 std::string line(property::Input &input, const std::vector<const char *> &pieces) {
   if (input.flag()) {
     return input.bytes(SIZE_MAX);
@@ -44,7 +44,7 @@ void fieldList(property::Input &input) {
   }
 }
 
-// Arguments are what lies between line feeds. Nothing is run.
+// Line feeds separate arguments. No command runs.
 void commandLine(property::Input &input) {
   constexpr Command (*commands[])() = {catCommand,  codepagesCommand, compareCommand,
                                        dumpCommand, detectCommand,    findCommand,

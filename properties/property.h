@@ -1,5 +1,5 @@
-// What the properties share: choices from the bytes of an input, texts, outputs of an exact size, and
-// a check that ends the run.
+// Shared by the properties: choices from an input's bytes, texts, outputs of an exact size, and a check
+// that ends the run.
 #pragma once
 
 #include "support/exact.h"
@@ -14,7 +14,7 @@
 #include <sanitizer/asan_interface.h>
 #include <string>
 
-// The property: does not return if it does not hold.
+// The property. It aborts if it does not hold.
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size);
 
 namespace property {
@@ -22,7 +22,7 @@ namespace property {
 using support::exact;
 using support::Page;
 
-// Takes an input apart. After its last byte every choice is the first one.
+// Makes choices from the bytes of an input. After the last byte every choice is the first one.
 class Input {
 public:
   Input(const uint8_t *data, size_t size) : at_(data), end_(data + size) {}
@@ -71,7 +71,7 @@ private:
   const uint8_t *end_;
 };
 
-// The text up to its first zero byte, and that.
+// The text up to and including its first zero byte.
 inline std::string terminated(const std::string &text) {
   return text.substr(0, text.find('\0')) + '\0';
 }
@@ -83,8 +83,8 @@ inline void check(bool holds, const char *what) {
   }
 }
 
-// An output of exactly `size` units. A sanitizer sees the library's accesses past it at once; ICU is
-// not instrumented, so what it writes there shows at the end.
+// An output of exactly `size` units. A sanitizer reports an access past it by the library at once;
+// ICU is not instrumented, so its writes there show at the end.
 template <class Unit>
 class Output {
 public:

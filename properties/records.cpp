@@ -1,5 +1,4 @@
-// The readers of records and of lines: whatever is in a file, all of it comes back, in order, cut
-// where it must be.
+// The readers of records and lines: all bytes of a file come back, in order, divided correctly.
 
 #include "base/errors.h"
 #include "property.h"
@@ -14,7 +13,7 @@ namespace {
 using property::check;
 using namespace nls2::tool;
 
-// A file in memory, by a name that opens it.
+// A file in memory, with a path that opens it.
 class File {
 public:
   explicit File(const std::string &bytes) : fd_(memfd_create("property", 0)) {

@@ -1,4 +1,4 @@
-// Runs a property on random inputs, always the same: replay [COUNT [FIRST]]
+// Runs a property on random inputs from fixed seeds: replay [COUNT [FIRST]]
 
 #include "property.h"
 

@@ -1,5 +1,5 @@
-// Every function that takes a text, on blocks of exactly the text's size; the conversions between a
-// code page and UTF-8 or UTF-16 give what the same calls of bare ICU give.
+// All functions that take a text, on blocks of exactly its size. Conversions between a code page and
+// UTF-8 or UTF-16 agree with the same calls of bare ICU.
 
 #include "nls2.h"
 #include "property.h"
@@ -28,8 +28,8 @@ NLS2_Locale *localeIn(Input &input, int32_t page) {
   return chosen;
 }
 
-// Both calls take (target, capacity, status) and agree on all of it, up to two units more than the
-// whole takes. `untouched` is the status of a success.
+// Both calls take (target, capacity, status) and agree for every capacity up to two units more than
+// needed. `untouched` is the status after a success.
 template <class Unit, class Library, class Icu>
 void compare(int32_t untouched, int32_t room, Library library, Icu icu) {
   UErrorCode error = U_ZERO_ERROR;
@@ -114,7 +114,7 @@ void compareAndFind(const NLS2_Locale *in, const std::string &one, const std::st
         NLS2_Findstr(in, first.get(), firstSize, second.get(), secondSize, options);
     check(found >= -1 && found <= 1, "an answer of Findstr");
   }
-  // A walk over UTF-8 characters may go up to 3 bytes on, which must be there to read.
+  // A walk over UTF-8 characters may read up to 3 bytes more.
   const auto walked = exact(one + std::string(4, '\0'));
   int32_t status = 0;
   NLS2_Strcoll(in, walked.get(), -1, walked.get(), firstSize, CHARBASED, &status);

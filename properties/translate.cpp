@@ -1,4 +1,4 @@
-// NLS2_TranslateString, all options and capacities, against the rules of its header over bare ICU.
+// NLS2_TranslateString with all options and capacities, compared with nls2.h's rules over bare ICU.
 
 #include "nls2.h"
 #include "property.h"
@@ -49,8 +49,8 @@ Outcome direct(const Request &request, const std::string &source, int32_t destLe
   return {result, 0, static_cast<int32_t>(source.size()), dest};
 }
 
-// Measures and writes with the room that the rules give, since ICU may measure a text too short: in
-// ISCII, one that begins with a substitution.
+// Measures and writes with the same room as the library, because ICU may measure a text too short, such
+// as ISCII that begins with a substitution.
 Outcome shaped(const Request &request, const std::string &source, int32_t destLen,
                std::string dest) {
   const auto from = open(request.source);
@@ -75,7 +75,7 @@ Outcome shaped(const Request &request, const std::string &source, int32_t destLe
   work.resize(end);
   work.resize(static_cast<size_t>(std::max(measured, destLen)) + 1);
   const auto text = static_cast<int32_t>(work.find(u'\0'));
-  const auto put = [&](int32_t units, int32_t room) { // ICU takes -1 for all up to a null
+  const auto put = [&](int32_t units, int32_t room) { // -1: up to the first null
     error = U_ZERO_ERROR;
     return ucnv_fromUChars(to.getAlias(), dest.data(), room, work.data(), units, &error);
   };
@@ -120,7 +120,7 @@ Outcome expected(const Request &request, int32_t destLen, const std::string &des
 }
 
 void compare(const Request &request, int32_t destLen) {
-  // On the direct path the second zero byte of a terminator goes past destLen.
+  // On the direct path a terminator's second zero byte may go past destLen.
   const bool isLonger = isDirect(request.options) && request.dest.terminator == 2;
   const std::string before(static_cast<size_t>(destLen) + (isLonger ? 1 : 0), '#');
   const property::Output<char> dest(before.size());
@@ -134,18 +134,18 @@ void compare(const Request &request, int32_t destLen) {
                            source.get(), request.sourceLen, &consumed, request.options, &status);
   const Outcome right = expected(request, destLen, before);
   if (status == U_BUFFER_OVERFLOW_ERROR && right.status == 0 && right.result == destLen) {
-    return; // ICU asks for room for characters left over that take no bytes
+    return; // ICU wants room for pending characters that take no bytes
   }
   check(status == right.status, "status");
   check(result == right.result, "result");
   check(consumed == right.consumed, "bytes consumed");
   for (size_t i = 0; status == 0 && i < before.size(); ++i) {
-    // ICU's Latin-1 converter uses the room after its output to try what comes next.
+    // ICU's Latin-1 converter may change the room after its output.
     check(right.dest[i] == '#' || dest.get()[i] == right.dest[i], "bytes");
   }
 }
 
-// Every padding, with other bits that are ignored beside it, and what is refused.
+// Every padding, also with bits that are ignored, and options that are refused.
 constexpr uint32_t optionSets[] = {0,      8,      0x100,  0x108,  0x200,  0x208,  0x300,   0x308,
                                    0x4000, 0x4008, 0x4100, 0x4308, 0x1201, 0x4029, 0x40001, 1};
 
@@ -161,7 +161,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   request.bytes = input.text(from);
   request.sourceLen =
       length == 0 ? static_cast<int32_t>(request.bytes.size()) : -static_cast<int32_t>(length);
-  // A little more than all of it takes, and everything below that.
+  // All capacities up to a little more than needed.
   const size_t whole = encode(request.dest, decode(from, request.bytes)).size() + 4;
   for (int32_t destLen = 0; destLen <= static_cast<int32_t>(whole) && whole <= 80; ++destLen) {
     compare(request, destLen);

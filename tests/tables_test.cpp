@@ -1,4 +1,4 @@
-// The tables of the library: the two that callers see are frozen, and named pages open by their names.
+// The tables: two are public and frozen; the third maps numbers to ICU names.
 
 #include "nls2.h"
 #include "support/pages.h"

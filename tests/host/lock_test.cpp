@@ -1,4 +1,4 @@
-// The default lock, which lives in 28 bytes of its caller's.
+// The default lock, in 28 bytes of the caller's memory.
 
 #include "sys1.h"
 
@@ -12,7 +12,7 @@
 
 namespace {
 
-// A lock as the library holds one, with bytes around it that are not the service's.
+// A lock like the library's, between bytes that must not change.
 struct GuardedLock {
   alignas(uint32_t) char before[16], lock[SYS1_LOCK_SIZE], after[16];
 

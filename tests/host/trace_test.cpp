@@ -1,4 +1,4 @@
-// The default trace facility, as a program's environment asks for it.
+// The default trace facility, set up by environment variables.
 
 #include "nls2.h"
 #include "trc1.h"
@@ -28,7 +28,7 @@ void callLibrary() {
   NLS2_MapWindowsNameToCCSID("windows-936", &status);
 }
 
-// Whatever the library may ask for, asked directly.
+// Everything that the library may call, called directly.
 void callHost() {
   TRC1_Printf(&anchor, 31, "%s, %d\n", "two\nlines", -5);
   TRC1_Event(&anchor, 32, TRC1_EVENT_EXIT_VALUE, 0xFFFFFFFDU);
@@ -50,9 +50,9 @@ void callFromThreads() {
   }
 }
 
-// A thread that is cancelled while it writes a line leaves the stream to the others.
+// If a thread is cancelled while it writes a line, other threads can still write.
 void callCancelled() {
-  alarm(30); // a stream that stays locked would make the next line wait for ever
+  alarm(30); // if the stream stayed locked, the next line would wait for ever
   std::jthread([] {
     pthread_cancel(pthread_self());
     TRC1_Printf(&anchor, 50, "held back\n");
@@ -64,8 +64,8 @@ void callCancelled() {
 
 using Action = void (*)();
 
-// Both standard streams of a process with these two settings, or without those that are null: its
-// trace flags, and what the action writes.
+// Runs the action in a process with these settings (null: unset). Returns everything that it writes:
+// the trace flags and then the trace.
 std::string run(const char *trace, const char *file, Action action) {
   std::array<int, 2> ends{};
   EXPECT_EQ(pipe(ends.data()), 0);
@@ -100,13 +100,13 @@ std::string contentOfFile() {
   return text;
 }
 
-// Time and thread, as every line begins.
+// Every line begins with the time and the thread.
 const std::string head =
     "[0-9]{4}-[0-9]{2}-[0-9]{2}T[0-9]{2}:[0-9]{2}:[0-9]{2}\\.[0-9]{6}Z [0-9]+ ";
 const std::string name = head + "NLS2_MapWindowsNameToCCSID:[0-9]+ ";
 const std::string entry = name + "entry\n";
 const std::string leave = name + "exit 936 \\(0x000003A8\\)\n";
-const std::string off = "0 0 7\n"; // the flags, and those that are stored with the sync word
+const std::string off = "0 0 7\n"; // the flags, the stored flags and the stored sync word
 const std::string events = "40 40 7\n";
 const std::string locate = name + "Locate matching windows codepage name to windows-936\\.\n";
 const std::string found = name + "Found matching name windows-936 in the table\\.\n";

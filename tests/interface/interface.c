@@ -1,4 +1,4 @@
-/* The interface as C sees it: the layout of the records that a host shares, every name, and calls. */
+/* The interface in C: layouts of records, all names, and some calls. */
 
 #include "nls2.h"
 #include "sys1.h"
@@ -30,7 +30,7 @@ HOLDS(sizeof(TRC1_EntryBlock) == (W == 8 ? 56 : 40) && AT(TRC1_EntryBlock, funct
       AT(TRC1_EntryBlock, cachedFlags, 12 + 3 * W) && AT(TRC1_EntryBlock, cachedSync, 16 + 3 * W) &&
       AT(TRC1_EntryBlock, reserved, 20 + 3 * W));
 
-/* Every function: the program links only if each has its name in C. */
+/* All functions: the program links only if each has C linkage. */
 typedef void (*Function)(void);
 #define F(name) (Function) name
 extern const Function functions[];

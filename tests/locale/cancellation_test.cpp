@@ -14,8 +14,7 @@
 
 namespace {
 
-// The trace call of the thread at which it is cancelled; not yet counted down to 0 afterwards if
-// it made fewer.
+// Counts down the thread's trace calls; at 0 it is cancelled. Above 0 at the end: there were fewer.
 std::atomic<int> callsLeft{0};
 
 void mayBeCancelled() {
@@ -27,7 +26,7 @@ void mayBeCancelled() {
 
 void *makeAndRelease(void *) {
 #if defined(__SANITIZE_ADDRESS__)
-  __lsan_disable(); // what a cancelled thread has made and not yet put on the list is lost
+  __lsan_disable(); // a cancelled thread loses an object that is not on the list yet
 #endif
   int32_t status = 0;
   NLS2_Locale *pLocale = NLS2_GetLocale(0x03480001, 37, 0, &status);
@@ -43,7 +42,7 @@ void TRC1_Printf(TRC1_EntryBlock *, uint32_t, const char *, ...) { mayBeCancelle
 void TRC1_Dump(TRC1_EntryBlock *, uint32_t, const void *, uint32_t, uint32_t) { mayBeCancelled(); }
 
 TEST(Cancellation, AtAnyTraceCallLeavesTheListUnlocked) {
-  alarm(30); // a lock that stays held would make the next call wait for ever
+  alarm(30); // if the lock stayed held, the next call would wait for ever
   void *result = PTHREAD_CANCELED;
   int calls = 0;
   while (result == PTHREAD_CANCELED) {
@@ -51,10 +50,10 @@ TEST(Cancellation, AtAnyTraceCallLeavesTheListUnlocked) {
     pthread_t thread{};
     ASSERT_EQ(pthread_create(&thread, nullptr, makeAndRelease, nullptr), 0);
     ASSERT_EQ(pthread_join(thread, &result), 0);
-    // Held back inside the lock, it is acted upon at the next trace call.
+    // Inside the lock it is delayed until the next trace call.
     EXPECT_EQ(result == PTHREAD_CANCELED, callsLeft <= 0) << "cancelled at trace call " << calls;
     callsLeft = 0;
-    while (pLocaleObjectList != nullptr) { // what the thread made and did not release
+    while (pLocaleObjectList != nullptr) { // made by the thread and not released
       ASSERT_EQ(NLS2_ReleaseLocale(pLocaleObjectList), 0);
     }
   }

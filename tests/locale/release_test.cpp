@@ -1,4 +1,4 @@
-// Locale objects that two threads release.
+// Two threads release the same locale object.
 
 #include "nls2.h"
 #include "support/recording_host.h"

@@ -44,7 +44,7 @@ void apply(Settings &settings, const std::string &key, const std::string &value)
   }
 }
 
-// What a sanitizer's heap neither refuses nor counts is left out.
+// A sanitizer's heap cannot fail and is not counted, so such cases are left out.
 bool canHappen(const Settings &settings, const std::string &expected) {
   return interpose::heapIsOurs ||
          (expected.find("blocks left") == expected.npos &&
@@ -53,7 +53,7 @@ bool canHappen(const Settings &settings, const std::string &expected) {
           }));
 }
 
-// Names those live objects by the next letters that have no name yet, and describes the lettered.
+// Gives letters to live objects without a name, and describes all objects that have letters.
 std::string listed(Names &names) {
   std::string text;
   for (const NLS2_Locale *node = pLocaleObjectList; node != nullptr; node = node->pNext) {
@@ -67,7 +67,7 @@ std::string listed(Names &names) {
   return text;
 }
 
-// What the library holds beside the objects on its list.
+// What the library holds, not counting the objects on its list.
 interpose::Held heldNow() {
   interpose::Held held = interpose::held();
   for (const NLS2_Locale *node = pLocaleObjectList; node != nullptr; node = node->pNext) {
@@ -88,7 +88,7 @@ std::string leftBehind(const interpose::Held &before) {
   return text;
 }
 
-// The trace of `function` as a case has it, what it calls folded.
+// The trace of `function` as a case shows it, with calls of other functions folded.
 std::vector<std::string> folded(const std::string &function,
                                 const std::vector<std::string> &lines) {
   std::vector<std::string> own;
@@ -121,7 +121,7 @@ std::vector<std::string> folded(const std::string &function,
   return own;
 }
 
-// The lines joined by blanks; at their end the answer, and what was left behind.
+// The lines joined by blanks, with the answer at the end.
 std::string joined(std::vector<std::string> lines, std::string answer) {
   if (!lines.empty()) {
     const bool isValue = "= " + answer.substr(0, answer.find(',')) == lines.back();
@@ -135,7 +135,7 @@ std::string joined(std::vector<std::string> lines, std::string answer) {
   return text + answer;
 }
 
-// A character that is repeated many times as case files have it: \*64x.
+// Shows 16 or more equal characters as case files do: \*64x.
 std::string shortened(const std::string &text) {
   std::string result;
   for (std::size_t at = 0; at < text.size();) {
@@ -181,7 +181,7 @@ std::string run(const Settings &settings, uint32_t flags) {
   return trace;
 }
 
-// One thing a line, for a report.
+// One item per line, for messages.
 std::string broken(std::string text) {
   for (const std::string start : {" | ", " calls ", " host ", " dump "}) {
     for (std::size_t at = 0; (at = text.find(start, at)) != text.npos;) {
@@ -227,7 +227,7 @@ void expectOther(Settings settings, const CaseLine &line, const std::string &bef
 
 void expectCase(const Case &c) {
   Settings settings;
-  std::string trace; // each line with a blank at its end
+  std::string trace; // each line ends with a blank
   for (const CaseLine &line : c.lines) {
     if (line.key == "plain" || line.key == "untraced") {
       expectPlain(settings, line);

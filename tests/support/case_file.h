@@ -1,12 +1,12 @@
-// Test cases in text files, which hold what a test expects.
+// Test cases in text files.
 //
 //   # a comment
 //   == why this case exists
 //   key value
 //    that goes on here
 //
-// A key may occur several times. A line that begins with a blank is added to the one before. Anything
-// else is an error that names the file and the line.
+// A key may occur several times. A line that begins with a blank continues the one before. Anything
+// else is an error; the message names the file and the line.
 #pragma once
 
 #include <stdexcept>
@@ -34,13 +34,13 @@ struct Case {
   std::vector<CaseLine> lines;
 };
 
-// The cases of a file, in whose lines only these keys may occur; at least one.
+// The cases of a file, at least one. Only these keys may occur.
 std::vector<Case> readCases(const std::string &path, const std::vector<std::string> &keys);
 
-// Every *.cases file of a folder in the order of their names; at least one.
+// All *.cases files of a folder, at least one, sorted by name.
 std::vector<std::string> caseFiles(const std::string &folder);
 
-// What is between the separators, without what is empty.
+// The parts between the separators, without empty ones.
 std::vector<std::string> split(const std::string &text, char separator);
 
 } // namespace support

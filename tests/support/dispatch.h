@@ -1,5 +1,5 @@
-// Calls a function of the library with the words of a call, one for each parameter but int32_t and
-// void pointers. The answer is the result and what the call wrote through pointers, in their order.
+// Calls a function of the library with the words of a call: one word for each parameter, except
+// int32_t * and void *. The answer is the result and then all outputs, in the order of the parameters.
 #pragma once
 
 #include "support/words.h"
@@ -19,7 +19,7 @@ struct Cursor {
   std::size_t next = 0;
 };
 
-// What a parameter gets, and what it adds to the answer.
+// The argument for a parameter, and its part of the answer.
 template <class Value>
 struct Given {
   Value value;
@@ -58,7 +58,7 @@ struct Slot<Unit *> { // char and UChar, also constant ones
   std::size_t size;
 };
 
-// An object called "new" begins with zero bytes, and the answer shows what it becomes.
+// The word "new" is an object of zero bytes; the answer shows it after the call.
 template <>
 struct Slot<NLS2_Locale *> {
   explicit Slot(Cursor &at) : isNew(at.words[at.next++] == "new") {
@@ -75,7 +75,7 @@ struct Slot<const NLS2_Locale *> : Given<const NLS2_Locale *> {
   explicit Slot(Cursor &at) : Given{at.words.object(at.next++)} {}
 };
 
-// A new stream. One called "!" is for the library to close; null is none.
+// The word "file" is a new stream. "!" is one that the library closes; null is none.
 template <>
 struct Slot<UFILE *> : Given<UFILE *> {
   explicit Slot(Cursor &at)
@@ -86,7 +86,7 @@ struct Slot<UFILE *> : Given<UFILE *> {
   icu::LocalUFILEPointer owned;
 };
 
-// The example bundle of a language; with "!", for the library to close.
+// The example bundle of a language. With "!" before the name, the library closes it.
 template <>
 struct Slot<UResourceBundle *> : Given<UResourceBundle *> {
   explicit Slot(Cursor &at) : Given{nullptr} {
@@ -103,7 +103,7 @@ struct Slot<const UResourceBundle *> : Slot<UResourceBundle *> {
   using Slot<UResourceBundle *>::Slot;
 };
 
-// A result as the answer has it, by its name if it is a pointer. Handles are closed.
+// A result in an answer. Pointers get names; handles are closed.
 template <class Result>
 std::string answered(const Words &words, Result result) {
   if constexpr (std::is_same_v<Result, UConverter *>) {

@@ -6,7 +6,7 @@ namespace support {
 
 namespace {
 
-// Input and output are one buffer: the input, its length, where dest is and its size.
+// Input and output share a buffer: the input, its length, where dest begins, and dest's size.
 template <auto function>
 std::string inPlace(const Words &w) {
   int32_t status = 99;
@@ -18,7 +18,7 @@ std::string inPlace(const Words &w) {
   return shown(result) + ", " + shown(status) + ", " + shown(text);
 }
 
-// The lengths of all first bytes, where one differs from that of the byte before.
+// The length for each first byte that differs from the length for the byte before.
 std::string byteLengths(const Words &w) {
   std::string lengths;
   int32_t before = 0;

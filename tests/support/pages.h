@@ -1,5 +1,5 @@
-// Code pages and ICU's names of their converters: every page that the library opens by a name, and
-// pages of each other kind. ICU's own conversions of them.
+// Code pages and the ICU names of their converters: all pages that the library opens by name, and some
+// of each other kind. Conversions by bare ICU.
 #pragma once
 
 #include <algorithm>

@@ -1,4 +1,4 @@
-// What the interposers do in the tests.
+// The interposers' decisions in the tests.
 
 #include "support/probe.h"
 

@@ -1,4 +1,4 @@
-// Decides what ICU and the heap answer, and watches what the library takes.
+// Lets ICU and the heap fail, sets the process's defaults, and watches what the library opens.
 #pragma once
 
 #include "proof/interposers.h"
@@ -17,26 +17,25 @@ using MeantLeak = __lsan::ScopedDisabler;
 struct MeantLeak {};
 #endif
 
-// The nth call of a function of ICU's by the library fails with `error`. Of the heap's functions,
-// "malloc" and "realloc" fail for every block of n bytes; "object" is the size of a
-// locale object.
+// The library's nth call of an ICU function fails with `error`. "malloc" and "realloc" fail for every
+// block of n bytes; in case files "object" is the size of a locale object.
 struct Fault {
   std::string function;
   long nth;
   UErrorCode error = U_MEMORY_ALLOCATION_ERROR;
 };
 
-// What ICU reports of the process, and what fails. "null" stands for a null pointer.
+// The defaults that ICU reports, and the calls that fail. "null" is a null pointer.
 struct World {
   std::string locale = "en_US";
-  std::vector<std::string> codepages{"UTF-8"}; // call by call; the last one stays
+  std::vector<std::string> codepages{"UTF-8"}; // one for each call; the last one is repeated
   std::vector<Fault> faults;
 };
 extern World world;
 
-// Every handle of ICU that the library has opened since the call before.
+// All ICU handles opened since the last call of this function.
 std::vector<const void *> openedHandles();
-// How many blocks the program has asked of the heap.
+// How many blocks the program has requested from the heap.
 long heapRequests();
 
 } // namespace support

@@ -16,12 +16,12 @@ namespace {
 
 using Guard = std::lock_guard<std::mutex>;
 
-std::mutex recordMutex; // of these three
+std::mutex recordMutex; // for these three
 std::vector<std::string> recorded;
 bool isRecording = false;
 std::map<std::string, support::SeenFunction> functions;
 
-// Every change of the flags changes this word, which anchors are pointed at by their first sync.
+// Anchors point to this word after their first sync. It changes with the flags.
 std::atomic<uint32_t> currentFlags{0};
 uint32_t hostSync = 2;
 

@@ -1,4 +1,4 @@
-// Reads the words of a call, and shows what it answers.
+// Reads the words of a call, and shows answers.
 
 #include "support/words.h"
 
@@ -16,8 +16,8 @@ namespace {
 // bits, which a trace shows as null.
 [[maybe_unused]] const auto firstObject = std::make_unique<NLS2_Locale>();
 
-// A sanitizer's heap begins where addresses end in zero bits: in a trace its first blocks look like
-// small numbers, so the text gets a block beyond those.
+// The first addresses of a sanitizer's heap end in many zero bits and look like small numbers in a
+// trace, so the text gets a later block.
 std::unique_ptr<char[]> farBlock(const std::string &text) {
   std::vector<std::unique_ptr<char[]>> near;
   while (near.empty() || low32(near.back().get()) < 0x10000) {

@@ -1,4 +1,4 @@
-// The trace frame as a host sees it: anchors, syncs, events and their flags.
+// The trace frame from the host's side: anchors, syncs, events and their flags.
 
 #include "nls2.h"
 #include "support/recording_host.h"
@@ -20,7 +20,7 @@ int32_t translate(uint32_t options) {
                               options, &status);
 }
 
-// What the library traces with each kind of flag.
+// The trace of a call with these flags.
 std::vector<std::string> linesOf(uint32_t flags, uint32_t options) {
   const Recording recording(flags);
   EXPECT_EQ(translate(options), options == 0 ? 3 : options == NLS2_STRING_FILL ? 16 : 0);
