@@ -26,8 +26,7 @@ constexpr NamedCodepage namedCodepage(int32_t codepage) {
   case 949: return {"windows-949", false};
   case 950: return {"windows-950", false};
   case 1200: return {"utf-16be", true};
-  case 1208: return {"utf-8", false};
-  case 57352: return {"utf-8", false};
+  case 1208: case 57352: return {"utf-8", false};
   case 57355: return {"sbcs", false};
   case 57356: return {"dbcs", false};
   case 57357: return {"mbcs", false};

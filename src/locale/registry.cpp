@@ -40,7 +40,7 @@ struct Forking {
   int cancelState;
 };
 constinit thread_local Forking forking __attribute__((tls_model("initial-exec"))) = {};
-static_assert(sizeof remembered + sizeof detail::ownCounts + sizeof forking <= 256);
+static_assert(sizeof remembered + sizeof(detail::Counts *) + sizeof forking <= 256);
 
 // If another thread held the lock during the fork, nobody would release it in the child. So the
 // forking thread takes it first, unless it forks in a signal handler that interrupted a change of
