@@ -3,7 +3,8 @@
 
 #include "nls2_fields.h"
 
-#include <exception>
+#include <new>
+#include <stdexcept>
 #include <unicode/utypes.h>
 
 namespace zelfields {
@@ -14,7 +15,9 @@ template <class Body>
 int32_t guarded(Body body) noexcept {
   try {
     return body();
-  } catch (const std::exception &) {
+  } catch (const std::bad_alloc &) {
+    return NLS2_ERR_NO_MEMORY;
+  } catch (const std::length_error &) {
     return NLS2_ERR_NO_MEMORY;
   }
 }

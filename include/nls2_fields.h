@@ -167,7 +167,7 @@ enum {
   NLS2F_REPLACE = 1,        /* as ICU does: U+FFFD or the page's substitution character takes their
                                place, and characters that are ignorable by default (U+00AD, U+200B
                                ...) disappear. All are counted. The bytes are those that
-                               NLS2_TranslateString writes */
+                               NLS2_TranslateString writes, and ISO-2022-KR has its header */
   NLS2F_REPLACE_VISIBLY = 2 /* as REPLACE, but ignorable characters are substituted, too */
 };
 
@@ -207,7 +207,7 @@ NLS2_API int32_t NLS2F_MaxSize(const NLS2F_Translator *translator, int64_t lengt
  *
  *   written   the bytes of the output
  *   replaced  each invalid sequence and each character that the page lacks, once; or null. A
- *             U+001A of the source does not count
+ *             U+001A of the source does not count unless the page lacks it
  *
  * Does not allocate for fields of up to 2,048 bytes, nor for longer ones once it has met one as
  * long. Status: NLS2F_ERR_FIELD. */
@@ -248,8 +248,8 @@ typedef struct NLS2F_Column {
  * call.
  *
  * A row that does not fit in `room`, or whose end does not fit in a 32-bit offset, stops the call
- * in either case: the problem is NLS2F_NO_ROOM, `record` the row, `needed` the room to get past it,
- * and the rows before it are done (partial output). Go on there with new buffers: fields + done *
+ * in either case: the problem is NLS2F_NO_ROOM, `record` the row, `needed` the room with which the
+ * same call gets past it, and the rows before it are done (partial output). Go on there with new buffers: fields + done *
  * stride, rows - done. Does not allocate where NLS2F_Translate does not.
  *
  * Status: 0, NLS2F_ERR_FIELD, or NLS2_ERR_INVALID_PARAMETER also for other offsetBits. */
@@ -257,7 +257,8 @@ NLS2_API int32_t NLS2F_TranslateColumn(NLS2F_Translator *translator, NLS2F_Colum
                                        NLS2F_Problem *problem);
 
 /* Translates a text piece by piece, with padding AS_IS and no width: wherever it is cut, the
- * pieces' outputs together are that of NLS2F_Translate for the whole text.
+ * pieces' outputs together are that of NLS2F_Translate for the whole text. NLS2F_Translate and
+ * NLS2F_TranslateColumn abandon a text that is under way.
  *
  *   last      1: the text ends here; shift states are closed, and the next piece begins a new text
  *   read      the bytes of the piece that were used: all on success

@@ -44,10 +44,16 @@ inline bool leavesModesOpen(UConverterType type) noexcept {
                                          UCNV_ISO_2022, UCNV_HZ, UCNV_COMPOUND_TEXT});
 }
 
+// ICU's decoder keeps back bytes or a character, and does not count them as pending.
+inline bool keepsBack(UConverterType type) noexcept { return isOneOf(type, {UCNV_ISCII, UCNV_HZ}); }
+
 // ICU's converter forgets half a pair at the end of a text that ends in a call of its own.
 inline bool losesHalves(UConverterType type) noexcept {
   return isOneOf(type, {UCNV_HZ, UCNV_COMPOUND_TEXT});
 }
+
+// What a character becomes depends on those after it in the same call.
+inline bool looksAhead(UConverterType type) noexcept { return type == UCNV_SCSU || isLmbcs(type); }
 
 // How many UTF-16 units a byte can become: a supplementary character, or a sequence.
 inline int64_t unitsPerByte(UConverterType type) noexcept {

@@ -90,7 +90,7 @@ private:
   const void *context_ = nullptr;
   char16_t units_[piece] = {};
   int32_t offsets_[piece] = {};
-  int64_t noted_[piece + 1] = {}; // -1 for units of valid bytes; the last is left over
+  int64_t noted_[piece + 1]; // -1 for units of valid bytes; the last is left over
   std::size_t count_ = 0;
   std::size_t at_ = 0;
   int64_t start_ = 0;
@@ -125,11 +125,14 @@ Character characterAt(int64_t unit, std::string_view text, UConverter *converter
 }
 
 // The end of a character without shifts after it: its bytes are read one by one until its units
-// come.
+// come. In base 64 it shares its last byte with the next character.
 int64_t endWithoutShifts(const Character &character, std::string_view text, UConverter *converter) {
   const char *source = text.data();
+  const bool shares = isOneOf(ucnv_getType(converter), {UCNV_UTF7, UCNV_IMAP_MAILBOX});
+  const int64_t end = std::min<int64_t>(character.end + (shares ? 1 : 0), std::ssize(text));
   int64_t decoded = 0;
-  for (int64_t limit = character.offset; decoded < character.endUnit && limit <= character.end;) {
+  for (int64_t limit = std::max<int64_t>(character.offset, 0);
+       decoded < character.endUnit && limit <= end;) {
     char16_t piece[64];
     char16_t *target = piece;
     UErrorCode error = U_ZERO_ERROR;
@@ -164,21 +167,23 @@ std::size_t Decoder::decode(std::span<char16_t> units, bool last, int32_t *offse
 }
 
 void setPlace(NLS2F_Problem &problem, std::string_view text, int64_t offset, int64_t size) {
-  problem.offset = offset;
+  problem.offset = std::max<int64_t>(offset, 0);
   problem.byteCount = static_cast<int32_t>(std::min<int64_t>(size, sizeof problem.bytes));
   std::memset(problem.bytes, 0, sizeof problem.bytes);
-  text.substr(static_cast<std::size_t>(offset))
+  text.substr(static_cast<std::size_t>(problem.offset))
       .copy(reinterpret_cast<char *>(problem.bytes), static_cast<std::size_t>(problem.byteCount));
 }
 
-void setPlaceOfUnit(NLS2F_Problem &problem, std::string_view text, int64_t unit,
+void setPlaceOfUnit(NLS2F_Problem &problem, std::string_view text, std::size_t before, int64_t unit,
                     const Rewind &rewind) {
+  const std::string_view rest = text.substr(before);
   UConverter *converter = rewind();
-  Character character = characterAt(unit, text, converter);
+  Character character = characterAt(unit, rest, converter);
   if (hasStates(ucnv_getType(converter))) {
-    character.end = endWithoutShifts(character, text, rewind());
+    character.end = endWithoutShifts(character, rest, rewind());
   }
-  setPlace(problem, text, character.offset, character.end - character.offset);
+  setPlace(problem, text, static_cast<int64_t>(before) + character.offset,
+           character.end - character.offset);
   problem.codePoint = static_cast<uint32_t>(character.codePoint);
 }
 

@@ -42,7 +42,9 @@ void setPlace(NLS2F_Problem &problem, std::string_view text, int64_t offset, int
 using Rewind = std::function<UConverter *()>;
 
 // Sets the place of a character, given by its first unit in the decoded text, and its code point.
-void setPlaceOfUnit(NLS2F_Problem &problem, std::string_view text, int64_t unit,
+//
+//   before  bytes at the beginning of `text` that the rewound converter has read
+void setPlaceOfUnit(NLS2F_Problem &problem, std::string_view text, std::size_t before, int64_t unit,
                     const Rewind &rewind);
 
 } // namespace zelfields

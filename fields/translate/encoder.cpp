@@ -113,6 +113,8 @@ bool Encoder::noteBad(int64_t after) {
   return false;
 }
 
+bool Encoder::isSettled() const { return half_ == 0 && keptBack(to_) == 0; }
+
 bool Encoder::finish() {
   if (before_ == 0 && half_ == 0) {
     return true;

@@ -22,6 +22,11 @@ public:
   // Ends the text and closes shift states. A text without units has not even a signature.
   bool finish();
 
+  // The room for what comes now.
+  void into(Room room) { room_ = room; }
+  // Whether all units are encoded. Some may be kept back, to see which one follows.
+  bool isSettled() const;
+
   int64_t size() const { return size_; }    // bytes, whether they fit or not
   int64_t units() const { return before_; } // that were added
   int64_t bad() const { return bad_; }

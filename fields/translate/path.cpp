@@ -186,7 +186,7 @@ std::size_t Path::decodeAll(Decoder &decoder, std::size_t length) {
 
 bool Path::badUnit(int32_t kind, std::string_view field, int64_t unit, NLS2F_Problem &problem) {
   fail(problem, kind);
-  setPlaceOfUnit(problem, field, unit, [this] { return restart(from_); });
+  setPlaceOfUnit(problem, field, 0, unit, [this] { return restart(from_); });
   if (kind == NLS2F_EMBEDDED_NULL) {
     problem.codePoint = 0;
   }

@@ -1,6 +1,7 @@
 // A field through ICU: the path that is right for every pair of pages.
 #pragma once
 
+#include "pages/page.h"
 #include "translate/blanks.h"
 #include "translate/decoder.h"
 #include "translate/encoder.h"
@@ -19,6 +20,8 @@ class Path {
 public:
   // Fields of up to so many bytes need no more memory.
   static constexpr std::size_t usualField = 2048;
+  // Units that are encoded at once if a text need not be seen whole: as many as ucnv_convertEx() does.
+  static constexpr std::size_t pieceUnits = 1024;
 
   // Takes over two converters that nobody else uses.
   Path(UConverter *from, UConverter *to, const NLS2F_Policy &policy, UErrorCode &error);
@@ -37,12 +40,16 @@ public:
   }
   int64_t maxSize(int64_t length) const;
 
+  // Begins a text that goes through the converters one by one. The result is the encoding one.
+  UConverter *begin() {
+    replaced_ = {};
+    restart(from_);
+    return restart(to_);
+  }
   // False if the field is the problem.
   bool translate(std::string_view field, Room room, Done &done, NLS2F_Problem &problem);
 
 private:
-  static constexpr std::size_t pieceUnits = 1024; // as ucnv_convertEx() has them
-
   bool asIs(std::string_view field, Room room, Done &done, NLS2F_Problem &problem);
   bool padded(std::string_view field, Room room, Done &done, NLS2F_Problem &problem);
   bool apart(std::string_view field, const Encoder &text, int64_t cut, Room room, Done &done,

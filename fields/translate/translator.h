@@ -2,16 +2,33 @@
 #pragma once
 
 #include "pages/page.h"
+#include "translate/chunks.h"
 #include "translate/path.h"
+
+#include <memory>
 
 struct NLS2F_Translator {
   NLS2F_Translator(UConverter *from, UConverter *to, const NLS2F_Policy &policy, UErrorCode &error)
       : path(from, to, policy, error) {}
 
+  // A whole field, which ends a text that goes piece by piece.
   bool translate(std::string_view field, zelfields::Room room, zelfields::Done &done,
                  NLS2F_Problem &problem) {
+    abandonPieces();
     return path.translate(field, room, done, problem);
+  }
+  void abandonPieces() {
+    if (pieces) {
+      pieces->abandon();
+    }
+  }
+  zelfields::Chunks &chunks() {
+    if (!pieces) {
+      pieces = std::make_unique<zelfields::Chunks>(path);
+    }
+    return *pieces;
   }
 
   zelfields::Path path;
+  std::unique_ptr<zelfields::Chunks> pieces; // from the first one on
 };
