@@ -38,6 +38,13 @@ inline bool hasStates(UConverterType type) noexcept {
                         UCNV_ISO_2022, UCNV_HZ, UCNV_ISCII, UCNV_COMPOUND_TEXT});
 }
 
+// Without a signature: a character is the same bytes wherever it is.
+inline bool isStateless(UConverterType type) noexcept {
+  return isSingleByte(type) ||
+         isOneOf(type, {UCNV_MBCS, UCNV_DBCS, UCNV_UTF8, UCNV_CESU8, UCNV_UTF16_BigEndian,
+                        UCNV_UTF16_LittleEndian, UCNV_UTF32_BigEndian, UCNV_UTF32_LittleEndian});
+}
+
 // Text may leave a mode open that a blank after it closes, or that makes the blank another.
 inline bool leavesModesOpen(UConverterType type) noexcept {
   return isLmbcs(type) || isOneOf(type, {UCNV_UTF7, UCNV_IMAP_MAILBOX, UCNV_SCSU, UCNV_ISCII,

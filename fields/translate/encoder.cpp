@@ -53,7 +53,9 @@ bool Encoder::encode(std::u16string_view text) {
   UErrorCode error = U_ZERO_ERROR;
   do {
     error = U_ZERO_ERROR;
-    room_.size > 0 && allFits() ? write(piece, error) : count(piece, error);
+    whole_ != nullptr             ? writeWhole(piece, error)
+    : room_.size > 0 && allFits() ? write(piece, error)
+                                  : count(piece, error);
     if (stops(error)) {
       return noteBad(resolved(piece));
     }
@@ -69,6 +71,28 @@ void Encoder::write(Progress &piece, UErrorCode &error) {
                    &error);
   const int64_t written = target - room_.begin;
   room_ = {target, room_.size - written};
+  size_ += written;
+}
+
+void Encoder::writeWhole(Progress &piece, UErrorCode &error) {
+  const auto units = std::min(piece.end - piece.source, unitsAtOnce);
+  const std::size_t most =
+      static_cast<std::size_t>(units + 10) * static_cast<std::size_t>(ucnv_getMaxCharSize(to_));
+  if (whole_->bytes.size() < most) {
+    whole_->bytes.resize(most);
+    whole_->offsets.resize(most);
+  }
+  const int64_t start = before_ + (piece.source - piece.begin);
+  char *target = whole_->bytes.data();
+  ucnv_fromUnicode(to_, &target, target + std::min<std::size_t>(most, INT32_MAX), &piece.source,
+                   piece.source + units, whole_->offsets.data(), false, &error);
+  const int64_t written = target - whole_->bytes.data();
+  const int64_t fitting = allFits() ? std::min(written, room_.size) : 0;
+  std::memcpy(room_.begin, whole_->bytes.data(), static_cast<std::size_t>(fitting));
+  room_ = {room_.begin + fitting, room_.size - fitting};
+  if (fitting < written && allFits()) {
+    unfit_ = start + std::max(whole_->offsets[static_cast<std::size_t>(fitting)], 0);
+  }
   size_ += written;
 }
 

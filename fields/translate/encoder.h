@@ -5,8 +5,15 @@
 
 #include <string_view>
 #include <unicode/ucnv.h>
+#include <vector>
 
 namespace zelfields {
+
+// Room for whole pieces, for pages in which a character becomes other bytes if the room ends.
+struct WholePieces {
+  std::vector<char> bytes;
+  std::vector<int32_t> offsets;
+};
 
 // Encodes one text, in one or more pieces. Bytes that do not fit are counted and dropped, so that
 // the size is that of the whole text.
@@ -15,7 +22,8 @@ public:
   static constexpr int64_t none = -1;
 
   // `to` is at the beginning of a text.
-  Encoder(UConverter *to, Room room) : to_(to), room_(room) {}
+  Encoder(UConverter *to, Room room, WholePieces *whole = nullptr)
+      : to_(to), room_(room), whole_(whole) {}
 
   // False if a character stops the converter: bad() is its first unit.
   bool add(std::u16string_view piece);
@@ -45,12 +53,14 @@ private:
   bool encode(std::u16string_view text);
   bool allFits() const { return unfit_ == none; }
   void write(Progress &piece, UErrorCode &error);
+  void writeWhole(Progress &piece, UErrorCode &error);
   void count(Progress &piece, UErrorCode &error);
   int64_t resolved(const Progress &piece) const;
   bool noteBad(int64_t after);
 
   UConverter *to_;
   Room room_; // that is left
+  WholePieces *whole_;
   int64_t size_ = 0;
   int64_t before_ = 0;
   int64_t bad_ = none;

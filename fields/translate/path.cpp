@@ -12,7 +12,6 @@
 namespace zelfields {
 namespace {
 
-constexpr int64_t longestField = INT32_MAX;
 constexpr int64_t mostTogether = 3; // blanks that the buffer has room for after its text
 
 // Cuts the blanks and nulls off the end of a text. The result is the number of blanks.
@@ -43,6 +42,7 @@ Path::Path(UConverter *from, UConverter *to, const NLS2F_Policy &policy, UErrorC
     setCallbacks(from, to, policy.onBad, &replaced_, error);
     blanks_.learn(to_, replaced_);
     reserve(2 * usualField);
+    looksAhead_ = looksAhead(ucnv_getType(to));
   }
 }
 
@@ -67,7 +67,7 @@ bool Path::translate(std::string_view field, Room room, Done &done, NLS2F_Proble
 
 bool Path::asIs(std::string_view field, Room room, Done &done, NLS2F_Problem &problem) {
   Decoder decoder(restart(from_), field);
-  Encoder encoder(restart(to_), room.first(limit(room)));
+  Encoder encoder = encoderInto(room.first(limit(room)));
   bool encodes = true;
   while (encodes && !decoder.isDone()) {
     const std::size_t units = decoder.decode({units_.get(), pieceUnits}, true);
@@ -92,7 +92,7 @@ bool Path::padded(std::string_view field, Room room, Done &done, NLS2F_Problem &
   if (null != text.npos) {
     return badUnit(NLS2F_EMBEDDED_NULL, field, static_cast<int64_t>(null), problem);
   }
-  Encoder encoder(restart(to_), room.first(limit(room)));
+  Encoder encoder = encoderInto(room.first(limit(room)));
   if (!encoder.add(text) || !encoder.finish() || decoder.hasStopped()) {
     return badText(field, decoder, encoder, problem);
   }
@@ -137,7 +137,7 @@ bool Path::together(std::string_view field, std::size_t units, const Encoder &te
   const auto encode = [&](int64_t blanks, Room target) {
     static constexpr std::u16string_view more = u"                                ";
     int64_t left = std::min<int64_t>(blanks, mostTogether);
-    Encoder encoder(restart(to_), target);
+    Encoder encoder = encoderInto(target);
     bool encodes = encoder.add({units_.get(), units + static_cast<std::size_t>(left)});
     for (left = blanks - left; encodes && left > 0; left -= std::ssize(more)) {
       encodes = encoder.add(more.substr(0, static_cast<std::size_t>(left)));
@@ -160,6 +160,10 @@ bool Path::together(std::string_view field, std::size_t units, const Encoder &te
   done.written = sizes.of(blanks);
   done.replaced += blanks_.isReplaced() ? blanks : 0;
   return true;
+}
+
+Encoder Path::encoderInto(Room room) {
+  return {restart(to_), room, looksAhead_ ? &whole_ : nullptr};
 }
 
 // Makes room for `units` units and a few blanks; what the buffer held is kept.

@@ -18,6 +18,7 @@ namespace zelfields {
 // where it is made, since the converters point at its counts.
 class Path {
 public:
+  static constexpr int64_t longestField = INT32_MAX;
   // Fields of up to so many bytes need no more memory.
   static constexpr std::size_t usualField = 2048;
   // Units that are encoded at once if a text need not be seen whole: as many as ucnv_convertEx() does.
@@ -56,6 +57,7 @@ private:
              NLS2F_Problem &problem);
   bool together(std::string_view field, std::size_t units, const Encoder &text, int64_t cut,
                 Room room, Done &done, NLS2F_Problem &problem);
+  Encoder encoderInto(Room room);
   void reserve(std::size_t units);
   std::size_t decodeAll(Decoder &decoder, std::size_t length);
 
@@ -74,6 +76,8 @@ private:
   Blanks blanks_;
   std::unique_ptr<char16_t[]> units_;
   std::size_t capacity_ = 0;
+  bool looksAhead_ = false;
+  WholePieces whole_;
 };
 
 } // namespace zelfields

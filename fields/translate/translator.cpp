@@ -17,15 +17,16 @@ bool isValid(const NLS2F_Policy &policy) {
          policy.width <= widest && (policy.padding != NLS2F_FILL || policy.width > 0);
 }
 
-int32_t open(const UConverter *from, const UConverter *to, const NLS2F_Policy &policy,
-             std::unique_ptr<NLS2F_Translator> &translator) {
+// Makes a translator with copies of two converters.
+template <class... Rest>
+int32_t make(const UConverter *from, const UConverter *to,
+             std::unique_ptr<NLS2F_Translator> &translator, const Rest &...rest) {
   UErrorCode error = U_ZERO_ERROR;
   icu::LocalUConverterPointer source = cloneOf(from, error);
   icu::LocalUConverterPointer target = cloneOf(to, error);
-  if (U_FAILURE(error)) {
-    return statusOf(error);
+  if (U_SUCCESS(error)) {
+    translator.reset(new NLS2F_Translator(source.orphan(), target.orphan(), rest..., error));
   }
-  translator.reset(new NLS2F_Translator(source.orphan(), target.orphan(), policy, error));
   return U_FAILURE(error) ? statusOf(error) : 0;
 }
 
@@ -35,7 +36,9 @@ int32_t openTranslator(const NLS2F_Page &from, const NLS2F_Page &to, const NLS2F
     return NLS2_ERR_INVALID_OPTION;
   }
   std::unique_ptr<NLS2F_Translator> opened;
-  const int32_t status = open(from.converter.getAlias(), to.converter.getAlias(), policy, opened);
+  const bool isBare = !from.hasSignature && !to.hasSignature;
+  const int32_t status =
+      make(from.converter.getAlias(), to.converter.getAlias(), opened, policy, isBare);
   if (status != 0) {
     return status;
   }
@@ -76,7 +79,7 @@ int32_t NLS2F_CloneTranslator(const NLS2F_Translator *translator, NLS2F_Translat
   return guarded([&] {
     std::unique_ptr<NLS2F_Translator> opened;
     const Path &path = translator->path;
-    const int32_t status = open(path.from(), path.to(), path.policy(), opened);
+    const int32_t status = make(path.from(), path.to(), opened, *translator);
     *clone = opened.release();
     return status;
   });

@@ -4,18 +4,24 @@
 #include "pages/page.h"
 #include "translate/chunks.h"
 #include "translate/path.h"
+#include "translate/table.h"
 
 #include <memory>
 
 struct NLS2F_Translator {
-  NLS2F_Translator(UConverter *from, UConverter *to, const NLS2F_Policy &policy, UErrorCode &error)
-      : path(from, to, policy, error) {}
+  // `isBare`: neither page has a signature.
+  NLS2F_Translator(UConverter *from, UConverter *to, const NLS2F_Policy &policy, bool isBare,
+                   UErrorCode &error)
+      : path(from, to, policy, error), table(path, isBare) {}
+  NLS2F_Translator(UConverter *from, UConverter *to, const NLS2F_Translator &other,
+                   UErrorCode &error)
+      : path(from, to, other.path.policy(), error), table(path, other.table) {}
 
   // A whole field, which ends a text that goes piece by piece.
   bool translate(std::string_view field, zelfields::Room room, zelfields::Done &done,
                  NLS2F_Problem &problem) {
     abandonPieces();
-    return path.translate(field, room, done, problem);
+    return table.translate(field, room, done) || path.translate(field, room, done, problem);
   }
   void abandonPieces() {
     if (pieces) {
@@ -30,5 +36,6 @@ struct NLS2F_Translator {
   }
 
   zelfields::Path path;
+  zelfields::Table table;
   std::unique_ptr<zelfields::Chunks> pieces; // from the first one on
 };
