@@ -11,9 +11,9 @@
 //     unsigned char, std::byte or char8_t. A std::string as output is appended to.
 //  4. Counts are bytes, or units of char16_t, exactly. A null character is an ordinary character.
 //  5. Pages come in the order (from, to).
-//  6. Owners (code_page, translator, collator, locale, bundle) may be empty: made so, moved from,
-//     or after a failure. get() returns the handle, release() gives up ownership, reset() closes
-//     it.
+//  6. Owners (code_page, translator, collator, locale, bundle) are empty after a default
+//     constructor, a move or a failure. get() returns the handle, release() gives up ownership,
+//     reset() closes it.
 //  7. Nothing is lost silently: where text converts there is a strict form and one that counts what
 //     was replaced.
 //  8. Memory. Functions that return or extend a string may throw std::bad_alloc.

@@ -16,24 +16,25 @@ inline namespace NLS2_MODE {
 namespace detail {
 
 template <class T>
-inline constexpr bool is_character = std::is_same_v<T, char> || std::is_same_v<T, char8_t>;
-
-template <class Pointer>
-concept bytes_pointer = std::is_pointer_v<Pointer> &&
-    (is_character<std::remove_cv_t<std::remove_pointer_t<Pointer>>> ||
-     std::is_same_v<std::remove_cv_t<std::remove_pointer_t<Pointer>>, unsigned char> ||
-     std::is_same_v<std::remove_cv_t<std::remove_pointer_t<Pointer>>, std::byte>);
+concept character = std::is_same_v<T, char> || std::is_same_v<T, char8_t>;
+template <class T>
+concept byte_like =
+    character<T> || std::is_same_v<T, unsigned char> || std::is_same_v<T, std::byte>;
 
 // A container or view of bytes, or an array of them.
 template <class Range>
 concept byte_range = requires(Range &range) {
-  { std::data(range) } -> bytes_pointer;
-  { std::size(range) } -> std::convertible_to<std::size_t>;
+  requires byte_like<std::remove_cvref_t<decltype(*std::data(range))>>;
+  static_cast<std::size_t>(std::size(range));
 };
 
 template <class Range>
-inline constexpr bool is_character_array =
-    std::is_array_v<Range> &&is_character<std::remove_cv_t<std::remove_extent_t<Range>>>;
+concept readable_bytes =
+    byte_range<Range> && !(std::is_array_v<Range> && character<std::remove_all_extents_t<Range>>);
+
+template <class Pointer>
+concept character_pointer =
+    std::is_same_v<Pointer, const char *> || std::is_same_v<Pointer, char *>;
 
 template <class T>
 inline constexpr bool is_string = false;
@@ -42,13 +43,14 @@ inline constexpr bool is_string<std::basic_string<Unit, Others...>> = true;
 
 template <class Range>
 concept writable_bytes =
-    byte_range<Range> && !is_string<std::remove_cvref_t<Range>> &&
-    !std::is_const_v<std::remove_pointer_t<decltype(std::data(std::declval<Range &>()))>>;
+    byte_range<Range> && !is_string<std::remove_cvref_t<Range>> && requires(Range & range) {
+  *std::data(range) = *std::data(range);
+};
 
 } // namespace detail
 
-// Bytes to read: a std::string_view, a literal without its terminator, a null-terminated const char
-// *, or any contiguous range of char, unsigned char, std::byte or char8_t. Does not own them.
+// Bytes to read: a literal without its terminator, a pointer to null-terminated characters, or any
+// contiguous range of char, unsigned char, std::byte or char8_t. Does not own them.
 //
 // An array of char that is not a literal does not convert, since only its owner knows whether all
 // of it is text: pass std::span(array) for all of it, std::string_view(array) for the text up to a
@@ -58,21 +60,18 @@ public:
   constexpr byte_view() noexcept = default;
   constexpr byte_view(const void *data, std::size_t size) noexcept : data_(data), size_(size) {}
 
-  template <detail::byte_range Range>
-  requires(!detail::is_character_array<Range>) constexpr byte_view(const Range &range) noexcept
+  template <detail::readable_bytes Range>
+  constexpr byte_view(const Range &range) noexcept
       : data_(std::data(range)), size_(std::size(range)) {}
 
-  template <class Character, std::size_t length>
-  requires(detail::is_character<Character>) consteval byte_view(
-      const Character (&literal)[length]) noexcept
-      : data_(literal), size_(literal[length - 1] == Character() ? length - 1 : length) {}
-  template <class Character, std::size_t length>
-  requires(detail::is_character<Character>) byte_view(Character (&array)[length])
-  = delete;
+  template <detail::character Unit, std::size_t length>
+  consteval byte_view(const Unit (&literal)[length]) noexcept
+      : data_(literal), size_(literal[length - 1] == Unit() ? length - 1 : length) {}
+  template <detail::character Unit, std::size_t length>
+  byte_view(Unit (&array)[length]) = delete;
 
-  template <class Pointer>
-  requires(std::is_same_v<Pointer, const char *>) constexpr byte_view(Pointer text) noexcept
-      : byte_view(std::string_view(text)) {}
+  template <detail::character_pointer Pointer>
+  constexpr byte_view(Pointer text) noexcept : byte_view(std::string_view(text)) {}
 
   [[nodiscard]] constexpr const void *data() const noexcept { return data_; }
   [[nodiscard]] constexpr std::size_t size() const noexcept { return size_; }

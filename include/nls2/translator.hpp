@@ -144,8 +144,8 @@ inline void close_translator(NLS2F_Translator *owned) noexcept { NLS2F_CloseTran
 } // namespace detail
 
 // Translates texts from one code page to another, which it keeps open. For one thread at a time; a
-// copy costs little and serves another thread. May be empty: made so, moved from, or after a
-// failure to open; then its functions fail with 37 (invalid_argument).
+// copy costs little and serves another thread. The functions of an empty one fail with 37
+// (invalid_argument).
 class translator : public detail::owner<NLS2F_Translator, detail::close_translator> {
 public:
   using owner::owner;
