@@ -1,4 +1,4 @@
-// nls2::translator beside ICU and iconv kept open, on the same fields.
+// nls2::translator compared with ICU and iconv kept open, on the same fields.
 
 #include <algorithm>
 #include <benchmark/benchmark.h>
@@ -139,7 +139,7 @@ std::string answer(const Way &way, std::size_t size) {
   return out;
 }
 
-// The contenders must say the same before they are timed.
+// All contenders must agree before they are timed.
 bool answersAgree() {
   for (const Way &way : ways) {
     for (const std::size_t size : {10U, 80U, 1000U}) {

@@ -1,4 +1,4 @@
-// What the safety of the locale registry costs, beside a plain list of the same objects.
+// The costs of the locale registry, compared with a plain list of the same objects.
 
 #include "nls2.h"
 

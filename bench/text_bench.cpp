@@ -1,5 +1,5 @@
-// Comparison, search and UTF conversion beside the same calls of ICU and the heap, made bare in the
-// same order.
+// Comparison, search and UTF conversion, compared with the bare calls of ICU and the heap that they
+// make.
 
 #include "nls2.h"
 
@@ -162,7 +162,7 @@ BENCHMARK(run<toUtf16Library>)->Name("toUTF16")->Arg(20)->Arg(200);
 BENCHMARK(run<toUtf16Bare>)->Name("toUTF16Bare")->Arg(20)->Arg(200);
 BENCHMARK(byteLength)->Name("ByteLength");
 
-// The contenders must say the same before they are timed.
+// All contenders must agree before they are timed.
 bool answersAgree() {
   using Function = int32_t (*)(Operands &);
   constexpr Function pairs[][2] = {{strcollLibrary, strcollBare},

@@ -1,4 +1,4 @@
-// NLS2_TranslateString beside the ICU calls it makes and beside iconv, on the same buffers.
+// NLS2_TranslateString compared with its ICU calls and with iconv, on the same buffers.
 
 #include "nls2.h"
 
@@ -147,7 +147,7 @@ void fillBareIcu(benchmark::State &state) {
     return bareFill(way, source, dest, static_cast<int32_t>(size));
   });
 }
-// A function that does nothing beside its frame.
+// A function that does nothing but its frame.
 void frameOff(benchmark::State &state) {
   for (auto _ : state) {
     benchmark::DoNotOptimize(NLS2_GetLocaleMapEntry(localeMap[0].languageId));
@@ -171,7 +171,7 @@ BENCHMARK(fillBareIcu)->Apply(sizesAndWays);
 BENCHMARK(frameOff);
 BENCHMARK(noFrame);
 
-// The contenders must say the same before they are timed.
+// All contenders must agree before they are timed.
 bool answersAgree() {
   for (const int64_t backwards : {0, 1}) {
     const Direction way = directionOf(backwards);

@@ -14,8 +14,7 @@
  *     that are out of date change only what is traced.
  *   - Do not call back into the library: some detail lines are printed while it holds a lock.
  *   - Strings and areas handed over are valid only during the call.
- *   - Where 32 bits stand for a pointer (an exit event's value, a `%X` argument), they are its low
- *     32 bits.
+ *   - A pointer in 32 bits (an exit event's value, a `%X` argument) is its low 32 bits.
  */
 #ifndef TRC1_H
 #define TRC1_H

@@ -6,8 +6,8 @@
  *
  * Conventions. They hold for every function unless its comment says otherwise.
  *
- *  1. Lengths. Byte strings are measured in bytes, UTF-16 text in 16-bit units; each comment says
- *     which. Lengths are signed 32-bit unless typed otherwise. A terminator is not counted.
+ *  1. Lengths. Byte strings are measured in bytes, UTF-16 text in 16-bit units; each comment names
+ *     the unit. Lengths are signed 32-bit unless typed otherwise. A terminator is not counted.
  *  2. A length of -1 means that the text is null-terminated. The end of a byte string is then its
  *     first zero byte, whatever the code page.
  *  3. Code pages are numbers: CCSIDs (37, 819, 930, 1208 ...), and the private numbers from 57352
@@ -24,7 +24,7 @@
  *  7. Outputs on failure are as they were, except where "partial output" is noted.
  *  8. No pointer argument is tested for null. Passing null is undefined behaviour unless noted.
  *  9. Buffers without a length argument, or with one that is not used or only traced, are written
- *     without a bound: the comment says how much room is needed.
+ *     without a bound: the comment states how much room is needed.
  * 10. Handles that a function returns belong to the caller, who closes them as the function's
  *     comment describes.
  * 11. Threads. Every function may be called from any thread at any time, but not from a signal
@@ -234,8 +234,8 @@ NLS2_API uint32_t NLS2_GetLocaleNumInfo(const NLS2_Locale *pLocale, uint32_t typ
  * nothing and is a success. `options` is only traced.
  *
  * Status, as the result: 0, or NLS2_ERR_INVALID_LOCALE: the object is not live, localeMap does not
- * hold the language id, or the attribute is not a selector (for which NLS2_GetLocaleNumInfo gives
- * INVALID_PARAMETER). */
+ * hold the language id, or the attribute is not a selector. For the last, NLS2_GetLocaleNumInfo
+ * reports INVALID_PARAMETER. */
 NLS2_API int32_t NLS2_SetLocaleNumInfo(NLS2_Locale *pLocaleToChange, uint32_t attribute,
                                        uint32_t value, uint32_t options);
 
@@ -344,7 +344,7 @@ NLS2_API uint32_t NLS2_MapWindowsNameToCCSID(const char *name, int32_t *status);
  * Status, as the result:
  *   0  done
  *   2  U_MISSING_RESOURCE_ERROR: ICU has no name for the converter
- *   or ICU's failure to give one, or that of NLS2_MapCodepageIdToName
+ *   or ICU's failure to name it, or that of NLS2_MapCodepageIdToName
  *
  * Surprise: with detail tracing on, ICU is also asked for the converter's CCSID, and if that fails,
  * its status is the result. */
@@ -377,8 +377,8 @@ enum {
  *   dest, destLen      output buffer and its size in bytes; 0 only with an empty source
  *   source, sourceLen  input in bytes; negative: null-terminated
  *   pSourceConsumed    receives the bytes consumed with options 0 or TERMINATE alone, else 0
- *   options            0, or at least one of the bits above. Other bits are ignored beside a
- *                      padding, but not beside TERMINATE alone (see 36)
+ *   options            0, or at least one of the bits above. Other bits are ignored together
+ *                      with a padding, but not with TERMINATE alone (see 36)
  *
  * Options 0 and TERMINATE alone translate the source as it is. The result is the number of bytes
  * written, plus the terminator's (1; 2 for a page with a two-null terminator) if one was requested
@@ -427,8 +427,8 @@ enum {
  *       with a source, or a code page 0
  *   or ICU's failure to open a converter (4: unknown page) or to convert; partial output
  * Bytes that do not convert are not a failure: ICU's default callbacks replace them with the target
- * page's substitution character, without a report. To find them, use nls2::field_translator of
- * nls2.hpp, or open the converters with NLS2_MapCodepageIdToName and set ICU's callbacks. */
+ * page's substitution character, without a report. To find them, use a translator of nls2_fields.h
+ * or nls2.hpp, or open the converters with NLS2_MapCodepageIdToName and set ICU's callbacks. */
 NLS2_API int32_t NLS2_TranslateString(int32_t destCodePage, char *dest, int32_t destLen,
                                       int32_t sourceCodePage, const char *source, int32_t sourceLen,
                                       int32_t *pSourceConsumed, uint32_t options, int32_t *pStatus);

@@ -1,4 +1,4 @@
-// NLS2_MapCodepageIdToName: the one place where a code page number becomes an ICU converter. The
+// NLS2_MapCodepageIdToName: makes an ICU converter of a code page number. The
 // work is in the header, which is compiled into its hot callers.
 
 #include "codepage/codepage_mapping.h"

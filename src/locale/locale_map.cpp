@@ -16,7 +16,7 @@ static_assert(offsetof(LocaleMapEntry, shortName) == 144);
 
 // A row: language id (country number, language number), ASCII and EBCDIC code page, locale name,
 // short name. The order is contractual, since every search walks from row 0 and takes the first
-// match, and so are the rows that look like slips; callers hold these ids and index this table:
+// match, and so are the rows that look like slips; callers store these ids and index this table:
 //   - Some names occur twice: es_ES (countries 222 and 724), nn_NO (languages 7 and 63). A search
 //     by name finds the first row, a search by id each.
 //   - Some ids occur twice: "de", "fr", "it", "pt", "ja" and "es" repeat their main country's,

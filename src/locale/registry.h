@@ -1,4 +1,4 @@
-// The registry of live locale objects: the list behind pLocaleObjectList.
+// The registry of live locale objects: the list that pLocaleObjectList begins.
 #pragma once
 
 #include "locale/remembered.h"

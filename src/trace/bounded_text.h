@@ -1,4 +1,4 @@
-// A text for a detail line that ends where its length says, not only at a null.
+// A text for a detail line that ends at its length, not only at a null.
 #pragma once
 
 #include "trace/memory.h"
