@@ -22,7 +22,7 @@ void Blanks::learn(icu::LocalUConverterPointer &to, const Replacements &replaced
     }
     sizes[blanks - 1] = encoder.size();
   }
-  size_ = std::min<int64_t>(sizes[1] - sizes[0], bytes_.size());
+  size_ = std::min<int64_t>(sizes[1] - sizes[0], static_cast<int64_t>(bytes_.size()));
   std::memcpy(bytes_.data(), written.data() + sizes[0], static_cast<std::size_t>(size_));
   isReplaced_ = replaced.total() != before;
   dependOnText_ = leavesModesOpen(ucnv_getType(to.getAlias()));

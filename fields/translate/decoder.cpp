@@ -151,7 +151,7 @@ std::size_t Decoder::decode(std::span<char16_t> units, bool last, int32_t *offse
   const char *source = text_.data() + read_;
   UErrorCode error = U_ZERO_ERROR;
   ucnv_toUnicode(from_, &target, target + std::min(units.size(), mostUnits), &source,
-                 text_.data() + text_.size(), offsets, last, &error);
+                 text_.data() + text_.size(), offsets, static_cast<UBool>(last), &error);
   if (error == U_MEMORY_ALLOCATION_ERROR) {
     throw std::bad_alloc();
   }

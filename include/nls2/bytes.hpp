@@ -86,7 +86,8 @@ private:
 class byte_room {
 public:
   constexpr byte_room(void *data, std::size_t size) noexcept : data_(data), size_(size) {}
-  template <detail::writable_bytes Range>
+  template <detail::writable_bytes Range> // a room itself is none
+  // NOLINTNEXTLINE(bugprone-forwarding-reference-overload)
   constexpr byte_room(Range &&range) noexcept : data_(std::data(range)), size_(std::size(range)) {}
 
   [[nodiscard]] constexpr void *data() const noexcept { return data_; }

@@ -170,6 +170,7 @@ public:
   // A copy has learned what the other one has, and is at the beginning of a text. Empty on failure.
   // Errors: 32 (no_memory); 37 (invalid_argument) for a copy of an empty one. Without exceptions
   // this is the only way to copy.
+  // NOLINTNEXTLINE(readability-redundant-member-init): GCC warns without it
   translator(const translator &other, error_ref error NLS2_MAY_OMIT) : owner() {
     NLS2F_Translator *opened = nullptr;
     const std::int32_t status = NLS2F_CloneTranslator(other.get(), &opened);
