@@ -1,10 +1,10 @@
-# What cmake --install puts where: headers, libraries, the command, manual pages, the CMake package and the
+# What cmake --install installs: headers, libraries, the command, manual pages, the CMake package and the
 # pkg-config files. The installed tree can be moved as a whole.
 
 include(CMakePackageConfigHelpers)
 find_program(ZELNLS2_AWK NAMES awk mawk gawk REQUIRED)
 
-# What names no component serves those who build programs.
+# Files without a component are for those who build programs.
 set(CMAKE_INSTALL_DEFAULT_COMPONENT_NAME development)
 set(_package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/zelnls2)
 add_custom_target(manual_pages ALL)

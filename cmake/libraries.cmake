@@ -5,7 +5,7 @@ include(CheckCXXCompilerFlag)
 check_cxx_compiler_flag(-fcf-protection ZELNLS2_HAS_CF_PROTECTION) # x86
 check_cxx_compiler_flag(-mbranch-protection=standard ZELNLS2_HAS_BRANCH_PROTECTION) # ARM
 
-# Release builds only: sanitizers replace the same functions, and a debugger is better off without.
+# Only in release builds: sanitizers replace the same functions, and debug builds have no use for it.
 function(harden)
   foreach(target IN LISTS ARGN)
     target_compile_options(

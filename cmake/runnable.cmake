@@ -1,5 +1,5 @@
-# What a test starts as a child: the program itself or, where the build is for another machine, a
-# script that runs it under the emulator.
+# The program that a test starts: the built program or, if the build is for another machine, a script that
+# runs it in the emulator.
 
 function(runnable_file variable target)
   if(NOT CMAKE_CROSSCOMPILING_EMULATOR)

@@ -1,4 +1,4 @@
-/* A host with trace and lock services of its own: the library must call these, not libzelhost's. */
+/* A host with its own trace and lock services: the library must call these, not libzelhost's. */
 
 #include "host_services.h"
 

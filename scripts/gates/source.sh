@@ -12,6 +12,26 @@ gate_shellcheck() {
   { grep -rlE '^#!.*\bbash$' scripts .ci examples && ls scripts/gates/*.sh; } | xargs shellcheck
 }
 
+lines_of() { # FOLDER...
+  git ls-files -z -- "$@" | xargs -0r cat | wc -l
+}
+
+# Tests are at most 26 % of the product and themselves, and with properties/ and proof/ at most 34 % of
+# all of these. Every line of every file counts. No line of a case file has more than 120 columns.
+gate_share() {
+  need git
+  local product tests beside result=0
+  product=$(($(lines_of include host src fields tools python) - $(lines_of python/tests)))
+  tests=$(lines_of tests python/tests)
+  beside=$(lines_of properties proof)
+  echo "the product has $product lines, tests/ $tests, properties/ and proof/ $beside"
+  ((100 * tests <= 26 * (product + tests))) || { echo "tests/ is over 26 %"; result=1; }
+  ((100 * (tests + beside) <= 34 * (product + tests + beside))) ||
+    { echo "tests/, properties/ and proof/ are over 34 %"; result=1; }
+  ! git ls-files -z '*.cases' | xargs -0 grep -nE '^.{121}' || { echo "over 120 columns"; result=1; }
+  return $result
+}
+
 # Files have at most 350 lines, and open with what they are for. An interface may be longer.
 gate_files() {
   need git

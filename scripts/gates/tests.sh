@@ -13,3 +13,14 @@ gate_asan() {
 gate_tsan() {
   build tsan && TSAN_OPTIONS=halt_on_error=1 run_tests tsan
 }
+
+gate_faults() {
+  need g++ cmake ninja python3
+  scripts/faults 40
+}
+
+# Twenty seconds a property.
+gate_fuzz() {
+  need clang++-14 cmake ninja
+  scripts/fuzz 20
+}
