@@ -1,19 +1,13 @@
 // Opens and closes layouts, and tells what their fields are.
 #include "layout/layout.h"
 
-#include "guard.h"
-#include "layout/layout_parser.h"
-
 #include <memory>
 
 using namespace zelfields;
 
 int32_t NLS2F_OpenLayout(const char *text, int64_t length, const NLS2F_Page *page, uint32_t options,
                          NLS2F_Layout **layout, NLS2F_Problem *problem) {
-  if (layout != nullptr) {
-    *layout = nullptr;
-  }
-  if (!isRange(text, length) || page == nullptr || layout == nullptr || !isProblem(problem)) {
+  if (!cleared(layout) || !isRange(text, length) || page == nullptr || !isProblem(problem)) {
     return NLS2_ERR_INVALID_PARAMETER;
   }
   if ((options & ~uint32_t{NLS2F_LAYOUT_SHORT | NLS2F_LAYOUT_WRITES}) != 0) {
@@ -21,9 +15,9 @@ int32_t NLS2F_OpenLayout(const char *text, int64_t length, const NLS2F_Page *pag
   }
   return guarded([&]() -> int32_t {
     auto made = std::make_unique<NLS2F_Layout>();
-    LayoutParser parser(*page, options, *made);
-    if (!parser.parse(viewOf(text, length))) {
-      return setProblem(problem, parser.fault());
+    ProblemFacts fault;
+    if (!parseLayout(viewOf(text, length), *page, options, *made, fault)) {
+      return setProblem(problem, fault);
     }
     *layout = made.release();
     return 0;
@@ -33,7 +27,7 @@ int32_t NLS2F_OpenLayout(const char *text, int64_t length, const NLS2F_Page *pag
 void NLS2F_CloseLayout(NLS2F_Layout *layout) { delete layout; }
 
 int32_t NLS2F_LayoutSize(const NLS2F_Layout *layout, int64_t *fields, int64_t *length) {
-  if (layout == nullptr || fields == nullptr || length == nullptr) {
+  if (!cleared(fields, length) || layout == nullptr) {
     return NLS2_ERR_INVALID_PARAMETER;
   }
   *fields = static_cast<int64_t>(layout->entries.size());

@@ -1,9 +1,9 @@
 // An open layout: the fields of a record.
 #pragma once
 
-#include "nls2_fields.h"
+#include "pages/page.h"
+#include "problem.h"
 
-#include <string>
 #include <vector>
 
 struct NLS2F_Layout {
@@ -16,3 +16,11 @@ struct NLS2F_Layout {
   std::vector<Entry> entries;
   int64_t length = 0;
 };
+
+namespace zelfields {
+
+// False with the fault if the text is not a layout. Throws std::bad_alloc.
+bool parseLayout(std::string_view text, const NLS2F_Page &page, uint32_t options,
+                 NLS2F_Layout &layout, ProblemFacts &fault);
+
+} // namespace zelfields

@@ -1,5 +1,4 @@
 // NLS2F_NumberToText and NLS2F_TextToNumber: numbers as "-123.45".
-#include "guard.h"
 #include "numbers/number.h"
 #include "problem.h"
 
@@ -159,10 +158,7 @@ using namespace zelfields;
 
 int32_t NLS2F_NumberToText(const NLS2F_Field *field, const void *bytes, char *text, int64_t room,
                            int64_t *written, NLS2F_Problem *problem) {
-  if (written != nullptr) {
-    *written = 0;
-  }
-  if (!isWhole(field) || bytes == nullptr || !isRange(text, room) || written == nullptr ||
+  if (!cleared(written) || !isWhole(field) || bytes == nullptr || !isRange(text, room) ||
       !isProblem(problem)) {
     return NLS2_ERR_INVALID_PARAMETER;
   }

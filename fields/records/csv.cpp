@@ -1,5 +1,4 @@
 // CSV as of RFC 4180: where its records end, and NLS2F_SplitCsv and NLS2F_JoinCsv.
-#include "guard.h"
 #include "records/reader.h"
 
 #include <cstring>
@@ -153,11 +152,8 @@ using namespace zelfields;
 
 int32_t NLS2F_SplitCsv(const void *record, int64_t length, void *out, NLS2F_Span *fields,
                        int64_t capacity, int64_t *count, NLS2F_Problem *problem) {
-  if (count != nullptr) {
-    *count = 0;
-  }
-  if (!isRange(record, length) || !isRange(out, length) || !isRange(fields, capacity) ||
-      count == nullptr || !isProblem(problem)) {
+  if (!cleared(count) || !isRange(record, length) || !isRange(out, length) ||
+      !isRange(fields, capacity) || !isProblem(problem)) {
     return NLS2_ERR_INVALID_PARAMETER;
   }
   CsvSplitter splitter(viewOf(record, length), static_cast<char *>(out));
@@ -176,10 +172,7 @@ int32_t NLS2F_SplitCsv(const void *record, int64_t length, void *out, NLS2F_Span
 
 int32_t NLS2F_JoinCsv(const void *bytes, const NLS2F_Span *fields, int64_t count, void *out,
                       int64_t room, int64_t *written, NLS2F_Problem *problem) {
-  if (written != nullptr) {
-    *written = 0;
-  }
-  if (!isRange(fields, count) || !isRange(out, room) || written == nullptr || !isProblem(problem)) {
+  if (!cleared(written) || !isRange(fields, count) || !isRange(out, room) || !isProblem(problem)) {
     return NLS2_ERR_INVALID_PARAMETER;
   }
   CsvOutput output(static_cast<char *>(out), room);

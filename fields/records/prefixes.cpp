@@ -80,7 +80,7 @@ Detail hintFor(const RecordFormat &format, Piece piece) {
   static constexpr Candidate candidates[] = {
       {{.kind = Kind::prefixed}, Detail::tryPrefixed},
       {{.kind = Kind::prefixed, .dataOnly = true}, Detail::tryData},
-      {{.kind = Kind::prefixed, .little = true}, Detail::tryPrefixedLittle},
+      {{.kind = Kind::prefixed, .little = true}, Detail::tryLittle},
       {{.kind = Kind::prefixed, .dataOnly = true, .little = true}, Detail::tryDataLittle},
       {{.kind = Kind::blocked}, Detail::tryBlocked}};
   if (holds(format, piece)) {

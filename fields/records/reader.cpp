@@ -1,7 +1,6 @@
 // Opens and closes readers, and finds the records in a piece of an input.
 #include "records/reader.h"
 
-#include "guard.h"
 #include "pages/character_bytes.h"
 #include "pages/page_traits.h"
 
@@ -122,10 +121,7 @@ using namespace zelfields;
 
 int32_t NLS2F_OpenReader(const char *format, const NLS2F_Page *page, NLS2F_Reader **reader,
                          NLS2F_Problem *problem) {
-  if (reader != nullptr) {
-    *reader = nullptr;
-  }
-  if (format == nullptr || reader == nullptr || !isProblem(problem)) {
+  if (!cleared(reader) || format == nullptr || !isProblem(problem)) {
     return NLS2_ERR_INVALID_PARAMETER;
   }
   return guarded([&]() -> int32_t {
@@ -146,11 +142,8 @@ void NLS2F_CloseReader(NLS2F_Reader *reader) { delete reader; }
 int32_t NLS2F_ReadRecords(NLS2F_Reader *reader, const void *piece, int64_t length, int32_t last,
                           int64_t *read, NLS2F_Span *records, int64_t capacity, int64_t *count,
                           NLS2F_Problem *problem) {
-  if (read != nullptr && count != nullptr) {
-    *read = *count = 0;
-  }
-  if (reader == nullptr || !isRange(piece, length) || read == nullptr ||
-      !isRange(records, capacity) || count == nullptr || !isProblem(problem)) {
+  if (!cleared(read, count) || reader == nullptr || !isRange(piece, length) ||
+      !isRange(records, capacity) || !isProblem(problem)) {
     return NLS2_ERR_INVALID_PARAMETER;
   }
   Piece input{viewOf(piece, length), last != 0};

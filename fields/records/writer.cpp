@@ -1,5 +1,4 @@
 // Opens and closes writers, and writes records; NLS2F_GatherFields.
-#include "guard.h"
 #include "pages/character_bytes.h"
 #include "records/format.h"
 
@@ -104,10 +103,7 @@ using namespace zelfields;
 
 int32_t NLS2F_OpenWriter(const char *format, const NLS2F_Page *page, NLS2F_Writer **writer,
                          NLS2F_Problem *problem) {
-  if (writer != nullptr) {
-    *writer = nullptr;
-  }
-  if (format == nullptr || writer == nullptr || !isProblem(problem)) {
+  if (!cleared(writer) || format == nullptr || !isProblem(problem)) {
     return NLS2_ERR_INVALID_PARAMETER;
   }
   return guarded([&]() -> int32_t {
@@ -126,11 +122,8 @@ void NLS2F_CloseWriter(NLS2F_Writer *writer) { delete writer; }
 int32_t NLS2F_WriteRecords(const NLS2F_Writer *writer, const void *bytes, const NLS2F_Span *records,
                            int64_t count, void *out, int64_t room, int64_t *written, int64_t *done,
                            NLS2F_Problem *problem) {
-  if (written != nullptr && done != nullptr) {
-    *written = *done = 0;
-  }
-  if (writer == nullptr || !isRange(records, count) || !isRange(out, room) || written == nullptr ||
-      done == nullptr || !isProblem(problem)) {
+  if (!cleared(written, done) || writer == nullptr || !isRange(records, count) ||
+      !isRange(out, room) || !isProblem(problem)) {
     return NLS2_ERR_INVALID_PARAMETER;
   }
   for (; *done < count; ++*done) {

@@ -1,4 +1,4 @@
-// The words for problems of numbers, layouts and records.
+// Problems of numbers, layouts and records, and their words.
 #include "problem.h"
 
 #include <iterator>
@@ -6,43 +6,9 @@
 namespace zelfields {
 namespace {
 
-// One for each Detail, in its order.
-constexpr const char *details[] = {
-    "",
-    "bytes must follow the name: FIRST-LAST or LENGTH",
-    "bytes are FIRST-LAST or LENGTH",
-    "bytes are counted from 1",
-    "the range is empty",
-    "the field ends after byte 2147483647",
-    "a kind is text, raw, hex, packed, zoned, binary or page:NAME",
-    "the scale must be a number from 0 to 31",
-    "the option is unknown",
-    "the option does not belong to this kind",
-    "a field has one sign option, and unsigned has none",
-    "the kind has no numbers of this length",
-    "the code page is unknown",
-    "the code page of the records has no digits and signs for zoned numbers",
-    "blank=empty needs a code page with a blank of one byte",
-    "the name is not valid UTF-8",
-    "another field has this name",
-    "the field overlaps another one",
-    "there is no field",
-    "a format is fixed:N, lines, prefixed, blocked, csv or joined",
-    "the length must be a number from 1 to 2147483647",
-    "the format does not have this suffix, or has it already",
-    "this format is only read",
-    "this format is only written",
-    "the format needs a code page",
-    "the code page has no such line end",
-    "the line ends of the code page depend on the text before them",
-    "every line would begin with a byte-order mark; use a code page without one",
-    "the code page has no blank",
-    "prefixed",
-    "prefixed:little",
-    "prefixed:data",
-    "prefixed:data:little",
-    "blocked"};
-static_assert(std::size(details) == static_cast<std::size_t>(Detail::tryBlocked) + 1);
+#define ZELFIELDS_WORDS(name, words) words,
+constexpr const char *details[] = {ZELFIELDS_DETAILS(ZELFIELDS_WORDS)};
+#undef ZELFIELDS_WORDS
 
 std::string detailOf(const NLS2F_Problem &problem) {
   const bool isKnown = problem.needed > 0 && problem.needed < std::ssize(details);
@@ -76,6 +42,17 @@ std::string cutWords(const NLS2F_Problem &problem) {
 }
 
 } // namespace
+
+int32_t setProblem(NLS2F_Problem *problem, const ProblemFacts &facts) {
+  if (problem != nullptr) {
+    const uint32_t size = problem->size;
+    *problem = {size, facts.kind, facts.record, facts.offset, facts.needed, 0, 0, {}};
+    const std::size_t count = std::min(facts.bytes.size(), sizeof problem->bytes);
+    std::copy_n(facts.bytes.data(), count, problem->bytes);
+    problem->byteCount = static_cast<int32_t>(count);
+  }
+  return NLS2F_ERR_FIELD;
+}
 
 std::string wordsOf(const NLS2F_Problem &problem) {
   switch (problem.kind) {
