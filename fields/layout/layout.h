@@ -1,8 +1,8 @@
 // An open layout: the fields of a record.
 #pragma once
 
+#include "facts.h"
 #include "pages/page.h"
-#include "problem.h"
 
 #include <vector>
 

@@ -1,6 +1,6 @@
 // NLS2F_NumberColumn: one number of many records, as texts or 64-bit integers.
+#include "facts.h"
 #include "numbers/number.h"
-#include "problem.h"
 
 namespace zelfields {
 namespace {

@@ -1,6 +1,6 @@
 // NLS2F_NumberToText and NLS2F_TextToNumber: numbers as "-123.45".
+#include "facts.h"
 #include "numbers/number.h"
-#include "problem.h"
 
 #include <algorithm>
 #include <cstring>

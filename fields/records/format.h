@@ -1,8 +1,8 @@
 // How records are framed, as the texts of formats say.
 #pragma once
 
+#include "facts.h"
 #include "pages/page.h"
-#include "problem.h"
 
 #include <string>
 

@@ -1,4 +1,5 @@
 // NLS2F_DescribeProblem: a problem in English.
+#include "facts.h"
 #include "guard.h"
 #include "translate/translator.h"
 
@@ -55,7 +56,7 @@ std::string describe(const NLS2F_Translator *translator, const NLS2F_Problem &pr
   case NLS2F_TOO_LONG:
     return "the field has more than 2,147,483,647 bytes";
   default:
-    return "no problem";
+    return wordsOf(problem);
   }
 }
 

@@ -1,5 +1,5 @@
 // Problems of numbers, layouts and records, and their words.
-#include "problem.h"
+#include "facts.h"
 
 #include <iterator>
 
@@ -57,8 +57,10 @@ int32_t setProblem(NLS2F_Problem *problem, const ProblemFacts &facts) {
 std::string wordsOf(const NLS2F_Problem &problem) {
   switch (problem.kind) {
   case NLS2F_INVALID_NUMBER:
-    return problem.byteCount > 0 ? "the " + hexOf(problem) + " is not valid in a number"
-                                 : "a number must be here";
+    return problem.byteCount == 0
+               ? "a number must be here"
+               : (problem.byteCount == 1 ? "the byte " : "the bytes ") + hexOf(problem) +
+                     (problem.byteCount == 1 ? " is" : " are") + " not valid in a number";
   case NLS2F_NEGATIVE:
     return "the number is negative, but the field has no sign";
   case NLS2F_TOO_LARGE:
@@ -79,7 +81,7 @@ std::string wordsOf(const NLS2F_Problem &problem) {
   case NLS2F_INVALID_FORMAT:
     return detailOf(problem);
   default:
-    return "";
+    return "no problem";
   }
 }
 

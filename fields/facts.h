@@ -104,7 +104,7 @@ struct ProblemFacts {
 // The caller's problem, if there is one, gets the facts. The result is NLS2F_ERR_FIELD.
 int32_t setProblem(NLS2F_Problem *problem, const ProblemFacts &facts);
 
-// What is wrong, in English; empty for the kinds of translations.
+// What is wrong, in English, for the kinds of numbers, layouts and records.
 std::string wordsOf(const NLS2F_Problem &problem);
 
 } // namespace zelfields
