@@ -285,7 +285,7 @@ public:
       return error.report(result.status, "cannot translate the text");
     }
     const std::string place = "offset " + std::to_string(result.problem.offset()) + ": ";
-    return error.report(result.error(), place + "cannot translate the text");
+    return error.report(result.error(), place + describe(result.problem));
   }
 
 private:

@@ -71,7 +71,7 @@ TEST(Refusals, NameWhatTheyRefuse) {
   EXPECT_EQ(whatOf([&] { return stream(where, "/no/x", "r", "UTF-8"); }), "cannot open /no/x");
   EXPECT_TRUE(whatOf([&] {
                 return translate(code_page(1208), code_page(37), "x\u0416");
-              }).starts_with("offset 1: "));
+              }).starts_with("offset 1: the character U+0416"));
 }
 
 TEST(Refusals, OfArguments) {
@@ -95,7 +95,10 @@ TEST(Refusals, OfWhatIsEmpty) {
   EXPECT_EQ(STATUS_OF(bundle("x", nowhere, error)), 38);
   translator moved;
   std::array<char, 9> out{};
+  std::array<std::int64_t, 2> offsets{};
   EXPECT_EQ(moved.translate("x", out).error(), errc::invalid_argument);
+  EXPECT_EQ(moved.translate({"x", 1, 1}, out, offsets).status, 37);
+  EXPECT_EQ(moved.translate_chunk("x", true, out).status, 37);
   EXPECT_EQ(STATUS_OF(moved.translate("x", error)), 37);
   EXPECT_EQ(STATUS_OF(translator(moved, error)), 37);
   EXPECT_EQ(moved.max_size(9), 0U);

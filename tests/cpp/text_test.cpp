@@ -51,9 +51,40 @@ TEST(Translator, ReportsProblemsWithPlaceBytesAndWords) {
   const problem &found = lacks.problem;
   EXPECT_TRUE(!lacks && found.kind() == problem_kind::not_in_page && found.offset() == 2);
   EXPECT_TRUE(found.code_point() == 0x416 && found.bytes() == "\u0416");
+  EXPECT_TRUE(to.describe(found).ends_with("ibm-37_P100-1995")) << to.describe(found);
   EXPECT_EQ(to.translate("ABCD", out).problem.needed(), 4U);
   EXPECT_EQ(to.translate("ABCD", out).error(), errc::no_room);
   EXPECT_EQ(to.translate("\xFF", out).error(), std::errc::illegal_byte_sequence);
+}
+
+TEST(Translator, TranslatesColumnsWithinTheirSpans) {
+  translator strip(code_page(37), code_page(1208), {.padding = padding::strip});
+  const std::string records = "_\xC1\x40_\x51\xC2_\xC3\0_\0\xC1"s; // fields of two bytes
+  const column rows{std::string_view(records).substr(1), 2, 3};
+  std::array<char, 9> out{};
+  std::vector<std::int32_t> offsets(5);
+  std::array<std::uint8_t, 1> good{};
+  const column_result result = strip.translate(rows, out, offsets, good);
+  EXPECT_TRUE(result && result.done == 4 && result.failed == 1 && result.written == 5);
+  EXPECT_EQ(std::string_view(out.data(), 5), "A\u00E9BC");
+  EXPECT_EQ(offsets, (std::vector<std::int32_t>{0, 1, 4, 5, 5}));
+  EXPECT_TRUE(good[0] == 7 && result.problem.record() == 3);
+  std::vector<std::int64_t> wide(5), many(10);
+  const column_result stopped = strip.translate(rows, out, wide);
+  EXPECT_TRUE(!stopped && stopped.done == 3 && stopped.written == 5 && wide[3] == 5);
+  EXPECT_EQ(strip.translate(rows, out, many).status, 37) << "more rows than fields";
+  EXPECT_EQ(strip.translate({records, 1, 0}, out, many, good).status, 37) << "eight bits only";
+  EXPECT_TRUE(strip.translate({{}, 2, 3}, out, std::span(wide).first(1)));
+}
+
+TEST(Translator, TranslatesChunks) {
+  translator to(code_page("utf-8"), code_page("ibm-930"));
+  std::array<char, 32> out{};
+  const chunk_result first = to.translate_chunk("A\xE6\x97", false, out);
+  EXPECT_TRUE(first && first.read == 3);
+  const auto rest = std::span(out).subspan(first.written);
+  const chunk_result last = to.translate_chunk("\xA5", true, rest);
+  EXPECT_EQ(std::string(out.data(), first.written + last.written), to.translate("A\u65E5"));
 }
 
 TEST(Text, ConvertsStrictlyOrCounts) {
