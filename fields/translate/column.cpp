@@ -47,6 +47,7 @@ int32_t translateColumn(NLS2F_Translator &translator, NLS2F_Column &column,
     const bool isGood =
         translator.translate(field, {room.begin + written, most - written}, row, found);
     if (!isGood) {
+      row = {}; // nothing of it counts
       found.record = column.done;
       const bool full = isFull(found, translator.path.policy().width);
       found.needed += full ? written : 0;
