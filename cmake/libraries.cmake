@@ -2,8 +2,10 @@
 # hardened code. A library joins with harden() and export_symbols().
 
 include(CheckCXXCompilerFlag)
+set(CMAKE_REQUIRED_FLAGS -Werror) # Clang only warns about a flag of another machine
 check_cxx_compiler_flag(-fcf-protection ZELNLS2_HAS_CF_PROTECTION) # x86
 check_cxx_compiler_flag(-mbranch-protection=standard ZELNLS2_HAS_BRANCH_PROTECTION) # ARM
+unset(CMAKE_REQUIRED_FLAGS)
 
 # Only in release builds: sanitizers replace the same functions, and debug builds have no use for it.
 function(harden)
