@@ -45,7 +45,7 @@ int32_t translateColumn(NLS2F_Translator &translator, NLS2F_Column &column,
     NLS2F_Problem found;
     found.size = problem.size;
     const bool isGood =
-        translator.translate(field, {room.begin + written, most - written}, row, found);
+        translator.translate(field, {room.begin + written, most - written}, row, &found);
     if (!isGood) {
       row = {}; // nothing of it counts
       found.record = column.done;

@@ -17,14 +17,23 @@ constexpr char shiftIn = 0x0F;
 
 inline uint8_t byteAt(const char *place) { return static_cast<uint8_t>(*place); }
 
+// How many of eight bytes, as they lie in memory, come before the first whose top bit is set.
+inline std::ptrdiff_t firstMarked(uint64_t eight) {
+  return (std::endian::native == std::endian::little ? std::countr_zero(eight)
+                                                     : std::countl_zero(eight)) /
+         8;
+}
+
 // A source has
 //
 //   blockWidth    bytes of a code in a block of eight
 //   findsEnd      whether its blanks at the end are found from the end
 //   codesAreBytes whether only a row can tell that a code is a blank
 //   hasLeads      whether a row can tell that a byte begins a character of two
-//   isBlock()     whether eight codes of that width may follow; each needs a row nevertheless
+//   longest       bytes that next() may read
+//   codesInBlock() how many codes of that width follow, up to eight. Each needs a row nevertheless
 //   codeAt()      one of them
+//   isNoBlock()   whether none follows
 //   next()        the next code, past which it moves; noCode, or endOfField after a last shift
 //   last()        the code before `end`, which it moves back; noCode if there is none
 //   spell()       the field that holds a code's character alone, at most 4 bytes
@@ -35,10 +44,15 @@ inline uint8_t byteAt(const char *place) { return static_cast<uint8_t>(*place); 
 struct SingleByteSource {
   static constexpr std::ptrdiff_t blockWidth = 1;
   static constexpr bool findsEnd = true, codesAreBytes = true, hasLeads = false;
+  static constexpr std::ptrdiff_t longest = 1;
 
-  static bool isBlock(const char *, bool) { return true; }
+  static std::ptrdiff_t codesInBlock(const char *, bool) { return 8; }
+  static bool isNoBlock(const char *, bool) { return false; }
   static uint32_t codeAt(const char *block, std::size_t i) { return byteAt(block + i); }
-  static uint32_t next(const char *&source, const char *, bool &) { return byteAt(source++); }
+  template <bool isSafe>
+  static uint32_t next(const char *&source, const char *, bool &) {
+    return byteAt(source++);
+  }
   static uint32_t last(const char *, const char *&end) { return byteAt(--end); }
   static std::size_t spell(uint32_t code, char *bytes) {
     bytes[0] = static_cast<char>(code);
@@ -49,6 +63,7 @@ struct SingleByteSource {
 // Pages with characters of one and two bytes; those of more go the path.
 struct MixedSource : SingleByteSource {
   static constexpr bool findsEnd = false, hasLeads = true;
+  static constexpr std::ptrdiff_t longest = 2;
 
   static std::size_t spell(uint32_t code, char *bytes) {
     if (code < 0x100) {
@@ -63,8 +78,17 @@ struct MixedSource : SingleByteSource {
 // EBCDIC with shifts. Those that change nothing, and those with nothing between them, go the path.
 struct ShiftedSource : MixedSource {
   static constexpr bool hasLeads = false;
+  static constexpr std::ptrdiff_t longest = 3;
 
-  static bool isBlock(const char *, bool mode) { return !mode; }
+  static std::ptrdiff_t codesInBlock(const char *source, bool mode) {
+    constexpr uint64_t ones = 0x0101010101010101;
+    uint64_t eight = 0;
+    std::memcpy(&eight, source, sizeof eight);
+    eight ^= ones * shiftOut;
+    return mode ? 0 : firstMarked((eight - ones) & ~eight & ones << 7);
+  }
+  static bool isNoBlock(const char *, bool mode) { return mode; }
+  template <bool isSafe>
   static uint32_t next(const char *&source, const char *end, bool &mode) {
     if (!mode) {
       if (*source != shiftOut) {
@@ -72,14 +96,14 @@ struct ShiftedSource : MixedSource {
       }
       ++source;
       mode = true;
-      return nextPair(source, end);
+      return nextPair<isSafe>(source, end);
     }
     if (*source != shiftIn) {
-      return nextPair(source, end);
+      return nextPair<isSafe>(source, end);
     }
     ++source;
     mode = false;
-    return source == end ? endOfField : *source == shiftOut ? noCode : byteAt(source++);
+    return !isSafe && source == end ? endOfField : *source == shiftOut ? noCode : byteAt(source++);
   }
   static std::size_t spell(uint32_t code, char *bytes) {
     if (code < 0x100) {
@@ -92,8 +116,9 @@ struct ShiftedSource : MixedSource {
   }
 
 private:
+  template <bool isSafe>
   static uint32_t nextPair(const char *&source, const char *end) {
-    if (end - source < 2 || byteAt(source) < 0x40) {
+    if ((!isSafe && end - source < 2) || byteAt(source) < 0x40) {
       return noCode;
     }
     source += 2;
@@ -105,27 +130,30 @@ private:
 struct Utf8Source {
   static constexpr std::ptrdiff_t blockWidth = 1;
   static constexpr bool findsEnd = true, codesAreBytes = false, hasLeads = false;
+  static constexpr std::ptrdiff_t longest = 3;
 
-  static bool isBlock(const char *source, bool) {
+  static std::ptrdiff_t codesInBlock(const char *source, bool) {
     uint64_t eight = 0;
     std::memcpy(&eight, source, sizeof eight);
-    return (eight & 0x8080808080808080) == 0;
+    return firstMarked(eight & 0x8080808080808080);
   }
+  static bool isNoBlock(const char *source, bool) { return byteAt(source) >= 0x80; }
   static uint32_t codeAt(const char *block, std::size_t i) { return byteAt(block + i); }
+  template <bool isSafe>
   static uint32_t next(const char *&source, const char *end, bool &) {
     const uint32_t first = byteAt(source);
     if (first < 0x80) {
       ++source;
       return first;
     }
-    if (first >= 0xE0 && first < 0xF0 && end - source >= 3) {
+    if (first >= 0xE0 && first < 0xF0 && (isSafe || end - source >= 3)) {
       const uint32_t second = byteAt(source + 1) ^ 0x80U;
       const uint32_t third = byteAt(source + 2) ^ 0x80U;
       const uint32_t code = (first & 0x0F) << 12 | second << 6 | third;
       source += 3;
       return (second | third) < 0x40 && code >= 0x800 ? code : noCode;
     }
-    if (first >= 0xC2 && first < 0xE0 && end - source >= 2) {
+    if (first >= 0xC2 && first < 0xE0 && (isSafe || end - source >= 2)) {
       const uint32_t second = byteAt(source + 1) ^ 0x80U;
       source += 2;
       return second < 0x40 ? (first & 0x1F) << 6 | second : noCode;
@@ -139,7 +167,7 @@ struct Utf8Source {
     }
     const char *after = start;
     bool mode = false;
-    const uint32_t code = next(after, end, mode);
+    const uint32_t code = next<false>(after, end, mode);
     const bool isWhole = after == end;
     end = start;
     return isWhole ? code : noCode;
@@ -157,8 +185,10 @@ template <class Unit, bool isBig>
 struct UnitSource {
   static constexpr std::ptrdiff_t blockWidth = sizeof(Unit);
   static constexpr bool findsEnd = true, codesAreBytes = false, hasLeads = false;
+  static constexpr std::ptrdiff_t longest = sizeof(Unit);
 
-  static bool isBlock(const char *, bool) { return sizeof(Unit) == 2; }
+  static std::ptrdiff_t codesInBlock(const char *, bool) { return sizeof(Unit) == 2 ? 8 : 0; }
+  static bool isNoBlock(const char *, bool) { return sizeof(Unit) != 2; }
   static uint32_t codeAt(const char *block, std::size_t i) {
     block += i * sizeof(Unit);
     uint32_t code = 0;
@@ -168,8 +198,9 @@ struct UnitSource {
     }
     return code;
   }
+  template <bool isSafe>
   static uint32_t next(const char *&source, const char *end, bool &) {
-    if (end - source < blockWidth) {
+    if (!isSafe && end - source < blockWidth) {
       return noCode;
     }
     source += blockWidth;

@@ -11,6 +11,9 @@
 
 namespace zelfields {
 
+template <bool shifts>
+class Output;
+
 // Rows by the code of a character of the source page: its byte or two bytes, or its code point. The
 // path teaches a row when its character first occurs, so that the two cannot disagree. What has no
 // row - bytes that are not valid, sequences, supplementary characters, shifts at odd places - goes
@@ -24,40 +27,37 @@ public:
 
   // False if the path must translate the field.
   bool translate(std::string_view field, Room room, Done &done) {
-    return run_ != nullptr && translateField(field, room, done);
+    return run_ != nullptr && field.size() <= Path::longestField &&
+           (this->*run_)(field, room, done);
   }
 
 private:
-  // A field under way.
-  struct Run {
-    const char *source;
-    const char *end; // of the text, once it is known
-    char *target;
-    char *limit;
-    int64_t cut; // blanks
-    int64_t replaced;
-  };
-  using Runner = bool (Table::*)(Run &);
+  using Runner = bool (Table::*)(std::string_view field, Room room, Done &done);
 
   void reserve();
   void chooseSource();
   template <class Source>
   void use(std::size_t rows);
 
-  bool translateField(std::string_view field, Room room, Done &done);
+  // The loops. `source` is moved; `refused` are flags of rows that only the path can handle.
   template <class Source, bool shifts>
-  bool run(Run &field);
+  bool run(std::string_view field, Room room, Done &done);
   template <class Source, bool shifts>
-  bool runToEnd(Run &field);
+  bool runToEnd(std::string_view field, Room room, Done &done);
+  template <class Source, bool shifts>
+  int runBlocks(const char *&source, const char *end, Output<shifts> &output, Row refused,
+                bool mode);
   template <class Source>
-  void trim(Run &field);
-  template <class Output>
-  static bool finish(Output output, Run &field);
+  const char *trim(const char *begin, const char *end, int64_t &cut);
+  template <class Source, bool isSafe>
+  Row nextRow(const Row *rows, const char *&source, const char *end, bool &mode);
+  template <class Source, bool shifts>
+  bool finish(Output<shifts> output, const char *begin, const char *end, int64_t cut, Room room,
+              Done &done);
   bool addBlanks(int64_t cut, Room room, Done &done) const;
 
-  template <class Source>
-  Row nextRow(const Row *rows, const char *&source, const char *end, bool &mode);
-  Row rowOf(uint32_t code);
+  Row rowOf(uint32_t code) { return rows_[code] != 0 ? rows_[code] : learn(code); }
+  Row learn(uint32_t code);
   Row ask(uint32_t code);
 
   struct Free {
@@ -66,6 +66,8 @@ private:
 
   Path &path_;
   const bool isPadded_;
+  const bool putsBlanks_;
+  const int64_t width_; // of the text, at most
   Runner run_ = nullptr;
   std::size_t (*spell_)(uint32_t code, char *bytes) = nullptr;
   std::size_t size_ = 0; // in rows

@@ -55,6 +55,13 @@ int32_t openTranslator(const NLS2F_Page &from, const NLS2F_Page &to, const NLS2F
 
 using namespace zelfields;
 
+bool NLS2F_Translator::goPath(std::string_view field, Room room, Done &done,
+                              NLS2F_Problem *problem) {
+  abandonPieces();
+  NLS2F_Problem unseen;
+  return path.translate(field, room, done, problem != nullptr ? *problem : unseen);
+}
+
 int32_t NLS2F_OpenTranslator(const NLS2F_Page *from, const NLS2F_Page *to,
                              const NLS2F_Policy *policy, NLS2F_Translator **translator) {
   if (translator != nullptr) {
@@ -105,10 +112,9 @@ int32_t NLS2F_Translate(NLS2F_Translator *translator, const void *field, int64_t
   if (translator != nullptr && isRange(field, length) && isRange(out, room) && written != nullptr &&
       (problem == nullptr || isWhole(problem))) {
     status = guarded([&] {
-      NLS2F_Problem unseen;
-      const bool good = translator->translate(textOf(field, length), Room::of(out, room), done,
-                                              problem != nullptr ? *problem : unseen);
-      return good ? 0 : NLS2F_ERR_FIELD;
+      const bool isGood =
+          translator->translate(textOf(field, length), Room::of(out, room), done, problem);
+      return isGood ? 0 : NLS2F_ERR_FIELD;
     });
   }
   if (written != nullptr) {

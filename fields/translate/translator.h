@@ -17,11 +17,10 @@ struct NLS2F_Translator {
                    UErrorCode &error)
       : path(from, to, other.path.policy(), error), table(path, other.table) {}
 
-  // A whole field, which ends a text that goes piece by piece.
+  // A whole field, which ends a text that goes piece by piece. False if there is a problem.
   bool translate(std::string_view field, zelfields::Room room, zelfields::Done &done,
-                 NLS2F_Problem &problem) {
-    abandonPieces();
-    return table.translate(field, room, done) || path.translate(field, room, done, problem);
+                 NLS2F_Problem *problem) {
+    return table.translate(field, room, done) || goPath(field, room, done, problem);
   }
   void abandonPieces() {
     if (pieces) {
@@ -34,6 +33,9 @@ struct NLS2F_Translator {
     }
     return *pieces;
   }
+
+  bool goPath(std::string_view field, zelfields::Room room, zelfields::Done &done,
+              NLS2F_Problem *problem);
 
   zelfields::Path path;
   zelfields::Table table;
