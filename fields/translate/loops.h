@@ -152,10 +152,15 @@ template <class Source, bool isSafe>
 template <class Source>
 inline const char *Table::trim(const char *begin, const char *end, int64_t &cut) {
   if constexpr (Source::codesAreBytes) {
+    constexpr Row cuts = row::blank | row::null;
+    const Row *const rows = rows_.get();
     while (end - begin >= EightRows::count) {
       const char *const start = end - EightRows::count;
-      const Row common = EightRows::of<Source>(rows_.get(), start).common();
-      if ((common & (row::blank | row::null)) == 0) {
+      if ((rows[byteAt(start)] & rows[byteAt(end - 1)] & cuts) == 0) {
+        break;
+      }
+      const Row common = EightRows::of<Source>(rows, start).common();
+      if ((common & cuts) == 0) {
         break;
       }
       cut += (common & row::blank) != 0 ? EightRows::count : 0;

@@ -34,8 +34,8 @@ struct NLS2F_Translator {
     return *pieces;
   }
 
-  bool goPath(std::string_view field, zelfields::Room room, zelfields::Done &done,
-              NLS2F_Problem *problem);
+  [[gnu::noinline]] bool goPath(std::string_view field, zelfields::Room room, zelfields::Done &done,
+                                NLS2F_Problem *problem);
 
   zelfields::Path path;
   zelfields::Table table;
