@@ -18,11 +18,10 @@ void greet(std::string_view language, std::string_view directory, std::vector<st
   const nls2::code_page utf8("utf-8");
   const nls2::locale locale(nls2::language_id(language), 1208);
   const nls2::bundle messages(directory, locale);
-  const auto before = [&](const std::string &left, const std::string &right) {
-    int32_t status = 0;
-    return NLS2_Strcoll(locale.get(), left.c_str(), -1, right.c_str(), -1, 0, &status) < 0;
-  };
-  std::ranges::sort(names, before);
+  nls2::collator order(language, utf8);
+  std::ranges::sort(names, [&](const std::string &left, const std::string &right) {
+    return order.compare(left, right) < 0;
+  });
   for (const std::string &name : names) {
     std::cout << nls2::from_utf16(utf8, messages.string("greeting")) << ", " << name << "!\n";
   }

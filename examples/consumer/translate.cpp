@@ -1,4 +1,4 @@
-// Translates a field and writes it, with owners that release what they hold.
+// Translates a field, compares it and writes it, with owners that release what they hold.
 
 #include <nls2.hpp>
 #include <nls2/stream.hpp>
@@ -13,7 +13,8 @@ int main() {
     nls2::stream nothing(german, "/dev/null", "w", "ibm-1141");
     nothing.write_line(nls2::to_utf16(utf8, name));
     nothing.close();
-    if (name == "G\u00FC\u00DF") {
+    nls2::collator order(german.name(), utf8);
+    if (name == "G\u00FC\u00DF" && order.compare(name, "Gz") < 0) {
       return 0;
     }
     std::cerr << "wrong text: " << name << '\n';

@@ -40,7 +40,6 @@ struct OtherCategory : std::error_category {
 
 TEST(Refusals, AreStatusesWithWordsAndConditions) {
   EXPECT_EQ(category().message(15), "the output is too small (U_BUFFER_OVERFLOW_ERROR)");
-  EXPECT_EQ(category().message(33), "a failure of ICU (33)");
   for (const detail::status_row &row : detail::status_rows) {
     EXPECT_TRUE(row.status == 40 || std::string(row.name) == nls2_status_name(row.status));
   }
@@ -48,30 +47,28 @@ TEST(Refusals, AreStatusesWithWordsAndConditions) {
       {errc::no_memory, std::errc::not_enough_memory, {7, 32}},
       {errc::invalid_argument, std::errc::invalid_argument, {1, 8, 36, 37}},
       {errc::no_room, std::errc::no_buffer_space, {15}},
-      {errc::invalid_text, std::errc::illegal_byte_sequence, {10, 11, 12, 18, 19}},
-      {errc::not_found, {}, {2}}};
+      {errc::invalid_text, std::errc::illegal_byte_sequence, {10, 11, 12, 18, 19}}};
   for (const auto &[condition, standard, statuses] : rows) {
     for (int status = -1; status < 42; ++status) {
       const std::error_code code = make_status(status);
       const bool same = std::find(statuses.begin(), statuses.end(), status) != statuses.end();
       EXPECT_EQ(code == condition, same) << status;
       EXPECT_EQ(std::error_code(status, otherCategory) == condition, same) << status;
-      EXPECT_EQ(code == standard, same && standard != std::errc()) << status;
+      EXPECT_EQ(code == standard, same) << status;
     }
   }
 }
 
 TEST(Refusals, NameWhatTheyRefuse) {
   const locale where(language_id("de"), 1208);
-  EXPECT_TRUE(whatOf([] {
-                return code_page("ibm-1411");
-              }).starts_with("cannot open the code page ibm-1411 (similar: ibm-"));
+  const std::string unknown = whatOf([] { return code_page("ibm-1411"); });
+  EXPECT_EQ(unknown.find("cannot open the code page ibm-1411 (similar: ibm-"), 0U) << unknown;
   EXPECT_EQ(whatOf([] { return language_id("xx"); }), "cannot find the language xx");
   EXPECT_EQ(whatOf([&] { return bundle("/no", where); }), "cannot open the resource bundle /no");
   EXPECT_EQ(whatOf([&] { return stream(where, "/no/x", "r", "UTF-8"); }), "cannot open /no/x");
-  EXPECT_TRUE(whatOf([&] {
-                return translate(code_page(1208), code_page(37), "x\u0416");
-              }).starts_with("offset 1: the character U+0416"));
+  const std::string bad =
+      whatOf([] { return translate(code_page(1208), code_page(37), "\u0416"); });
+  EXPECT_EQ(bad.find("offset 0: the character U+0416"), 0U) << bad;
 }
 
 TEST(Refusals, OfArguments) {
@@ -79,7 +76,6 @@ TEST(Refusals, OfArguments) {
   const interpose::Held before = interpose::held();
   EXPECT_EQ(STATUS_OF(code_page("", error)), 37);
   EXPECT_EQ(STATUS_OF(code_page("cp37\0x"s, error)), 37);
-  EXPECT_EQ(STATUS_OF(code_page(std::string(256, 'x'), error)), 31);
   EXPECT_EQ(STATUS_OF(language_id("de_at", error)), 39);
   EXPECT_EQ(STATUS_OF(name_of(language_id(255), error)), 39);
   EXPECT_EQ(STATUS_OF(locale(language_id(0), 37, error)), 39);
@@ -90,9 +86,9 @@ TEST(Refusals, OfArguments) {
 
 TEST(Refusals, OfWhatIsEmpty) {
   const code_page none, utf8(1208);
-  const locale nowhere;
   EXPECT_EQ(STATUS_OF(translator(utf8, none, {}, error)), 37);
-  EXPECT_EQ(STATUS_OF(bundle("x", nowhere, error)), 38);
+  EXPECT_EQ(STATUS_OF(collator("de", none, {}, error)), 37);
+  EXPECT_EQ(STATUS_OF(bundle("x", locale(), error)), 38);
   translator moved;
   std::array<char, 9> out{};
   std::array<std::int64_t, 2> offsets{};
@@ -102,6 +98,7 @@ TEST(Refusals, OfWhatIsEmpty) {
   EXPECT_EQ(STATUS_OF(moved.translate("x", error)), 37);
   EXPECT_EQ(STATUS_OF(translator(moved, error)), 37);
   EXPECT_EQ(moved.max_size(9), 0U);
+  EXPECT_EQ(STATUS_OF(collator().sort_key("b", error)), 37);
 }
 
 TEST(Refusals, OfStreams) {
@@ -113,7 +110,6 @@ TEST(Refusals, OfStreams) {
   stream full(where, "/dev/full", "w", "UTF-8");
   full.write(u"x");
   EXPECT_EQ(STATUS_OF((full.close(error), 0)), ENOSPC);
-  EXPECT_EQ(STATUS_OF((full.write(u"x", error), 0)), 37) << "it is closed";
   stream file(where, "/dev/null", "w", "UTF-8");
   where.reset(); // a stream may outlive its locale, but not work without it
   EXPECT_EQ(STATUS_OF(stream(where, path, "w", "UTF-8", {}, error)), 38);

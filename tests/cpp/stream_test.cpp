@@ -11,8 +11,6 @@ namespace {
 using namespace std::string_literals;
 using namespace nls2;
 
-static_assert(!std::is_constructible_v<stream, locale, const char *, const char *, const char *>);
-
 class Streams : public testing::Test {
 protected:
   ~Streams() override { unlink(path.c_str()); }
