@@ -23,17 +23,9 @@ using detail::Counts;
 
 constexpr std::size_t ownedCounts = 64;
 constexpr std::size_t sharedCounts = 16;
+constinit Counts table[ownedCounts + sharedCounts] = {};
 
-struct Table {
-  Counts counts[ownedCounts + sharedCounts];
-
-  constexpr Table() : counts() {
-    for (std::size_t i = ownedCounts; i < ownedCounts + sharedCounts; ++i) {
-      counts[i].shared = true;
-    }
-  }
-};
-constinit Table table;
+bool isOwned(const Counts *counts) { return counts < table + ownedCounts; }
 
 constinit std::atomic<std::size_t> threads{0}; // that have read the list
 constinit std::atomic<bool> glancesExpected{false};
@@ -55,7 +47,7 @@ void giveWay(unsigned attempt) {
 }
 
 void waitForRound(uint32_t round) {
-  for (const Counts &counts : table.counts) {
+  for (const Counts &counts : table) {
     for (unsigned attempt = 0; counts.walksOfRound[round].load(std::memory_order_seq_cst) != 0;
          ++attempt) {
       giveWay(attempt);
@@ -69,8 +61,10 @@ void waitForRound(uint32_t round) {
 // the thread is seen by the thread.
 detail::Counts *detail::chooseCounts() {
   const std::size_t number = threads.fetch_add(1, std::memory_order_seq_cst);
-  const bool owned = barriersWork && number < ownedCounts;
-  ownCounts = &table.counts[owned ? number : ownedCounts + number % sharedCounts];
+  ownCounts = &table[number < ownedCounts ? number : ownedCounts + number % sharedCounts];
+  if (isOwned(ownCounts)) {
+    ownCounts->plain = barriersWork;
+  }
   return ownCounts;
 }
 
@@ -97,14 +91,14 @@ bool waitForWalkers() {
 
 bool isWalking() {
   const Counts *own = detail::ownCounts;
-  return own != nullptr && !own->shared &&
+  return own != nullptr && isOwned(own) &&
          (own->walksOfRound[0].load(std::memory_order_relaxed) != 0 ||
           own->walksOfRound[1].load(std::memory_order_relaxed) != 0);
 }
 
 void forgetOtherWalks() {
-  for (Counts &counts : table.counts) {
-    if (counts.shared || &counts != detail::ownCounts) {
+  for (Counts &counts : table) {
+    if (!isOwned(&counts) || &counts != detail::ownCounts) {
       counts.walksOfRound[0].store(0, std::memory_order_relaxed);
       counts.walksOfRound[1].store(0, std::memory_order_relaxed);
     }

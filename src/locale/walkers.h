@@ -8,8 +8,8 @@
 // ensure this take 6 ns each, too long for a glance at a single link. So a glance counts with plain
 // loads and stores, in counts that no other thread uses, and a removal that expects glances has the
 // kernel run a memory barrier in every running thread: membarrier(2), which takes microseconds. The
-// first threads that read the list get counts of their own. All later ones, and all threads of a
-// system without membarrier(2), share the rest, and glance as they walk.
+// first threads that read the list get counts of their own, and all later ones share the rest.
+// Those, and all threads of a system without membarrier(2), glance as they walk.
 #pragma once
 
 #include <atomic>
@@ -22,7 +22,7 @@ namespace detail {
 
 struct alignas(64) Counts {
   std::atomic<uint32_t> walksOfRound[2] = {};
-  bool shared = false;
+  bool plain = false; // glances need no locked instruction
 };
 
 extern constinit std::atomic<uint32_t> currentRound;
@@ -56,7 +56,7 @@ private:
       : Walk(locked, own != nullptr ? *own : *detail::chooseCounts()) {}
   Walk(bool locked, detail::Counts &own)
       : count_(own.walksOfRound[detail::currentRound.load(std::memory_order_relaxed)]),
-        locked_(locked || own.shared) {
+        locked_(locked || !own.plain) {
     if (locked_) {
       count_.fetch_add(1, std::memory_order_seq_cst);
     } else {
