@@ -48,6 +48,7 @@ TEST(Translator, ReportsProblemsWithPlaceBytesAndWords) {
   std::array<char, 3> out{};
   const field_result lacks = to.translate("AB\u0416", out);
   const problem &found = lacks.problem;
+  EXPECT_EQ(lacks.error(), make_status(U_INVALID_CHAR_FOUND));
   EXPECT_TRUE(!lacks && found.kind() == problem_kind::not_in_page && found.offset() == 2);
   EXPECT_TRUE(found.code_point() == 0x416 && found.bytes() == "\u0416");
   EXPECT_TRUE(to.describe(found).ends_with("ibm-37_P100-1995")) << to.describe(found);
