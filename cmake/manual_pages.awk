@@ -23,17 +23,15 @@ in_comment {
 }
 declaration != "" || /^(extern )?NLS2_API |^static inline |^enum |^typedef / {
   declaration = declaration $0 "\n"
-  if (declaration ~ /^(enum|typedef)[^(]*[{]/ ? !/}.*;$/ : !/[;{]$/) next
+  if (declaration ~ /^(enum|typedef)[^(]*[{]/ ? !/}.*;/ : !/[;{]$/) next
   if (declaration ~ /^(NLS2_API|static inline) [^(]*\(/) write_page()
   else if (declaration ~ /}/) keep_definition()
-  declaration = ""
   declared = 1
-  next
+  declaration = ""
 }
 /^$/ {
   if (banner != "" && comment != "" && !declared) common = common comment "\n"
-  comment = ""
-  declared = 0
+  comment = declared = ""
 }
 
 function keep_definition() {
@@ -45,6 +43,11 @@ function keep_definition() {
 }
 
 function has_word(text, word) { return (" " text " ") ~ ("[^A-Za-z0-9_]" word "[^A-Za-z0-9_]") }
+
+function has_constant(text, definition,    words, n) {
+  for (n = split(definition, words, /[^A-Za-z0-9_]+/); n > 0; --n)
+    if (words[n] ~ /^NLS2F?_[A-Z_0-9]+$/ && words[n] !~ /_ERR_/ && has_word(text, words[n])) return 1
+}
 
 function write_page(    name, page, i) {
   sub(/^NLS2_API |^static inline /, "", declaration)
@@ -60,7 +63,8 @@ function write_page(    name, page, i) {
   printf "%s%s%s", formatted(comment), common ? ".Ss Shared with related functions\n" : "",
     formatted(common) > page
   for (i = 1; i <= count; ++i)
-    if (has_word(declaration, type_name[i]) || has_word(definitions[i] about[i], name))
+    if (has_word(declaration, type_name[i]) || has_word(definitions[i] about[i], name) ||
+        has_constant(comment, definitions[i]))
       printf ".Ss %s\n%s.Bd -literal\n%s.Ed\n", type_name[i] == "-" ? "Options" : type_name[i],
         formatted(about[i]), escaped(definitions[i]) > page
   print ".Pp\nThe conventions at the beginning of\n.In " header "\nhold for every function." > page
@@ -74,8 +78,7 @@ function references(text, name,    words, n, i, j, found, sorted, last, out) {
   for (i = 1; i <= n; ++i) {
     if (words[i] !~ /^NLS2F?_[A-Z]?[a-z]/ || words[i] == name || (words[i] in found)) continue
     found[words[i]]
-    for (j = ++last; j > 1 && tolower(sorted[j - 1]) > tolower(words[i]); --j)
-      sorted[j] = sorted[j - 1]
+    for (j = ++last; j > 1 && tolower(sorted[j - 1]) > tolower(words[i]); --j) sorted[j] = sorted[j - 1]
     sorted[j] = words[i]
   }
   for (i = 1; i in sorted; ++i) out = out ".Xr " sorted[i] " 3 ,\n"
@@ -104,16 +107,13 @@ function formatted(text,    lines, n, i, out, literal, gap) {
   for (i = 1; i <= n; ++i) {
     if (lines[i] == "") { gap = out != ""; continue }
     if (lines[i] ~ /^  /) {
-      if (!literal) out = out ".Bd -literal\n"
-      else if (gap) out = out "\n"
-      literal = 1
+      out = out (literal ? (gap ? "\n" : "") : ".Bd -literal\n")
     } else {
-      if (literal) out = out ".Ed\n"
-      if (gap) out = out ".Pp\n"
-      literal = 0
+      out = out (literal ? ".Ed\n" : "") (gap ? ".Pp\n" : "")
+      gsub(/[.] /, ".\n", lines[i])
     }
+    literal = lines[i] ~ /^  /
     gap = 0
-    if (!literal) gsub(/[.] /, ".\n", lines[i])
     out = out lines[i] "\n"
   }
   return out (literal ? ".Ed\n" : "")
