@@ -23,7 +23,9 @@ _nls2_candidates() {
   case $2 in
     --from | --to | --codepage | --encoding) _nls2_pages ;;
     --locale) _nls2_locales ;;
-    --newline) echo none lf crlf nel ;;
+    --read) echo lines fixed: prefixed prefixed:data blocked csv ;;
+    --write) echo lines lines:crlf lines:nel fixed: prefixed prefixed:data csv joined ;;
+    --blanks) echo keep ;;
     --on-error) echo stop replace reject ;;
     *)
       case $1:$3 in

@@ -16,15 +16,17 @@ import time
 from collections import Counter
 from concurrent.futures import ThreadPoolExecutor
 
-TRANSLATE = ["translate", "--from", "37", "--to", "1208", "--record-length", "80"]
+TRANSLATE = ["translate", "--from", "37", "--to", "1208", "--read", "fixed:80"]
 # arguments, and the exit codes of a failure
 COMMANDS = [
-    (TRANSLATE + ["--strip", "--newline", "lf", "IN", "-o", "OUT"], (1,)),
-    (TRANSLATE + ["--fields", "1-10,11-20=hex", "--csv", "--sync", "IN", "-o", "OUT"], (1,)),
-    (TRANSLATE + ["--strip", "--verify", "--report", "REPORT", "IN", "-o", "OUT"], (1,)),
+    (TRANSLATE + ["--write", "lines", "IN", "-o", "OUT"], (1,)),
+    (["translate", "--from", "37", "--read", "fixed:80", "--write", "csv", "--fields", "1-10;11-20=hex",
+      "--sync", "IN", "-o", "OUT"], (1,)),
+    (TRANSLATE + ["--write", "prefixed", "--verify", "--report", "REPORT", "IN", "-o", "OUT"], (1,)),
     (["cat", "--encoding", "ibm-37", "IN"], (2,)),
     (["dump", "--from", "37", "IN"], (1,)),
-    (TRANSLATE[:-2] + ["--lines", "--on-error", "reject", "--rejects", "OUT", "TEXT"], (1,)),
+    (TRANSLATE[:-1] + ["lines", "--write", "joined", "--on-error", "reject", "--rejects", "OUT", "TEXT"],
+     (1,)),
     (["codepages", "37", "--json"], (1,)),
     (["codepages", "--chart", "37"], (1,)),
     (["locales", "de_DE"], (1,)),

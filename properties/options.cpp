@@ -1,7 +1,7 @@
-// The command line of nls2: the parser over every command's tables, and the list of --fields.
+// The command line of nls2: the parser over every command's tables, and the plan of a translation.
 
 #include "base/options.h"
-#include "convert/translate_options.h"
+#include "convert/plan.h"
 #include "property.h"
 
 #include <getopt.h>
@@ -24,21 +24,31 @@ std::string line(property::Input &input, const std::vector<const char *> &pieces
   return text;
 }
 
-void fieldList(property::Input &input) {
+// Formats and fields make a plan, or a message.
+void plan(property::Input &input) {
+  const auto format = [&] {
+    return line(input, {"fixed:", "80", "lines", "prefixed", ":data", "csv", ":crlf", "joined"});
+  };
   TranslateOptions options;
-  options.from = 37;
-  options.recordLength = 1 + input.below(200);
-  options.csv = input.flag();
-  const std::string list =
-      line(input, {"1-", "1-10", "11-", "200", ",", "=", "hex", "=raw", ":", "5", "930"});
   try {
-    const std::vector<FieldSpec> fields = parseFields(list, options);
-    check(!fields.empty(), "a list that parses has a field");
-    for (const FieldSpec &field : fields) {
-      check(field.begin < field.end && field.end <= options.recordLength,
-            "a field lies in the record");
-      check(!options.csv || field.kind != FieldSpec::Kind::raw, "no raw bytes in CSV");
+    options.read = format();
+    options.write = format();
+    if (input.flag()) {
+      options.from = CodePage("", input.flag() ? "37" : "utf-16");
+      options.to = CodePage("", input.flag() ? "930" : "1200");
     }
+    if (input.flag()) {
+      options.fields = line(input, {"1-", "1-10", "11-", "=", "hex", ";", "packed.2", "page:37"});
+    }
+    options.keepsBlanks = input.flag();
+    const Plan made(options);
+    check(!made.fields.empty(), "a plan has a field");
+    for (const FieldPlan &field : made.fields) {
+      const int64_t end = field.field.first + field.field.length;
+      check(made.readLength == 0 || end <= made.readLength, "a field lies in the record");
+      check(!field.isNumber() || made.readsCsv != made.writesCsv, "numbers are text in CSV");
+    }
+    check(emptyRecord(made).empty() || made.fillsLayout(), "only a layout is filled");
   } catch (const Error &refused) {
     check(refused.code() == exitUsage && refused.what()[0] != '\0', "a usage error with a message");
   }
@@ -51,9 +61,9 @@ void commandLine(property::Input &input) {
                                        sortCommand, localesCommand,   translateCommand};
   const Command command = input.oneOf(commands)();
   std::vector<std::string> words(1, "nls2");
-  std::string text =
-      line(input, {"--from\n37\n", "--to\n", "1208\n", "--record-length\n80\n", "--fields=1-10\n",
-                   "--str", "ip\n", "-o\n", "x\n", "--locale=de_DE\n", "-", "=", "--help\n"});
+  std::string text = line(input, {"--from\n37\n", "--to\n", "1208\n", "--read\nfixed:80\n",
+                                  "--fields=1-10\n", "--blan", "ks\nkeep\n", "-o\n", "x\n",
+                                  "--locale=de_DE\n", "-", "=", "--help\n"});
   for (size_t at = 0; at < text.size() && words.size() < 30;) {
     const size_t end = std::min(text.find('\n', at), text.size());
     words.push_back(text.substr(at, end - at));
@@ -77,6 +87,6 @@ void commandLine(property::Input &input) {
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   property::Input input(data, size);
-  input.flag() ? fieldList(input) : commandLine(input);
+  input.flag() ? plan(input) : commandLine(input);
   return 0;
 }

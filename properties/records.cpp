@@ -2,7 +2,7 @@
 
 #include "base/errors.h"
 #include "property.h"
-#include "text/record_reader.h"
+#include "text/record_source.h"
 
 #include <fcntl.h>
 #include <sys/mman.h>
@@ -29,56 +29,47 @@ private:
   int fd_;
 };
 
-void checkBatches(const RecordShape &shape, const std::string &bytes, const File &file) {
+// The wanted records of a file, with all that belongs to them, after what is before the first.
+std::string readAll(const RecordShape &shape, const File &file) {
   InputFile input(file.path());
-  RecordReader reader(input, shape);
-  RecordBatch batch;
+  RecordSource source(input, shape);
+  RecordPiece piece;
   std::string read;
-  uint64_t records = 0;
-  while (reader.read(batch)) {
-    while (const auto record = batch.next()) {
-      check(record->offset == read.size() && record->number == ++records, "it knows its place");
-      check(record->whole.starts_with(record->text), "a line begins with its text");
-      check(shape.length == 0 || record->text.size() == shape.length ||
-                read.size() + record->whole.size() == bytes.size(),
-            "only the last record is short");
-      read += record->whole;
+  uint64_t number = shape.skip;
+  for (bool isFirst = true; source.read(piece); isFirst = false) {
+    if (piece.problem) {
+      check(shape.skip != 0 || piece.number == number + 1, "a problem knows its record");
+      return read.append(piece.bytes.bytes());
     }
+    read += isFirst && shape.skip == 0 ? source.preamble() : "";
+    check(!piece.records.empty() && piece.number == number + 1, "records are counted");
+    for (size_t i = 0; i < piece.records.size(); ++i) {
+      check(shape.skip != 0 || piece.offsetOf(i) == read.size(), "a record knows its place");
+      check(piece.wholeOf(i).find(piece.text(i)) != std::string_view::npos, "its text is in it");
+      read += piece.wholeOf(i);
+    }
+    number += piece.records.size();
   }
-  check(read == bytes, "all is read, once");
-}
-
-void checkFile(const RecordShape &shape, const std::string &bytes, const File &file) {
-  const std::string terminator =
-      shape.length == 0 ? lineFeedOf(CodePage(shape.page, ""), !shape.isText) : "";
-  RecordFile records(file.path(), shape);
-  std::string read;
-  while (const auto record = records.next()) {
-    check(shape.length == 0 || record->text.size() == shape.length, "a whole record");
-    read.append(record->text).append(terminator);
-  }
-  check(shape.isText || read == bytes || read == bytes + terminator, "all lines are read, once");
+  return read;
 }
 
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   property::Input input(data, size);
-  RecordShape shape;
   const property::Page page = input.page();
-  shape.page = page.number;
-  shape.length = input.below(41);
-  shape.isText = input.flag();
-  shape.mostInBatch = 1 + input.below(4);
-  const std::string bytes = input.text(page);
-  const File file(bytes);
+  const char *const formats[] = {"lines", "lines:lf", "fixed:1", "fixed:7", "prefixed", "csv"};
   try {
-    checkBatches(shape, bytes, file);
-  } catch (const Error &refused) {
-    check(refused.code() != 0, "an error with a code");
-  }
-  try {
-    checkFile(shape, bytes, file);
+    RecordShape shape{.format = input.oneOf(formats),
+                      .page = CodePage("", std::to_string(page.number))};
+    shape.mostInPiece = 1 + input.below(4);
+    const uint64_t skip = input.below(4);
+    const std::string bytes = input.text(page);
+    const File file(bytes);
+    const std::string all = readAll(shape, file);
+    check(all == bytes || (shape.format == "csv" && bytes.starts_with(all)), "all is read, once");
+    shape.skip = skip;
+    check(all.ends_with(readAll(shape, file)), "what is not skipped is the rest");
   } catch (const Error &refused) {
     check(refused.code() != 0, "an error with a code");
   }

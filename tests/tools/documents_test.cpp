@@ -50,14 +50,14 @@ TEST(Completion, OffersPagesAndLocales) {
       {"translate --to = windows-93", "windows-932"},
       {"sort --codepage ibm-114", "ibm-1140"},
       {"cat --encoding UTF-16L", "UTF-16LE"},
-      {"codepages BI", "BIG5"},
+      {"codepages Bi", "Big5"},
       {"compare --locale de_B", "de_BE"},
       {"locales pos", "posix"},
-      {"translate --newline ne", "nel"},
+      {"translate --write pre", "prefixed:data"},
       {"find --locale = da", "da_DK"},
       {"translate --on-error rej", "reject"},
       {"help tr", "translate"},
-      {"sort --record-length 1 countr", ""}};
+      {"sort --read fixed:1 countr", ""}};
   for (const auto &[line, expected] : rows) {
     const auto found = completionsOf(line);
     EXPECT_EQ(std::ranges::count(found, expected), 1) << line;

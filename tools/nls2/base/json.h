@@ -61,16 +61,19 @@ public:
     require(json_array_append(value_.get(), value.value_.get()) == 0);
   }
 
-  // Indented by two blanks, with a newline at the end.
-  std::string text() const {
-    constexpr std::size_t style = JSON_INDENT(2) | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9);
+  // Indented by two blanks, or in one line; with a newline at the end.
+  std::string text() const { return dump(JSON_INDENT(2)); }
+  std::string line() const { return dump(JSON_COMPACT); }
+
+private:
+  std::string dump(std::size_t form) const {
+    const std::size_t style = form | JSON_ENCODE_ANY | JSON_REAL_PRECISION(9);
     std::string text(json_dumpb(value_.get(), nullptr, 0, style), '\0');
     require(!text.empty() &&
             json_dumpb(value_.get(), text.data(), text.size(), style) == text.size());
     return text + "\n";
   }
 
-private:
   explicit Json(json_t *owned) : value_(owned, json_decref) { require(owned != nullptr); }
 
   static void require(bool done) {

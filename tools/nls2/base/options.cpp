@@ -81,6 +81,9 @@ private:
       }
     }
     const bool isLong = code == 0;
+    if (isLong && longer.size() > 1) {
+      return usageError("option {} is ambiguous{}", printable(name), didYouMean(longer));
+    }
     return usageError("unknown option {}{}", printable(name),
                       didYouMean(isLong && longer.empty() ? nearNames(name, names) : longer));
   }

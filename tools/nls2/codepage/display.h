@@ -15,6 +15,11 @@ struct Display {
   int columns = 0;
 };
 
+inline std::u16string fromUtf8(const std::string &text) {
+  const auto units = icu::UnicodeString::fromUTF8(text);
+  return {units.getBuffer(), static_cast<std::size_t>(units.length())};
+}
+
 // Line separators would break the line, as control characters do.
 inline bool prints(UChar32 character) {
   return u_isprint(character) != 0 &&

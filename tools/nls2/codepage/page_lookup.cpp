@@ -2,12 +2,14 @@
 
 #include "codepage/page_lookup.h"
 
-#include "base/icu_memory.h"
 #include "codepage/code_page.h"
+#include "nls2/code_page.hpp"
 
 #include <algorithm>
-#include <iterator>
+#include <array>
+#include <fmt/ranges.h>
 #include <set>
+#include <unicode/ucnv.h>
 
 namespace nls2::tool {
 
@@ -15,31 +17,25 @@ namespace {
 
 constexpr std::array prefixes{"ibm-", "cp", "windows-"}; // people write these before numbers
 
-// Only the first three are set if the number does not open.
-struct PageFacts {
-  int32_t number = 0;
-  int32_t status = 0;
-  int32_t twoNulls = 0;
-  bool opens = false;
-  std::optional<std::string> converter; // nothing if it has no name
-  std::optional<int32_t> ccsid;
-  std::optional<int32_t> maxCharSize;
+// The numbers that nls2.h lists. What they open is found by asking the library.
+constexpr std::array<int32_t, 25> pagesWithNames{
+    874,   932,   936,   949,   950,   1200,  1208,  57352, 57355, 57356, 57357, 57358, 57359,
+    57360, 57361, 57362, 57363, 57365, 57366, 57367, 57368, 57369, 57370, 57371, 57372};
 
-  std::string name() const { return converter.value_or("without a name"); }
-};
-
-PageFacts factsOf(int32_t number) {
-  PageFacts facts;
-  facts.number = number;
-  const Converter opened(NLS2_MapCodepageIdToName(number, &facts.twoNulls, &facts.status));
-  requireMemory(make_status(facts.status));
-  if (opened) {
-    facts.opens = true;
-    facts.converter = converterOf(number);
-    facts.ccsid = facts.converter ? ccsidOf(*facts.converter) : std::nullopt;
-    facts.maxCharSize = ucnv_getMaxCharSize(opened.get());
+// The facts about a number or name; nothing if it does not open.
+std::optional<NLS2F_PageFacts> factsOf(const std::string &asked) {
+  auto facts = sized<NLS2F_PageFacts>();
+  const Page page = openPage(asked);
+  if (!page) {
+    return {};
   }
+  isDone(NLS2F_PageInfo(page.get(), &facts));
   return facts;
+}
+
+std::optional<std::string> converterOf(const std::string &asked) {
+  const auto facts = factsOf(asked);
+  return facts ? std::optional<std::string>(facts->name) : std::nullopt;
 }
 
 std::vector<std::string> windowsNamesOf(int32_t number) {
@@ -52,63 +48,48 @@ std::vector<std::string> windowsNamesOf(int32_t number) {
   return names;
 }
 
-std::string textOf(const PageFacts &facts) {
-  std::string text = fmt::format("Code page {}\n", facts.number);
+Answer answerFor(int32_t number) {
+  constexpr std::array kinds{"", "single-byte", "mixed", "unicode", "other"};
+  const auto facts = factsOf(std::to_string(number));
+  std::string text = fmt::format("Code page {}\n", number);
   const auto line = [&](const char *what, const std::string &value) {
     text += fmt::format("  {:<20} {}\n", what, value);
   };
-  line("opens", facts.opens ? "yes" : "no: " + statusText(facts.status));
-  if (facts.opens) {
-    line("converter", facts.name());
-    line("CCSID", facts.ccsid ? std::to_string(*facts.ccsid) : "none");
-    line("largest character", fmt::format("{} byte(s) per UTF-16 unit", *facts.maxCharSize));
+  const char *kind = facts ? kinds[static_cast<std::size_t>(facts->kind)] : nullptr;
+  line("opens", facts ? facts->name : "nothing in this ICU");
+  if (facts) {
+    line("kind", fmt::format("{}{}{}", kind, facts->hasStates != 0 ? ", with states" : "",
+                             facts->hasSignature != 0 ? ", with a signature" : ""));
   }
-  line("two-null terminator", facts.twoNulls != 0 ? "yes" : "no");
-  for (const std::string &name : windowsNamesOf(facts.number)) {
+  for (const std::string &name : windowsNamesOf(number)) {
     line("Windows name", name);
   }
-  return text;
+  return {text, Json::object({{"codepage", number},
+                              {"converter", facts ? Json(facts->name) : Json()},
+                              {"kind", kind},
+                              {"has_states", facts && facts->hasStates != 0},
+                              {"has_signature", facts && facts->hasSignature != 0},
+                              {"windows_names", Json::array(windowsNamesOf(number))}})};
 }
 
-Json jsonOf(const PageFacts &facts) {
-  return Json::object(
-      {{"codepage", facts.number},
-       {"opens", facts.opens},
-       {"converter", facts.converter},
-       {"ccsid", facts.ccsid},
-       {"twoNullTerminator", facts.twoNulls != 0},
-       {"maxCharSize", facts.maxCharSize},
-       {"windowsNames", Json::array(windowsNamesOf(facts.number))},
-       {"status", facts.status},
-       // ICU's name of the status is for programs; people get statusText().
-       {"statusName",
-        fmt::format("{} ({})", u_errorName(static_cast<UErrorCode>(facts.status)), facts.status)}});
-}
-
-// The numbers that a name may mean: ICU's CCSID, the library's Windows name, and the number inside
-// the name (1252 in windows-1252). If there are none, the listed numbers that open the same
-// converter.
-std::vector<int32_t> numbersOf(const std::string &name) {
-  std::vector<int32_t> numbers;
-  const auto add = [&](std::optional<int32_t> number) {
-    if (number && std::ranges::find(numbers, *number) == numbers.end()) {
-      numbers.push_back(*number);
+// The numbers that a name may mean: that which opens the same table, the library's Windows name,
+// and the number inside the name (1252 in windows-1252).
+std::set<int32_t> numbersOf(const std::string &name) {
+  std::set<int32_t> numbers;
+  if (const auto facts = factsOf(name); facts && facts->number != 0) {
+    numbers.insert(facts->number);
+  }
+  for (const CcsidMapEntry &entry : windows_names()) {
+    if (entry.name == name) {
+      numbers.insert(static_cast<int32_t>(entry.ccsid));
     }
-  };
-  add(ccsidOf(name));
-  int32_t status = U_ZERO_ERROR;
-  const uint32_t windows = NLS2_MapWindowsNameToCCSID(name.c_str(), &status);
-  if (status == U_ZERO_ERROR) {
-    add(static_cast<int32_t>(windows));
   }
   for (const std::string prefix : prefixes) {
     const auto inside =
         wholeNumber<int32_t>(name.starts_with(prefix) ? name.substr(prefix.size()) : "");
-    add(inside && converterOf(*inside) ? inside : std::nullopt);
-  }
-  if (const auto converter = converterOf(name); numbers.empty() && converter) {
-    std::ranges::copy_if(pagesWithNames, std::back_inserter(numbers),
-                         [&](int32_t number) { return converterOf(number) == converter; });
+    if (inside && openPage(std::to_string(*inside))) {
+      numbers.insert(*inside);
+    }
   }
   return numbers;
 }
@@ -117,23 +98,23 @@ std::vector<int32_t> numbersOf(const std::string &name) {
 std::vector<std::string> namesOf(int32_t number) {
   std::vector<std::string> names;
   for (const char *prefix : prefixes) {
-    if (std::string name = fmt::format("{}{}", prefix, number); converterOf(name)) {
+    if (std::string name = fmt::format("{}{}", prefix, number); openPage(name)) {
       names.push_back(std::move(name));
     }
   }
   return names;
 }
 
-Answer describe(const std::vector<int32_t> &numbers, const std::vector<std::string> &names) {
-  std::string text = numbers.empty() ? "The library has no number for this code page.\n" : "";
+Answer describe(const std::set<int32_t> &numbers, const std::vector<std::string> &names) {
+  std::string text;
   Json numberRows = Json::array();
   Json nameRows = Json::array();
   std::set<std::optional<std::string>> tables;
   for (const int32_t number : numbers) {
-    const PageFacts facts = factsOf(number);
-    text += textOf(facts);
-    numberRows.append(jsonOf(facts));
-    tables.insert(facts.converter);
+    const Answer answer = answerFor(number);
+    text += answer.text;
+    numberRows.append(answer.json);
+    tables.insert(converterOf(std::to_string(number)));
   }
   for (const std::string &name : names) {
     const auto converter = converterOf(name);
@@ -144,36 +125,24 @@ Answer describe(const std::vector<int32_t> &numbers, const std::vector<std::stri
   tables.erase(std::nullopt);
   const bool differ = tables.size() > 1;
   return {text + (differ ? "Warning: these open different tables.\n" : ""),
-          Json::object({{"numbers", numberRows}, {"names", nameRows}, {"tablesDiffer", differ}})};
+          Json::object({{"numbers", numberRows}, {"names", nameRows}, {"tables_differ", differ}})};
 }
 
 } // namespace
 
-Answer describePage(int32_t number) {
-  const PageFacts facts = factsOf(number);
-  return {textOf(facts), jsonOf(facts)};
-}
+Answer describePage(int32_t number) { return answerFor(number); }
 
 Answer lookUpPage(const std::string &asked) {
-  std::string name = asked;
-  if (const auto number = wholeNumber<int32_t>(asked)) {
-    if (std::ranges::find(pagesWithNames, *number) != pagesWithNames.end() ||
-        converterOf(*number)) {
-      return describe({*number}, namesOf(*number));
-    }
-    name = fmt::format("windows-{}", *number);
-    if (!windowsPage(name)) {
-      throw failure("code page {} is unknown: the library does not list it, and ICU has no "
-                    "converter with this CCSID",
-                    *number);
-    }
+  if (const auto number = wholeNumber<int32_t>(asked);
+      number &&
+      (std::ranges::find(pagesWithNames, *number) != pagesWithNames.end() || openPage(asked))) {
+    return describe({*number}, namesOf(*number));
   }
-  const auto numbers = name.empty() ? std::vector<int32_t>() : numbersOf(name);
-  if (numbers.empty() && !converterOf(name)) {
-    throw failure(
-        "code page \"{}\" is unknown: neither ICU nor the library's list of Windows names "
-        "has it{}",
-        printable(name), nearPages(name));
+  const std::string name = wholeNumber<int32_t>(asked) ? "windows-" + asked : asked;
+  const auto numbers = numbersOf(name);
+  if (numbers.empty() && !openPage(name)) {
+    throw failure("code page \"{}\" is unknown: ICU has no such page{}", printable(asked),
+                  nearPages(asked));
   }
   return describe(numbers, {name});
 }
@@ -183,18 +152,36 @@ Answer allPages() {
   Json numbers = Json::array();
   Json names = Json::array();
   for (const int32_t number : pagesWithNames) {
-    const PageFacts facts = factsOf(number);
-    text += fmt::format("{:>6}  {}{}\n", number,
-                        facts.opens ? facts.name() : "does not open: " + statusText(facts.status),
-                        facts.twoNulls != 0 ? ", two-null terminator" : "");
-    numbers.append(jsonOf(facts));
+    text += fmt::format("{:>6}  {}\n", number,
+                        converterOf(std::to_string(number)).value_or("nothing in this ICU"));
+    numbers.append(answerFor(number).json);
   }
   text += "\nWindows names:\n";
   for (const auto &[name, number] : windows_names()) {
     text += fmt::format("{:>6}  {}\n", number, name);
     names.append(Json::object({{"name", name}, {"codepage", number}}));
   }
-  return {text, Json::object({{"windowsNames", names}, {"numbers", numbers}})};
+  return {text, Json::object({{"windows_names", names}, {"numbers", numbers}})};
+}
+
+// Digits alone are a number.
+Answer allPageNames() {
+  std::set<std::string> names;
+  int64_t pages = 0;
+  isDone(NLS2F_PageCount(&pages));
+  for (int64_t i = 0; i < pages; ++i) {
+    const char *page = "";
+    UErrorCode status = U_ZERO_ERROR;
+    isDone(NLS2F_PageAt(i, &page));
+    const uint16_t count = ucnv_countAliases(page, &status);
+    for (uint16_t alias = 0; alias < count && U_SUCCESS(status); ++alias) {
+      const std::string name = ucnv_getAlias(page, alias, &status);
+      if (!wholeNumber<int32_t>(name)) {
+        names.insert(name);
+      }
+    }
+  }
+  return {fmt::format("{}\n", fmt::join(names, "\n")), Json::array(names)};
 }
 
 } // namespace nls2::tool

@@ -11,10 +11,13 @@ namespace nls2::tool {
 Answer describePage(int32_t number);
 
 // Describes a code page given by number or name, with a warning if its number and names open
-// different tables. Throws Error if neither the library nor ICU knows it.
+// different tables. Throws Error if ICU has no such page.
 Answer lookUpPage(const std::string &asked);
 
-// The library's tables: the listed numbers and the Windows names.
+// The numbers that open pages by name, and the Windows names.
 Answer allPages();
+
+// All names that open a page, a line each.
+Answer allPageNames();
 
 } // namespace nls2::tool

@@ -9,16 +9,15 @@
 #include <array>
 #include <memory>
 #include <optional>
-#include <unicode/ucnv.h>
 
 namespace nls2::tool {
 
 namespace {
 
 constexpr const char *notes =
-    R"(NAME is a code page number or the name of a converter of ICU: UTF-16, ISO-8859-1, ibm-1141. Line ends
-and nulls are kept. With UTF-16 and UTF-32 a byte-order mark is removed, and a file without one is
-read as big-endian; with any other NAME a mark is text (U+FEFF).
+    R"(NAME is a code page number or any name of ICU: UTF-16, ISO-8859-1, ibm-1141. Line ends and nulls are
+kept. With UTF-16 and UTF-32 a byte-order mark is removed, and a file without one is read as
+big-endian; with any other NAME a mark is text (U+FEFF).
 Exit codes: 1 invalid bytes were replaced, 2 error.
 )";
 
@@ -30,16 +29,7 @@ struct Arguments {
 // Converts files to UTF-8, one after another.
 class Copier {
 public:
-  explicit Copier(const std::string &encoding)
-      : encoding_(encoding), source_(openEncoding("--encoding", encoding)),
-        utf8_(CodePage(utf8Page, "UTF-8").take()) {
-    UErrorCode error = U_ZERO_ERROR;
-    ucnv_setToUCallBack(source_.get(), onInvalid, &replaced_, nullptr, nullptr, &error);
-    ucnv_setFromUCallBack(utf8_.get(), onLoneSurrogate, &replaced_, nullptr, nullptr, &error);
-    requireSuccess(error, "convert to UTF-8");
-  }
-  Copier(const Copier &) = delete; // the converters hold pointers to it
-  Copier &operator=(const Copier &) = delete;
+  explicit Copier(const std::string &encoding) : page_("--encoding", encoding) {}
 
   int copyAll(const std::vector<std::string> &paths) {
     int code = exitDone;
@@ -53,25 +43,24 @@ public:
 private:
   // Returns the exit code for this file. Reports a failure to read and goes on with the next file.
   int copy(const std::string &path) {
-    ucnv_reset(source_.get());
-    ucnv_reset(utf8_.get());
-    pivotSource_ = pivotTarget_ = pivot_.data();
+    translator_ = openTranslator(page_, CodePage::utf8(), NLS2F_AS_IS, NLS2F_REPLACE);
     replaced_ = 0;
     std::optional<InputFile> in;
     int code = exitDone;
     for (bool isOpen = true; isOpen;) {
-      std::string text;
+      std::size_t length = 0;
       try {
         if (!in) {
           out_.requireOther(in.emplace(path));
         }
-        isOpen = read(*in, text);
+        length = in->read(bytes_.data(), bytes_.size());
+        isOpen = length > 0;
       } catch (const Error &error) {
         complain(error.what());
         code = exitUsage;
         isOpen = false;
       }
-      out_.write(text);
+      write({bytes_.data(), length}, !isOpen);
     }
     if (replaced_ != 0) {
       reportReplaced(in->name());
@@ -80,56 +69,34 @@ private:
     return code;
   }
 
-  static void onInvalid(const void *counter, UConverterToUnicodeArgs *arguments, const char *bytes,
-                        int32_t length, UConverterCallbackReason reason, UErrorCode *error) {
-    count(counter, reason);
-    UCNV_TO_U_CALLBACK_SUBSTITUTE(nullptr, arguments, bytes, length, reason, error);
-  }
-
-  // UTF-8 cannot represent lone surrogates.
-  static void onLoneSurrogate(const void *counter, UConverterFromUnicodeArgs *arguments,
-                              const UChar *units, int32_t length, UChar32 character,
-                              UConverterCallbackReason reason, UErrorCode *error) {
-    count(counter, reason);
-    UCNV_FROM_U_CALLBACK_SUBSTITUTE(nullptr, arguments, units, length, character, reason, error);
-  }
-
-  static void count(const void *counter, UConverterCallbackReason reason) {
-    *static_cast<uint64_t *>(const_cast<void *>(counter)) += reason <= UCNV_IRREGULAR ? 1 : 0;
-  }
-
-  // Appends the next part of the file. False at its end.
-  bool read(InputFile &in, std::string &text) {
-    const std::size_t length = in.read(bytes_.data(), bytes_.size());
-    const char *source = bytes_.data();
-    UErrorCode error = U_BUFFER_OVERFLOW_ERROR;
-    while (error == U_BUFFER_OVERFLOW_ERROR) {
-      error = U_ZERO_ERROR;
-      char *target = utf8Bytes_.data();
-      ucnv_convertEx(utf8_.get(), source_.get(), &target, target + utf8Bytes_.size(), &source,
-                     bytes_.data() + length, pivot_.data(), &pivotSource_, &pivotTarget_,
-                     pivot_.data() + pivot_.size(), false, static_cast<UBool>(length == 0), &error);
-      text.append(utf8Bytes_.data(), target);
+  // Writes the next part of the file in UTF-8.
+  void write(std::string_view part, bool isLast) {
+    for (bool isDoneWith = false; !isDoneWith;) {
+      auto problem = sized<NLS2F_Problem>();
+      int64_t read = 0;
+      int64_t written = 0;
+      int64_t replaced = 0;
+      isDoneWith = isDone(NLS2F_TranslateChunk(
+          translator_.get(), part.data(), sizeOf(part), isLast ? 1 : 0, utf8_.data(),
+          static_cast<int64_t>(utf8_.size()), &read, &written, &replaced, &problem));
+      part.remove_prefix(static_cast<std::size_t>(read));
+      replaced_ += replaced;
+      out_.write({utf8_.data(), static_cast<std::size_t>(written)});
     }
-    requireSuccess(error, "convert to UTF-8");
-    return length > 0;
   }
 
   void reportReplaced(const std::string &name) const {
     const char *verb = replaced_ == 1 ? " is" : "s are";
-    complain(fmt::format("{}: {} byte sequence{} not valid {}; each was replaced", name, replaced_,
-                         verb, printable(encoding_))
+    complain(fmt::format("{}: {} byte sequence{} not valid in {}; each was replaced", name,
+                         replaced_, verb, page_.name())
                  .c_str());
   }
 
-  const std::string encoding_;
-  const Converter source_, utf8_;
-  uint64_t replaced_ = 0; // byte sequences and lone surrogates of the file
+  const CodePage page_;
+  Translator translator_;
+  int64_t replaced_ = 0; // byte sequences and lone surrogates of the file
   std::array<char, std::size_t{64} * 1024> bytes_;
-  std::array<char, std::size_t{64} * 1024> utf8Bytes_;
-  std::array<UChar, std::size_t{16} * 1024> pivot_; // text between the two converters
-  UChar *pivotSource_ = nullptr;
-  UChar *pivotTarget_ = nullptr;
+  std::array<char, std::size_t{64} * 1024> utf8_;
   OutputFile out_{"-"};
 };
 

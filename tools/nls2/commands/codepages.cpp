@@ -2,13 +2,13 @@
 // the difference of two pages.
 
 #include "base/options.h"
-#include "codepage/code_page.h"
 #include "codepage/display.h"
 #include "codepage/page_lookup.h"
+#include "codepage/page_text.h"
 #include "io/output_file.h"
 
 #include <algorithm>
-#include <fmt/format.h>
+#include <array>
 #include <memory>
 
 namespace nls2::tool {
@@ -16,7 +16,7 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(A number is the library's; anything else is a name as ICU spells it: cp037, latin1. Without PAGE, the
+    R"(Digits are a number of the library; anything else is a name that ICU opens. Without PAGE, the
 numbers that are opened by name and all Windows names are listed. In a chart, the row is the first
 hex digit of a byte and the column the second.
 )";
@@ -30,56 +30,36 @@ struct Arguments {
 };
 
 struct ByteMeaning {
-  const char *kind;
-  const char *mark;    // in a chart
+  Meaning kind;
   std::u16string text; // of a character; empty for all else
 };
 
 // The meaning of each single byte of a code page.
 struct ByteChart {
-  int32_t page;
+  std::string page;
   std::vector<ByteMeaning> bytes;
 };
 
-ByteMeaning meaningOf(UConverter *converter, char byte) {
-  std::array<char16_t, 32> units;
-  char16_t *end = units.data();
-  const char *source = &byte;
-  UErrorCode error = U_ZERO_ERROR;
-  ucnv_reset(converter);
-  ucnv_toUnicode(converter, &end, units.data() + units.size(), &source, &byte + 1, nullptr, 0,
-                 &error);
-  if (error == U_INVALID_CHAR_FOUND || error == U_ILLEGAL_CHAR_FOUND ||
-      error == U_ILLEGAL_ESCAPE_SEQUENCE || error == U_UNSUPPORTED_ESCAPE_SEQUENCE) {
-    return {"none", "--", {}};
-  }
-  requireSuccess(error, "decode");
-  if (end != units.data()) {
-    return {"character", "", {units.data(), end}};
-  }
-  const bool isPending = ucnv_toUCountPending(converter, &error) > 0;
-  return isPending ? ByteMeaning{"lead byte", ">>", {}} : ByteMeaning{"shift", "<>", {}};
-}
-
 // Throws Error if the page does not open or has no single-byte characters.
 ByteChart chartOf(const char *option, const std::string &name) {
-  const CodePage page(parsePage(option, name), option);
-  UErrorCode error = U_ZERO_ERROR;
-  ucnv_setToUCallBack(page.converter(), UCNV_TO_U_CALLBACK_STOP, nullptr, nullptr, nullptr, &error);
-  ByteChart chart{page.number(), {}};
+  const CodePage page(option, name);
+  PageText text(page);
+  ByteChart chart{page.name(), {}};
   for (int byte = 0; byte < 256; ++byte) {
-    chart.bytes.push_back(meaningOf(page.converter(), static_cast<char>(byte)));
+    const PageText::Piece piece = text.meaningOf(static_cast<char>(byte));
+    chart.bytes.push_back({piece.meaning, fromUtf8(piece.text)});
   }
   if (std::ranges::all_of(chart.bytes, &std::u16string::empty, &ByteMeaning::text)) {
-    throw failure("code page {} has no single-byte characters", page.number());
+    throw failure("code page {} has no single-byte characters", page.name());
   }
   return chart;
 }
 
 // Two columns wide, so that no mark looks like a character.
 std::string cellOf(const ByteMeaning &meaning) {
+  constexpr std::array marks{"", "<>", ">>", "--"};
   if (meaning.text.empty()) {
-    return meaning.mark;
+    return marks[static_cast<std::size_t>(meaning.kind)];
   }
   if (meaning.text == u" ") {
     return "SP";
@@ -99,6 +79,7 @@ Json jsonOf(const ByteMeaning &meaning) {
 Answer chart(const std::string &name) {
   const ByteChart chart = chartOf("--chart", name);
   std::string text = "   0  1  2  3  4  5  6  7  8  9  A  B  C  D  E  F\n";
+  constexpr std::array kinds{"character", "shift", "lead byte", "none"};
   Json rows = Json::array();
   for (std::size_t row = 0; row < 256; row += 16) {
     std::string line = fmt::format("{:X} ", row / 16);
@@ -106,7 +87,7 @@ Answer chart(const std::string &name) {
       const ByteMeaning &meaning = chart.bytes[byte];
       line.append(1, ' ').append(cellOf(meaning));
       rows.append(Json::object({{"byte", fmt::format("{:02X}", byte)},
-                                {"kind", meaning.kind},
+                                {"kind", kinds[static_cast<std::size_t>(meaning.kind)]},
                                 {"character", jsonOf(meaning)}}));
     }
     text += line.substr(0, line.find_last_not_of(' ') + 1) + "\n";
@@ -153,8 +134,7 @@ Answer answer(const Arguments &arguments) {
     throw usageError("--chart needs a PAGE");
   }
   if (arguments.asNames) {
-    const std::set<std::string> names = namesWithNumbers();
-    return {fmt::format("{}\n", fmt::join(names, "\n")), Json::array(names)};
+    return allPageNames();
   }
   return arguments.asDifference ? difference(pages[0], pages[1])
          : arguments.asChart    ? chart(pages[0])

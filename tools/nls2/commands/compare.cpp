@@ -22,7 +22,7 @@ struct Arguments {
 };
 
 int compare(const Arguments &arguments) {
-  TextOrder order(arguments.order);
+  TextOrder order(arguments.order, arguments.order.locale.codepage);
   const auto keyOf = [&](const char *name, const std::string &text) {
     try {
       return std::string(order.keyOf(text));

@@ -52,12 +52,12 @@ int detect(const std::string &path, Answer &answer) {
         fmt::format("{}: {}\n", printable(path),
                     name != nullptr ? fmt::format("{}, {} bytes", name, length) : "no signature");
     answer.json.append(
-        Json::object({{"file", path}, {"encoding", name}, {"signatureLength", length}}));
+        Json::object({{"file", path}, {"encoding", name}, {"signature_length", length}}));
     return name != nullptr ? exitDone : exitFailed;
   } catch (const Error &error) {
     complain(error.what());
     answer.json.append(Json::object(
-        {{"file", path}, {"encoding", nullptr}, {"signatureLength", 0}, {"error", error.what()}}));
+        {{"file", path}, {"encoding", nullptr}, {"signature_length", 0}, {"error", error.what()}}));
     return exitUsage;
   }
 }

@@ -79,13 +79,13 @@ Answer describe(const Records &records) {
                         id.language(), entry->asciiCcsid, entry->ebcdicCcsid);
     rows.append(Json::object({{"row", row},
                               {"locale", entry->localeName},
-                              {"shortName", entry->shortName},
-                              {"languageId", id.number()},
-                              {"languageIdHex", hex},
+                              {"short_name", entry->shortName},
+                              {"language_id", id.number()},
+                              {"language_id_hex", hex},
                               {"country", id.country()},
                               {"language", id.language()},
-                              {"asciiCcsid", entry->asciiCcsid},
-                              {"ebcdicCcsid", entry->ebcdicCcsid}}));
+                              {"ascii_ccsid", entry->asciiCcsid},
+                              {"ebcdic_ccsid", entry->ebcdicCcsid}}));
   }
   return {text, rows};
 }
@@ -102,7 +102,7 @@ Answer answer(const std::optional<std::string> &asked) {
     text += "\n" + page.text;
     pages.append(page.json);
   }
-  return {text, Json::object({{"matchedBy", matchedBy}, {"records", rows}, {"codepages", pages}})};
+  return {text, Json::object({{"matched_by", matchedBy}, {"records", rows}, {"codepages", pages}})};
 }
 
 } // namespace

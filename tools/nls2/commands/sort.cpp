@@ -2,7 +2,7 @@
 
 #include "base/options.h"
 #include "io/output_file.h"
-#include "text/record_reader.h"
+#include "text/record_source.h"
 #include "text/text_order.h"
 
 #include <cstring>
@@ -15,14 +15,14 @@ namespace nls2::tool {
 namespace {
 
 constexpr const char *notes =
-    R"(Case, accents and punctuation count; equal lines keep their order. Lines end in the code page's line
-feed (U+000A); the last line gets one if it has none. If a line has invalid bytes, nothing is
-written. All lines are kept in memory. OUT may be one of the FILEs.
+    R"(Case, accents and punctuation count; equal lines keep their order. FORMAT is lines (the default: LF,
+CR LF and NEL end them, and stay at theirs; a last line without one gets that of the line before) or
+fixed:N. If a line has invalid bytes, nothing is written. All lines are kept in memory. OUT may be one of the FILEs.
 )";
 
 struct Arguments {
   OrderOptions order;
-  std::size_t recordLength = 0;
+  std::string format = "lines";
   std::vector<std::string> inputs;
   std::string output = "-";
 };
@@ -31,7 +31,7 @@ struct Arguments {
 // side by side.
 struct KeyedLine {
   uint64_t prefix;   // the first bytes of the key, as a number
-  const char *bytes; // the key, and after it the line
+  const char *bytes; // the key, and after it the line with its end
   uint32_t keyLength;
   uint32_t lineLength;
 
@@ -44,14 +44,18 @@ struct KeyedLine {
 
 class Lines {
 public:
-  // Copies both.
-  void add(std::string_view line, std::string_view key) {
-    auto *const bytes = static_cast<char *>(memory_.allocate(key.size() + line.size(), 1));
-    std::copy(line.begin(), line.end(), std::copy(key.begin(), key.end(), bytes));
+  // Copies all.
+  void add(std::string_view line, std::string_view end, std::string_view key) {
+    const std::size_t length = line.size() + end.size();
+    auto *const bytes = static_cast<char *>(memory_.allocate(key.size() + length, 1));
+    char *next = bytes;
+    for (const std::string_view part : {key, line, end}) {
+      next += part.copy(next, part.size());
+    }
     uint64_t prefix = 0;
     std::memcpy(&prefix, key.data(), std::min(key.size(), sizeof prefix));
-    lines_.push_back({be64toh(prefix), bytes, static_cast<uint32_t>(key.size()),
-                      static_cast<uint32_t>(line.size())});
+    lines_.push_back(
+        {be64toh(prefix), bytes, static_cast<uint32_t>(key.size()), static_cast<uint32_t>(length)});
   }
 
   // Sorts the lines; those with equal keys keep the order in which they were added.
@@ -66,22 +70,20 @@ private:
 };
 
 int sortFiles(const Arguments &arguments) {
-  TextOrder order(arguments.order);
-  const auto keyOf = [&](std::string_view text) { return order.keyOf(text); };
-  const std::string terminator = arguments.recordLength == 0 ? order.lineFeed() : "";
+  const CodePage &page = arguments.order.locale.codepage;
+  TextOrder order(arguments.order, page);
+  std::string end = lineEnd(arguments.format, page);
   Lines lines;
   for (const std::string &path : inputsOf(arguments.inputs)) {
-    RecordFile file(path, {.length = arguments.recordLength,
-                           .page = arguments.order.locale.codepage,
-                           .isText = false});
+    RecordFile file(path, {.format = arguments.format, .page = page});
     while (const auto line = file.next()) {
-      lines.add(line->text, file.apply(*line, keyOf));
+      end = line->end.empty() ? end : line->end;
+      lines.add(line->text, end, file.apply(*line, [&](auto text) { return order.keyOf(text); }));
     }
   }
   OutputFile output(arguments.output);
   for (const KeyedLine &each : lines.sorted()) {
     output.put(each.line());
-    output.put(terminator);
   }
   output.commit();
   return exitDone;
@@ -93,12 +95,11 @@ Command sortCommand() {
   const auto arguments = std::make_shared<Arguments>();
   return {.operands = {{"FILE", "input files; standard input if - or not given",
                         into(arguments->inputs), 0, Operand::anyNumber}},
-          .options = orderOptions(
-              arguments->order,
-              {numberValue("record-length", "N", "sort records of N bytes instead of lines",
-                           arguments->recordLength, 1, 1 << 30),
-               value("output", "OUT", "output file; standard output if - or not given",
-                     into(arguments->output), 'o')}),
+          .options =
+              orderOptions(arguments->order,
+                           {linesOrFixed(arguments->format),
+                            value("output", "OUT", "output file; standard output if - or not given",
+                                  into(arguments->output), 'o')}),
           .notes = notes,
           .run = [arguments] { return sortFiles(*arguments); }};
 }

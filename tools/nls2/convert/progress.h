@@ -15,11 +15,11 @@ namespace nls2::tool {
 
 class Progress {
 public:
-  // By default shown if standard error is a terminal and the run lasts longer than a second;
-  // `wanted` forces or forbids it. `total` is the size of the input, if known.
-  Progress(std::optional<bool> wanted, std::optional<uint64_t> total)
-      : total_(total.value_or(0)), next_(start_ + std::chrono::seconds(wanted == true ? 0 : 1)),
-        isShown_(wanted.value_or(isatty(STDERR_FILENO) == 1)) {}
+  // Shown if standard error is a terminal and the run lasts longer than a second, or if `wanted`.
+  // `total` is the size of the input, if known.
+  Progress(bool wanted, std::optional<uint64_t> total)
+      : total_(total.value_or(0)), next_(start_ + std::chrono::seconds(wanted ? 0 : 1)),
+        isShown_(wanted || isatty(STDERR_FILENO) == 1) {}
   ~Progress() { clearProgress(); }
   Progress(const Progress &) = delete;
   Progress &operator=(const Progress &) = delete;

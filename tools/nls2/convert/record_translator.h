@@ -1,64 +1,73 @@
-// One record from one code page to another, shaped as the options say.
+// A piece of records from one form to another.
 #pragma once
 
+#include "convert/field_translator.h"
 #include "convert/problem.h"
-#include "io/byte_buffer.h"
-#include "nls2/translator.hpp"
-
-#include <optional>
-#include <string>
-#include <string_view>
-#include <vector>
+#include "text/record_source.h"
 
 namespace nls2::tool {
 
-// One field of the output.
-class OutputField {
-public:
-  // `number` counts the fields of --fields from 1; 0 is the whole record, whose spec has its code
-  // page only.
-  OutputField(const FieldSpec &spec, std::size_t number, const TranslateOptions &options);
+// Of CSV that is read: which of its columns each field is.
+using CsvColumns = std::vector<std::size_t>;
 
-  // Appends the field, and adds the number of characters replaced in it. On failure the problem has
-  // the place in the record.
-  std::optional<Problem> translate(std::string_view record, ByteBuffer &out, std::size_t &replaced);
-
-private:
-  Problem describe(const nls2::field_result &failed) const;
-  std::optional<Problem> verify(std::string_view field, std::string_view translated);
-  Problem newProblem(ProblemKind kind) const;
-
-  FieldSpec spec_;
-  std::size_t number_;
-  int32_t to_;
-  nls2::field_policy policy_;
-  std::size_t backWidth_ = 0; // of back_'s policy
-  bool verifies_;
-  bool csv_;
-  Limit limitedBy_ = Limit::outLength;
-  std::optional<nls2::translator> forward_; // none for raw bytes
-  std::optional<nls2::translator> back_;
-  std::string digits_;
-  std::string cameBack_;
+// What becomes of a piece.
+struct PieceOutput {
+  ByteBuffer bytes;
+  ByteBuffer rejects;
+  ByteBuffer problems; // lines of JSON
+  Tally tally;
 };
 
-// Keeps its converters open: every worker has a copy.
+// Keeps its translators open: every worker has one.
 class RecordTranslator {
 public:
-  // Throws usageError for a code page that does not open, or lacks a blank or line end it needs.
-  explicit RecordTranslator(const TranslateOptions &options);
+  // Throws usageError.
+  RecordTranslator(const TranslateOptions &options, const Plan &plan, const CsvColumns &columns);
 
-  // Appends the record's translation and its line end, and counts the characters replaced in it.
-  // On failure the output is as it was.
-  std::optional<Problem> translate(std::string_view record, ByteBuffer &out, std::size_t &replaced);
-
-  // The first character replaced in a record; nothing if there is none.
-  std::optional<Problem> firstReplaced(std::string_view record) const;
+  // The records up to the first one that ends the run, if there is one.
+  void translate(const RecordPiece &piece, PieceOutput &out);
 
 private:
-  const TranslateOptions *options_;
-  std::vector<OutputField> fields_;
-  std::string lineEnd_;
+  struct Found {
+    std::size_t row;
+    const FieldPlan *field; // null: the whole record
+    FieldFault fault;
+    int64_t replaced; // 0: the record failed
+  };
+
+  void translateColumn(std::size_t field);
+  void translateSplit(std::size_t row);
+  void translateOne(std::size_t row, std::size_t field, std::string_view source);
+  void verify(std::size_t row, std::size_t field, std::string_view source);
+  void add(std::size_t row, const FieldPlan *field, FieldFault fault, int64_t replaced = 0);
+  NLS2F_Span &value(std::size_t row, std::size_t field) {
+    return values_[row * fields_.size() + field];
+  }
+  void assemble(std::size_t row);
+  void write(PieceOutput &out);
+  Problem problemOf(const Found &found) const;
+  void report(PieceOutput &out);
+  void reportRest(PieceOutput &out) const;
+
+  const TranslateOptions &options_;
+  const Plan &plan_;
+  const CsvColumns &columns_;
+  std::vector<FieldTranslator> fields_;
+  Writer writer_;
+  std::string empty_; // a record of blanks; empty if there is no layout to fill
+  Translators open_;
+
+  const RecordPiece *piece_ = nullptr;
+  std::size_t rows_ = 0;           // of the piece, up to the first that ends the run
+  ByteBuffer bytes_;               // of all values
+  std::vector<NLS2F_Span> values_; // by row and field
+  std::vector<uint8_t> dropped_;   // by row
+  std::vector<Found> found_;
+  ByteBuffer gathered_; // one field of all records
+  ByteBuffer records_;  // as they are written, without ends and prefixes
+  ByteBuffer split_;
+  std::vector<NLS2F_Span> column_;
+  std::vector<uint8_t> good_;
 };
 
 } // namespace nls2::tool

@@ -6,8 +6,8 @@
 #include "convert/record_translator.h"
 #include "io/input_file.h"
 #include "io/output_file.h"
-#include "text/record_reader.h"
 
+#include <algorithm>
 #include <memory>
 
 namespace nls2::tool {
@@ -17,37 +17,67 @@ namespace {
 constexpr std::size_t usualOutput = std::size_t{2} << 20;
 
 struct Piece {
-  RecordBatch batch;
-  ByteBuffer output;
-  ByteBuffer rejects;
-  Tally tally;
+  RecordPiece records;
+  PieceOutput output;
 
-  std::size_t weight() const { return batch.size(); }
+  std::size_t weight() const { return records.bytes.size(); }
 };
 
 // Null if not requested.
 struct Files {
   InputFile input;
-  const std::unique_ptr<OutputFile> output;
-  const std::unique_ptr<OutputFile> rejects;
-  const std::unique_ptr<OutputFile> report;
+  std::unique_ptr<OutputFile> output;
+  std::unique_ptr<OutputFile> rejects;
+  std::unique_ptr<OutputFile> problems;
+  std::unique_ptr<OutputFile> report;
 
   // Throws Error, also if one file would overwrite another. Only the output may replace the input.
   explicit Files(const TranslateOptions &options)
       : input(options.input),
         output(options.dryRun ? nullptr : std::make_unique<OutputFile>(options.output)),
-        rejects(opened(options.rejects)), report(opened(options.report)) {
+        rejects(opened(options.rejects)), problems(opened(options.problems)),
+        report(opened(options.report)) {
     if (output && output->isDirect() && output->isSame(input.facts())) {
       throw usageError("{} is also {}; use --output, which replaces the file at the end",
                        input.name(), output->name());
     }
     requireOthers("--rejects", rejects.get(), {output.get()});
-    requireOthers("--report", report.get(), {output.get(), rejects.get()});
+    requireOthers("--problems", problems.get(), {output.get(), rejects.get()});
+    requireOthers("--report", report.get(), {output.get(), rejects.get(), problems.get()});
+  }
+
+  // All are complete before the first takes its name. The output is the last, so that an input that
+  // it replaces is there until then.
+  void commit(bool sync) {
+    const std::initializer_list<OutputFile *> files{rejects.get(), problems.get(), report.get(),
+                                                    output.get()};
+    for (OutputFile *file : files) {
+      if (file != nullptr) {
+        file->finish(sync);
+      }
+    }
+    std::string written;
+    for (OutputFile *file : files) {
+      if (file != nullptr) {
+        publish(*file, sync, written);
+      }
+    }
   }
 
 private:
   static std::unique_ptr<OutputFile> opened(const std::optional<std::string> &path) {
     return path ? std::make_unique<OutputFile>(*path) : nullptr;
+  }
+
+  static void publish(OutputFile &file, bool sync, std::string &written) {
+    try {
+      file.publish(sync);
+    } catch (const Error &error) {
+      throw written.empty() ? error : failure("{}; already written: {}", error.what(), written);
+    }
+    if (!file.isDirect()) {
+      written += (written.empty() ? "" : ", ") + file.name();
+    }
   }
 
   void requireOthers(const char *option, const OutputFile *file,
@@ -63,179 +93,255 @@ private:
   }
 };
 
-std::optional<uint64_t> bytesToRead(const InputFile &input, const TranslateOptions &options) {
+std::optional<uint64_t> bytesToRead(const InputFile &input, const TranslateOptions &options,
+                                    const Plan &plan) {
   const auto left = input.bytesLeft();
-  if (!left || options.recordLength == 0) {
+  if (!left || plan.readLength == 0) {
     return left;
   }
-  const uint64_t records = *left / options.recordLength;
+  const auto length = static_cast<uint64_t>(plan.readLength);
+  const uint64_t records = *left / length;
   const uint64_t skipped = std::min(options.skip, records);
-  return std::min(records - skipped, options.count) * options.recordLength;
+  return std::min(records - skipped, options.count) * length;
 }
 
-// The least length of a filled record in the output, in bytes; 0 if it is not filled.
-std::size_t filledLength(const TranslateOptions &options) {
-  const std::size_t filled = options.padding == nls2::padding::fill ? options.outLength : 0;
-  std::size_t length = options.fields.empty() ? filled : 0;
-  for (const FieldSpec &field : options.fields) {
-    length += field.width != 0 ? field.width : filled;
-  }
-  return length;
-}
-
-// Batches are small, so that their output is small too.
-RecordShape shapeOf(const TranslateOptions &options) {
-  return {.length = options.recordLength,
-          .page = options.from,
+// Pieces are small, so that what becomes of them is small too.
+RecordShape shapeOf(const TranslateOptions &options, const Plan &plan) {
+  const auto filled =
+      static_cast<uint64_t>(std::max(plan.writeLength, plan.fillsLayout() ? plan.layoutLength : 0));
+  const uint64_t most = std::min(usualOutput / (filled + 1), (1U << 15) / plan.fields.size());
+  return {.format = options.read,
+          .page = plan.from,
+          .hasHeader = plan.hasHeader && plan.readsCsv,
           .skip = options.skip,
           .count = options.count,
-          .mostInBatch = std::max<uint64_t>(usualOutput / (filledLength(options) + 1), 1)};
+          .mostInPiece = std::max<uint64_t>(most, 1)};
+}
+
+// The names of the fields as a record of CSV.
+std::string headerOf(const Plan &plan) {
+  std::string names;
+  std::vector<NLS2F_Span> spans;
+  for (const FieldPlan &field : plan.fields) {
+    const std::string_view name = field.field.name;
+    spans.push_back({sizeOf(names), sizeOf(name)});
+    names += name;
+  }
+  std::string record(2 * names.size() + 3 * spans.size(), '\0');
+  int64_t written = 0;
+  isDone(NLS2F_JoinCsv(names.data(), spans.data(), static_cast<int64_t>(spans.size()),
+                       record.data(), sizeOf(record), &written, nullptr));
+  record.resize(static_cast<std::size_t>(written));
+  return record;
 }
 
 // The steps of the pipeline.
 class TranslateRun {
 public:
-  TranslateRun(const TranslateOptions &options, const RecordTranslator &translator, Files &files,
-               Tally &tally)
-      : options_(options), translator_(translator), files_(files), tally_(tally),
-        reader_(files.input, shapeOf(options)),
-        progress_(options.progress, bytesToRead(files.input, options)) {}
+  TranslateRun(const TranslateOptions &options, Plan &plan, Files &files, Tally &tally)
+      : options_(options), plan_(plan), files_(files), tally_(tally),
+        source_(files.input, shapeOf(options, plan)),
+        progress_(options.progress, bytesToRead(files.input, options, plan)) {
+    for (std::size_t i = 0; i < plan.fields.size(); ++i) {
+      columns_.push_back(i);
+    }
+    RecordTranslator(options, plan, columns_); // finds wrong options before the work
+  }
 
   void run();
+  void summarize() const;
 
-  bool read(Piece &piece) { return reader_.read(piece.batch); }
-  RecordTranslator worker() const { return translator_; }
-  void work(RecordTranslator &worker, Piece &piece) const;
+  bool read(Piece &piece);
+  std::unique_ptr<RecordTranslator> worker() const {
+    return std::make_unique<RecordTranslator>(options_, plan_, columns_);
+  }
+  void work(std::unique_ptr<RecordTranslator> &worker, Piece &piece) const;
   void write(Piece &piece);
-  void interrupt() { files_.input.interrupt(); }
+  void interrupt() const { files_.input.interrupt(); }
 
 private:
-  bool translate(RecordTranslator &worker, const Record &record, Piece &piece) const;
-  void summarize();
+  void begin();
+  void findColumns();
+  void writeHeader();
+  void writeProblems(const Piece &piece);
 
   const TranslateOptions &options_;
-  const RecordTranslator &translator_;
+  Plan &plan_;
   Files &files_;
   Tally &tally_;
-  RecordReader reader_;
+  RecordSource source_;
   Progress progress_;
+  CsvColumns columns_;
+  bool hasBegun_ = false;
+  bool hasPreamble_ = false; // the rejects
 };
 
 void TranslateRun::run() {
-  try {
-    Pipeline<Piece, TranslateRun>(*this).run();
-  } catch (const Error &) {
-    summarize();
-    throw;
+  writeHeader();
+  Pipeline<Piece, TranslateRun>(*this).run();
+  if (options_.skip > 0 && tally_.records == 0) {
+    complain(fmt::format("{}: no record follows the {} skipped", files_.input.name(), options_.skip)
+                 .c_str());
   }
-  clearProgress();
-  for (OutputFile *file : {files_.output.get(), files_.rejects.get()}) {
-    if (file != nullptr) {
-      file->commit(options_.sync);
-    }
-  }
-  summarize();
 }
 
-void TranslateRun::summarize() {
+void TranslateRun::summarize() const {
   clearProgress();
-  const std::string summary = summaryOf(tally_, options_.unit());
+  const std::string summary = summaryOf(tally_, plan_.unit(options_));
   if (!summary.empty()) {
     complain((files_.input.name() + ": " + summary).c_str());
   }
 }
 
-// A worker's buffers grow with its longest record, so a batch with a very long record gets a
-// translator of its own.
-void TranslateRun::work(RecordTranslator &worker, Piece &piece) const {
-  piece.output.clear(usualOutput);
-  piece.rejects.clear(usualOutput);
-  piece.tally = {};
-  std::optional<RecordTranslator> passing;
-  if (piece.batch.size() > usualOutput) {
-    passing.emplace(translator_);
+void TranslateRun::writeHeader() {
+  if (!plan_.hasHeader || !plan_.writesCsv || !files_.output) {
+    return;
   }
-  bool goesOn = true;
-  for (auto record = piece.batch.next(); record && goesOn; record = piece.batch.next()) {
-    goesOn = translate(passing ? *passing : worker, *record, piece);
-  }
-  piece.tally.bytesOut = piece.output.size();
+  const std::string header = headerOf(plan_);
+  const NLS2F_Span span{0, sizeOf(header)};
+  std::string bytes(header.size() + 2, '\0');
+  int64_t written = 0;
+  int64_t done = 0;
+  isDone(NLS2F_WriteRecords(openWriter("--write", options_.write, plan_.to).get(), header.data(),
+                            &span, 1, bytes.data(), sizeOf(bytes), &written, &done, nullptr));
+  files_.output->write(std::string_view(bytes).substr(0, static_cast<std::size_t>(written)));
 }
 
-// False ends the piece and the run.
-bool TranslateRun::translate(RecordTranslator &worker, const Record &record, Piece &piece) const {
-  Tally &tally = piece.tally;
-  std::size_t replaced = 0;
-  std::optional<Problem> problem = worker.translate(record.text, piece.output, replaced);
-  const bool isRefused = problem.has_value();
-  if (!isRefused && replaced > 0 && !tally.first) {
-    problem = worker.firstReplaced(record.text);
+// The first read shows the page and the header, before any thread works.
+bool TranslateRun::read(Piece &piece) {
+  const bool more = source_.read(piece.records);
+  if (!hasBegun_) {
+    hasBegun_ = true;
+    begin();
   }
-  if (problem) {
-    problem->record = record.number;
-    problem->byte = record.offset;
-    const bool isRejected =
-        options_.onError == OnError::reject && problem->kind != ProblemKind::noMemory;
-    if (isRefused && !isRejected) {
-      tally.failure = problem;
-      return false;
+  return more;
+}
+
+void TranslateRun::begin() {
+  if (const CodePage page = source_.page(); !(page == plan_.from)) {
+    plan_.setFrom(page);
+  }
+  if (plan_.hasHeader && plan_.readsCsv) {
+    findColumns();
+  }
+}
+
+void TranslateRun::findColumns() {
+  if (!source_.foundHeader()) {
+    throw failure("{}: the header with the names of the fields is missing", files_.input.name());
+  }
+  std::string header = source_.header();
+  std::string names(header.size(), '\0');
+  std::vector<NLS2F_Span> spans(header.size() + 1);
+  auto problem = sized<NLS2F_Problem>();
+  int64_t count = 0;
+  if (!isDone(NLS2F_SplitCsv(header.data(), sizeOf(header), names.data(), spans.data(),
+                             static_cast<int64_t>(spans.size()), &count, &problem))) {
+    throw failure("{}: the header: {}", files_.input.name(), wordsOf(problem));
+  }
+  spans.resize(static_cast<std::size_t>(count));
+  const auto isNamed = [&](const NLS2F_Span &span, const FieldPlan &field) {
+    return bytesOf(names.data(), span) == field.field.name;
+  };
+  for (const FieldPlan &field : plan_.fields) {
+    const auto found =
+        std::ranges::find_if(spans, [&](const auto &span) { return isNamed(span, field); });
+    if (found == spans.end()) {
+      throw failure("{}: the header has no field {}", files_.input.name(),
+                    printable(field.field.name));
     }
-    tally.first = tally.first ? tally.first : problem;
+    columns_[field.number - 1] = static_cast<std::size_t>(found - spans.begin());
   }
-  if (isRefused) {
-    piece.rejects.append(record.whole);
-    ++tally.rejected;
+  for (std::size_t i = 0; i < spans.size(); ++i) {
+    if (std::ranges::find(columns_, i) == columns_.end()) {
+      throw failure("{}: the header's field {}, \"{}\", is {}", files_.input.name(), i + 1,
+                    printable(bytesOf(names.data(), spans[i])),
+                    std::ranges::any_of(plan_.fields,
+                                        [&](const auto &field) { return isNamed(spans[i], field); })
+                        ? "there twice"
+                        : "not in the layout");
+    }
   }
-  tally.replaced += replaced;
-  tally.replacedRecords += replaced > 0 ? 1 : 0;
-  ++tally.records;
-  tally.bytesIn += record.whole.size();
-  return true;
+}
+
+void TranslateRun::work(std::unique_ptr<RecordTranslator> &worker, Piece &piece) const {
+  for (ByteBuffer *each : {&piece.output.bytes, &piece.output.rejects, &piece.output.problems}) {
+    each->clear(usualOutput);
+  }
+  piece.output.tally = {};
+  worker->translate(piece.records, piece.output);
 }
 
 void TranslateRun::write(Piece &piece) {
+  const std::string_view rejects = piece.output.rejects.bytes();
   if (files_.output) {
-    files_.output->write(piece.output.bytes());
+    files_.output->write(piece.output.bytes.bytes());
   }
-  if (files_.rejects) {
-    files_.rejects->write(piece.rejects.bytes());
+  if (files_.rejects && !rejects.empty()) {
+    files_.rejects->write(std::exchange(hasPreamble_, true) ? "" : source_.preamble());
+    files_.rejects->write(rejects);
   }
-  tally_.add(piece.tally);
+  writeProblems(piece);
+  tally_.add(piece.output.tally);
   progress_.update(tally_.bytesIn);
-  if (const auto &problem = piece.tally.failure) {
-    const auto [reason, advice] = explain(*problem);
-    throw failure("{}: {}: {}{}", files_.input.name(), placeOf(*problem, options_.unit()), reason,
-                  advice);
+  if (const auto &problem = piece.output.tally.failure) {
+    throw failure("{}: {}{}", files_.input.name(), messageOf(*problem, plan_.unit(options_)),
+                  adviceFor(*problem));
   }
-  piece.output.clear(usualOutput);
+  piece.output.bytes.clear(usualOutput);
+}
+
+// No more lines than the limit.
+void TranslateRun::writeProblems(const Piece &piece) {
+  const uint64_t limit = options_.problemsLimit;
+  uint64_t left = limit - std::min(limit, tally_.lines);
+  const std::string_view lines = piece.output.problems.bytes();
+  std::size_t end = 0;
+  for (; left > 0 && end < lines.size(); --left) {
+    end = lines.find('\n', end) + 1;
+  }
+  if (files_.problems) {
+    files_.problems->write(lines.substr(0, end));
+  }
 }
 
 } // namespace
 
-// The report is written last, and after a failure too.
+// A run that fails leaves all files as they were, but for the report.
 int translateFile(const TranslateOptions &options) {
-  const RecordTranslator translator(options);
+  Plan plan(options);
   Files files(options);
   const auto start = std::chrono::steady_clock::now();
   Tally tally;
-  const auto writeReport = [&] {
-    if (const auto &report = files.report) {
+  const auto writeReport = [&](bool isDone) {
+    if (files.report) {
       const std::chrono::duration<double> passed = std::chrono::steady_clock::now() - start;
-      report->write(reportOf(tally, options, passed.count()));
-      report->commit(options.sync);
+      files.report->write(reportOf(tally, plan, passed.count(), isDone));
     }
   };
+  TranslateRun run(options, plan, files, tally);
   try {
-    TranslateRun(options, translator, files, tally).run();
+    try {
+      run.run();
+    } catch (const Error &) {
+      run.summarize();
+      throw;
+    }
+    run.summarize();
+    writeReport(true);
+    files.commit(options.sync);
   } catch (const Error &) {
     try {
-      writeReport();
+      if (files.report) { // it may be complete already, as that of a run that was done
+        files.report = std::make_unique<OutputFile>(*options.report);
+        writeReport(false);
+        files.report->commit();
+      }
     } catch (const Error &second) {
       complain(second.what());
     }
     throw;
   }
-  writeReport();
   return tally.rejected > 0 ? exitFailed : exitDone;
 }
 

@@ -46,6 +46,7 @@ public:
     }
   }
 
+  char *at(std::size_t place) { return data_ + place; }
   std::size_t size() const { return size_; }
   std::string_view bytes() const { return {data_, size_}; }
 

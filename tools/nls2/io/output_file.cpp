@@ -230,17 +230,37 @@ void OutputFile::flush() {
   kept_.clear();
 }
 
-// linkat() cannot replace a file, so an unnamed file first gets a free name and is then renamed.
-// close() comes first, because a file system may report lost bytes only there.
-void OutputFile::publish(bool sync) {
+// linkat() cannot replace a file, so an unnamed file first gets a free name, which publish() changes.
+// A file system may report lost bytes only in close(). Closing a duplicate descriptor makes it do
+// so and leaves standard output open.
+void OutputFile::finish(bool sync) {
+  requireMemory(); // without memory the output may be wrong
+  flush();
+  if (target_.empty()) {
+    const bool unsynced = sync && fsync(fd_) != 0 && errno != EINVAL && errno != EROFS;
+    const int second = unsynced ? -1 : fcntl(fd_, F_DUPFD_CLOEXEC, 0);
+    if (unsynced || (second >= 0 && close(second) != 0)) {
+      fail();
+    }
+    return;
+  }
   const SignalsHeldBack held;
   if (temporary_.empty()) {
     takeFreeName([&](const char *free) {
       return linkat(AT_FDCWD, ownPath(fd_).c_str(), AT_FDCWD, free, AT_SYMLINK_FOLLOW);
     });
   }
-  if ((sync && fsync(fd_) != 0) || close(std::exchange(fd_, -1)) != 0 ||
-      std::rename(temporary_.c_str(), target_.c_str()) != 0) {
+  if ((sync && fsync(fd_) != 0) || close(std::exchange(fd_, -1)) != 0) {
+    fail();
+  }
+}
+
+void OutputFile::publish(bool sync) {
+  if (target_.empty()) {
+    return;
+  }
+  const SignalsHeldBack held;
+  if (std::rename(temporary_.c_str(), target_.c_str()) != 0) {
     fail();
   }
   giveUpName();
@@ -249,22 +269,6 @@ void OutputFile::publish(bool sync) {
     if (fd_ < 0 || (fsync(fd_) != 0 && errno != EINVAL)) {
       fail();
     }
-  }
-}
-
-// Closing a duplicate descriptor makes a file system report lost bytes and leaves standard output
-// open.
-void OutputFile::commit(bool sync) {
-  requireMemory(); // without memory the output may be wrong
-  flush();
-  if (!target_.empty()) {
-    publish(sync);
-    return;
-  }
-  const bool unsynced = sync && fsync(fd_) != 0 && errno != EINVAL && errno != EROFS;
-  const int second = unsynced ? -1 : fcntl(fd_, F_DUPFD_CLOEXEC, 0);
-  if (unsynced || (second >= 0 && close(second) != 0)) {
-    fail();
   }
 }
 

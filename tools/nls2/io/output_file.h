@@ -13,7 +13,7 @@ namespace nls2::tool {
 class OutputFile {
 public:
   // "-" is standard output. A path that names an open descriptor, such as /dev/stdout or /dev/fd/3,
-  // is written directly; commit() replaces a file. Throws Error.
+  // is written directly; publish() replaces a file. Throws Error.
   explicit OutputFile(const std::string &path);
   ~OutputFile();
   OutputFile(const OutputFile &) = delete;
@@ -25,11 +25,17 @@ public:
   // Buffers small pieces. The destructor does not write what is still buffered.
   void put(std::string_view bytes);
   void flush();
-  // Without it the new file is discarded and the old one stays. `sync` also waits for the disk.
+  // Writes everything and closes the file; `sync` also waits for the disk. Throws Error.
+  void finish(bool sync = false);
+  // Then gives the file its name. Without it the new file is discarded and the old one stays.
   // Throws Error.
-  void commit(bool sync = false);
+  void publish(bool sync = false);
+  void commit() {
+    finish();
+    publish();
+  }
 
-  // Whether bytes are written to the file directly, not by commit().
+  // Whether bytes are written to the file directly, not by publish().
   bool isDirect() const { return target_.empty(); }
   // Whether both write or replace the same file.
   bool isSame(const OutputFile &other) const;
@@ -45,11 +51,10 @@ private:
   void openTemporary(mode_t mode);
   void takeFreeName(const std::function<int(const char *)> &make);
   void giveUpName();
-  void publish(bool sync);
   [[noreturn]] void fail() const;
 
   std::string name_;
-  std::string target_;    // the file that commit() makes or replaces; empty for others
+  std::string target_;    // the file that publish() makes or replaces; empty for others
   std::string temporary_; // its name until then, if it has one
   std::string kept_;
   struct stat file_ = {}; // of the old file; all zero if there is none

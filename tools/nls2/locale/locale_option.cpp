@@ -161,10 +161,8 @@ std::string orderLocale(const LocaleOptions &options) {
   return locale;
 }
 
-bool hasDotlessI(const LocaleOptions &options) {
-  const std::string name = options.locale ? *options.locale : icuName(environmentLocale().second);
-  const std::string language = name.substr(0, name.find('_'));
-  return language == "tr" || language == "az";
+std::string caseLocale(const LocaleOptions &options) {
+  return options.locale ? *options.locale : icuName(environmentLocale().second);
 }
 
 } // namespace nls2::tool

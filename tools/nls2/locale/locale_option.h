@@ -15,7 +15,7 @@ inline constexpr std::string_view byCodePoint = "en_US_POSIX"; // ICU's name of 
 
 struct LocaleOptions {
   std::optional<std::string> locale; // of localeMap, in ICU's spelling
-  int32_t codepage = utf8Page;
+  CodePage codepage = CodePage::utf8();
 };
 
 // " (did you mean de_DE?)": the locale of the same language; empty if there is none.
@@ -29,7 +29,7 @@ std::vector<Option> localeOptions(LocaleOptions &options, std::vector<Option> ow
 // language. Throws usageError if localeMap has no locale of that language.
 std::string orderLocale(const LocaleOptions &options);
 
-// Whether the language has a dotless i, as Turkish does. The environment's language may be any.
-bool hasDotlessI(const LocaleOptions &options);
+// ICU's name of the locale whose rules of case apply. The environment's may be any.
+std::string caseLocale(const LocaleOptions &options);
 
 } // namespace nls2::tool

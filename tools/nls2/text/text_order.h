@@ -2,11 +2,6 @@
 #pragma once
 
 #include "locale/locale_option.h"
-#include "text/decoder.h"
-#include "text/record_reader.h"
-
-#include <new>
-#include <unicode/ucol.h>
 
 namespace nls2::tool {
 
@@ -22,66 +17,69 @@ inline std::vector<Option> orderOptions(OrderOptions &options, std::vector<Optio
   return localeOptions(options.locale, std::move(own));
 }
 
+// Throws Error.
+inline Collator openCollator(const std::string &locale, const CodePage &page, uint32_t options) {
+  NLS2F_Collator *collator = nullptr;
+  const int32_t status = NLS2F_OpenCollator(locale.c_str(), page.get(), options, &collator);
+  if (status > 0) {
+    isDone(status);
+  }
+  return Collator(collator);
+}
+
+// Texts of a page that must be valid, and their form in UTF-8.
+class ValidText {
+public:
+  explicit ValidText(const CodePage &page, int32_t padding = NLS2F_AS_IS)
+      : translator_(openTranslator(page, CodePage::utf8(), padding)) {}
+
+  // Valid until the next call. Throws TextFault.
+  std::string_view utf8(std::string_view text) {
+    auto problem = sized<NLS2F_Problem>();
+    if (!translateText(translator_.get(), text, utf8_, problem)) {
+      throw TextFault(
+          fmt::format(", column {}: {}", problem.offset + 1, wordsOf(problem, translator_.get())));
+    }
+    return utf8_;
+  }
+
+private:
+  Translator translator_;
+  std::string utf8_;
+};
+
 // Makes sort keys. Keys compare as the library's comparison orders the texts; for the locale C, by
 // code point. For one thread at a time.
 class TextOrder {
 public:
   // Throws usageError.
-  explicit TextOrder(const OrderOptions &options)
-      : decoder_(options.locale.codepage), ignoreTrailing_(options.ignoreTrailing) {
+  TextOrder(const OrderOptions &options, const CodePage &page)
+      : text_(page, options.ignoreTrailing ? NLS2F_STRIP : NLS2F_AS_IS) {
     const std::string locale = orderLocale(options.locale);
-    if (locale == byCodePoint) {
-      return;
+    if (locale != byCodePoint) {
+      collator_ = openCollator(locale, page, options.ignoreTrailing ? SORT_IGNORETRAILING : 0);
     }
-    UErrorCode error = U_ZERO_ERROR;
-    collator_.adoptInstead(ucol_open(locale.c_str(), &error));
-    if (U_FAILURE(error)) {
-      throw failure("cannot open the collation of {}: {}", locale, statusText(error));
-    }
-    ucol_setStrength(collator_.getAlias(), UCOL_TERTIARY);
   }
 
-  // Valid until the next call. Throws TextFault. The library's comparison turns trailing blanks
-  // into nulls, which the collator ignores; removing them is equivalent.
+  // Valid until the next call. Throws TextFault. UTF-8 has the order of code points.
   std::string_view keyOf(std::string_view bytes) {
-    std::u16string_view text = decoder_.decode(bytes);
-    if (ignoreTrailing_) {
-      text = withoutBlanks(withoutNulls(text));
-    }
-    if (collator_.isNull()) {
-      return codePointKey(text);
-    }
-    const int32_t length = ucol_getSortKey(
-        collator_.getAlias(), text.data(), static_cast<int32_t>(text.size()),
-        reinterpret_cast<uint8_t *>(key_.data()), static_cast<int32_t>(key_.size()));
-    if (length <= 0) { // even an empty text has a key of one byte, the terminator
-      throw std::bad_alloc();
-    }
-    if (static_cast<std::size_t>(length) > key_.size()) {
+    const std::string_view text = text_.utf8(bytes);
+    int64_t length = 0;
+    while (collator_) {
+      const int32_t status = NLS2F_SortKey(collator_.get(), bytes.data(), sizeOf(bytes),
+                                           key_.data(), sizeOf(key_), &length);
+      if (status != U_BUFFER_OVERFLOW_ERROR) {
+        isDone(status);
+        return std::string_view(key_).substr(0, static_cast<std::size_t>(length));
+      }
       key_.resize(static_cast<std::size_t>(length));
-      return keyOf(bytes);
     }
-    return {key_.data(), static_cast<std::size_t>(length)};
+    return text;
   }
-
-  std::string lineFeed() const { return lineFeedOf(decoder_.page(), true); }
 
 private:
-  std::string_view codePointKey(std::u16string_view text) {
-    key_.clear();
-    for (std::size_t i = 0; i < text.size();) {
-      UChar32 character = 0;
-      U16_NEXT(text.data(), i, text.size(), character);
-      for (const int shift : {16, 8, 0}) {
-        key_ += static_cast<char>(character >> shift);
-      }
-    }
-    return key_;
-  }
-
-  Decoder decoder_;
-  const bool ignoreTrailing_;
-  icu::LocalUCollatorPointer collator_; // null: order by code point
+  ValidText text_;
+  Collator collator_; // null: order by code point
   std::string key_ = std::string(256, '\0');
 };
 
