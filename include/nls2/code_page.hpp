@@ -49,8 +49,8 @@ class code_page : public detail::owner<NLS2F_Page, detail::close_page> {
 public:
   using owner::owner;
 
-  // By one of ICU's names, with its options: exactly what ICU opens for it. Digits alone are a
-  // number. Empty on failure. Errors:
+  // Opens a page by one of ICU's names, with its options: exactly what ICU opens for it. Digits
+  // alone are a number. Empty on failure. Errors:
   //
   //   4   unknown_code_page: ICU does not know the name. The exception has similar ones
   //   37  invalid_argument: an empty name, or one with a null inside
@@ -70,9 +70,9 @@ public:
     error.report(status, "cannot open the code page", named);
   }
 
-  // By number: a CCSID, or one of the library's own from 57352 up (NLS2_MapCodepageIdToName). Empty
-  // on failure. Errors: 4 (unknown_code_page) for a number that this ICU has no converter for;
-  // ICU's.
+  // Opens a page by number: a CCSID, or one of the library's own from 57352 up
+  // (NLS2_MapCodepageIdToName). Empty on failure. Errors: 4 (unknown_code_page) for a number that
+  // this ICU has no converter for; ICU's.
   //
   // Surprise: 874, 932, 936, 949 and 950 open other tables than the names "ibm-874" and so on. If a
   // name is known, use it.
@@ -83,7 +83,7 @@ public:
     error.report(status, "cannot open the code page", std::to_string(number));
   }
 
-  // Error: 37 (invalid_argument) for an empty page.
+  // What the page is like. Error: 37 (invalid_argument) for an empty page.
   [[nodiscard]] page_facts facts(error_ref error NLS2_MAY_OMIT) const {
     NLS2F_PageFacts c{};
     c.size = sizeof c;

@@ -35,9 +35,9 @@ namespace detail {
 inline void close_collator(NLS2F_Collator *owned) noexcept { NLS2F_CloseCollator(owned); }
 } // namespace detail
 
-// Compares and searches texts in one code page by the rules of one language, which it keeps open.
-// For one thread at a time. Move-only; an empty one fails with 37 (invalid_argument). Bytes that
-// are not valid count as U+FFFD.
+// Compares and searches texts in one code page by the rules of one language, and stays open for the
+// next. For one thread at a time. Move-only; an empty one fails with 37 (invalid_argument). Bytes
+// that are not valid count as U+FFFD.
 class collator : public detail::owner<NLS2F_Collator, detail::close_collator> {
 public:
   using owner::owner;
@@ -45,7 +45,8 @@ public:
   // `locale` is any of ICU's names ("sv_SE"). Empty on failure. Errors: 37 (invalid_argument) for
   // an empty page or name; 31 (too_long) for a name of 160 bytes or more; 32 (no_memory); ICU's.
   //
-  // Surprise: a language without rules of its own, or an unknown one, gets the root's.
+  // Surprise: a language without rules of its own, or an unknown one, gets the root's. To refuse
+  // unknown languages, look the name up with language_id() first.
   collator(std::string_view locale, const code_page &page, const collation &how NLS2_MAY_OMIT,
            error_ref error NLS2_MAY_OMIT) {
     const detail::terminated<160> name(locale);

@@ -24,9 +24,9 @@ class locale : public detail::owner<NLS2_Locale, detail::release_locale> {
 public:
   using owner::owner;
 
-  // For the process's default locale and code page, as ICU reports them. Empty on failure. Errors:
-  // 32 (no_memory); 37 (invalid_argument) if localeMap does not hold the default locale; the
-  // statuses of NLS2_GetCodepageId if the default code page has no number.
+  // A new object for the process's default locale and code page, as ICU reports them. Empty on
+  // failure. Errors: 32 (no_memory); 37 (invalid_argument) if localeMap does not hold the default
+  // locale; the statuses of NLS2_GetCodepageId if the default code page has no number.
   //
   // Surprise: a default locale that localeMap does not hold ("nb_NO", "en") makes this fail, and
   // the constructors below as well. Call ICU's uloc_setDefault() first.
@@ -37,13 +37,13 @@ public:
     return made;
   }
 
-  // For a language and the process's default code page. Empty on failure. Errors: 39
+  // A new object for a language and the process's default code page. Empty on failure. Errors: 39
   // (language_not_found) for an id that localeMap does not hold; of_process()'s.
   explicit locale(language_id language, error_ref error NLS2_MAY_OMIT) { make(language, error); }
 
-  // For a language and a code page, by number: it is not checked before text is converted. Empty on
-  // failure. Errors: as above; 37 (invalid_argument) for the numbers 0 and 255, which mean "no
-  // change" in the C interface.
+  // A new object for a language and a code page, whose number is not checked before text is
+  // converted. Empty on failure. Errors: as above; 37 (invalid_argument) for the numbers 0 and 255,
+  // which mean "no change" in the C interface.
   //
   // The language is always the requested one, even with code page 912, for which NLS2_GetLocale may
   // return hr_HR.

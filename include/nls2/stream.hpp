@@ -31,7 +31,7 @@ inline namespace NLS2_MODE {
 // Bytes that do not convert are read as U+FFFD or U+001A, and characters that the encoding lacks
 // are written as its substitution character. With on_bad::stop a call that meets them reports that
 // afterwards (invalid_text). ICU reads ahead, and converts a lone surrogate with what follows, so
-// that it can be a call before or after the one for that text.
+// the report may come one call early or late.
 //
 // Errors of the functions below:
 //
@@ -57,9 +57,9 @@ public:
   // for one with a null inside; 31 (too_long) for a path of 4,096 bytes, an encoding of 256 or a
   // mode of 8; errno in std::generic_category() if the system does not open the file.
   //
-  // Surprises: a directory opens for reading, and the first read fails. "UTF-16" writes a
-  // byte-order mark and reads with or without one (then big-endian); "UTF-16LE", "UTF-16BE" and
-  // "UTF-8" write none, and read one as the unit U+FEFF.
+  // Surprises: a directory opens for reading, and the first read fails, so check the path first.
+  // "UTF-16" writes a byte-order mark and reads with or without one (then big-endian); "UTF-16LE",
+  // "UTF-16BE" and "UTF-8" write none, and read one as the unit U+FEFF.
   stream(const locale &where, std::string_view path, std::string_view mode,
          std::string_view encoding, on_bad bad NLS2_MAY_OMIT, error_ref error NLS2_MAY_OMIT) {
     const detail::terminated<4096> path_text(path);
@@ -96,7 +96,7 @@ public:
   explicit operator bool() const noexcept { return state_ != nullptr; }
 
   // How many invalid sequences and lacking characters have been replaced since the stream was
-  // opened. What is buffered counts after flush().
+  // opened. Buffered text counts after flush().
   [[nodiscard]] std::size_t replaced() const noexcept { return state_ ? state_->replaced : 0; }
 
   // Reads units until the span is full or the file ends, and returns how many: fewer than fit only
@@ -202,7 +202,7 @@ private:
     state(const NLS2_Locale *where, on_bad what, std::string_view name)
         : live(where), bad(what), path(name), file(nullptr, close{where}) {}
 
-    // ICU's callbacks, which put U+FFFD or a substitution character, and a count.
+    // Installs ICU's own callbacks, and a count.
     void count_replaced() noexcept {
       UErrorCode failure = U_ZERO_ERROR;
       UConverter *converter = u_fgetConverter(file.get());

@@ -19,9 +19,10 @@ namespace nls2 {
 inline namespace NLS2_MODE {
 
 // What the conversions share. Each has a strict form, which fails if a byte or a character does not
-// convert, and a form with `replaced`, which does what ICU does: it puts a substitution character,
-// or drops an ignorable one, and counts both. Nulls are characters like any other. Each call opens
-// a translator: keep one for field after field. The result is empty on failure. Errors:
+// convert, and a form with `replaced`, which does what ICU does: it writes a substitution
+// character, or drops an ignorable one, and counts both. Nulls are characters like any other. Each
+// call opens a translator; to convert many texts, keep one yourself. The result is empty on
+// failure. Errors:
 //
 //   10, 12  invalid_text, of the strict form; the exception describes the problem
 //   31  too_long: more than 2,147,483,647 bytes
@@ -107,7 +108,7 @@ struct unicode_signature {
 
 // Five bytes of the text are enough.
 //
-// Surprise: FF FE 00 00 is UTF-32LE, even if it begins a text in UTF-16LE.
+// Surprise: FF FE 00 00 is UTF-32LE, even for a text in UTF-16LE that begins with U+0000.
 [[nodiscard]] inline unicode_signature detect_unicode_signature(byte_view text) noexcept {
   std::int32_t length = 0;
   std::int32_t status = 0;

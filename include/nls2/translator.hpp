@@ -143,8 +143,8 @@ namespace detail {
 inline void close_translator(NLS2F_Translator *owned) noexcept { NLS2F_CloseTranslator(owned); }
 } // namespace detail
 
-// Translates texts from one code page to another, which it keeps open. For one thread at a time; a
-// copy costs little and serves another thread. The functions of an empty one fail with 37
+// Translates texts from one code page to another, and stays open for the next. For one thread at a
+// time; a copy costs little and serves another thread. The functions of an empty one fail with 37
 // (invalid_argument).
 class translator : public detail::owner<NLS2F_Translator, detail::close_translator> {
 public:

@@ -42,7 +42,8 @@ constexpr std::int32_t to_int32(std::size_t length) noexcept {
 }
 
 constexpr std::int64_t to_int64(std::size_t length) noexcept {
-  return length <= INT64_MAX ? static_cast<std::int64_t>(length) : INT64_MAX;
+  const std::uint64_t wide = length; // where size_t has 32 bits, compilers warn of the comparison
+  return wide <= INT64_MAX ? static_cast<std::int64_t>(wide) : INT64_MAX;
 }
 
 // Owns a handle of a C interface and closes it by `close`. Move-only; null owns nothing.
