@@ -17,11 +17,11 @@ static_assert(!converts<std::vector<int>> && !std::is_constructible_v<byte_room,
 static_assert(byte_view("A\0B").size() == 3 && byte_view(u8"\u00E9").size() == 2);
 
 TEST(Bytes, AreAnyContiguousRange) {
-  const char *pointer = "ab";
   unsigned char raw[4] = {};
   const auto sizes = [](auto... views) { return (std::to_string(views.size()) + ...); };
-  EXPECT_EQ(sizes(byte_view("abc"), byte_view(pointer), byte_view("ab\0"s), byte_view(u8"12345"s),
-                  byte_view(raw), byte_view(std::vector<std::byte>(6)), byte_view()),
+  EXPECT_EQ(sizes(byte_view("abc"), byte_view("ab"s.c_str()), byte_view("ab\0"s),
+                  byte_view(u8"12345"s), byte_view(raw), byte_view(std::vector<std::byte>(6)),
+                  byte_view()),
             "3235460");
   EXPECT_TRUE(byte_room(raw).size() == 4 && byte_room(std::span(raw).first(2)).data() == raw);
 }
@@ -87,8 +87,7 @@ TEST(Translator, TranslatesChunks) {
 
 TEST(Text, ConvertsStrictlyOrCounts) {
   const code_page utf8("utf-8"), mixed(930), latin(819);
-  const std::string text = "a\0\u65E5"s;
-  const std::string bytes = translate(utf8, mixed, text);
+  const std::string bytes = translate(utf8, mixed, "a\0\u65E5");
   EXPECT_EQ(bytes, "\x62\0\x0E\x45\x62\x0F"s);
   EXPECT_EQ(to_utf16(mixed, bytes), u"a\0\u65E5"s);
   std::size_t replaced = 9;
