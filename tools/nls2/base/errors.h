@@ -50,16 +50,6 @@ public:
 // The message of a status of the library or of ICU.
 inline std::string statusText(int32_t status) { return category().message(status); }
 
-// If ICU failed, throws std::bad_alloc (no memory) or an Error "cannot " + `what`.
-inline void requireSuccess(UErrorCode status, const char *what) {
-  if (status == U_MEMORY_ALLOCATION_ERROR) {
-    throw std::bad_alloc();
-  }
-  if (U_FAILURE(status)) {
-    throw failure("cannot {}: {}", what, statusText(status));
-  }
-}
-
 // Writes a message to standard error. Allocates nothing.
 inline void complain(const char *text) noexcept { std::fprintf(stderr, "nls2: %s\n", text); }
 

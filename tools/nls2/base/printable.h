@@ -33,27 +33,16 @@ inline std::string shownName(const std::string &path, const char *stream) {
   return path == "-" ? stream : path.empty() ? "\"\"" : printable(path);
 }
 
-// "D096"; with a separator of " " "D0 96".
-inline std::string hexOf(std::string_view bytes, std::string_view between = "") {
+// "D096"
+inline std::string hexOf(std::string_view bytes) {
   constexpr std::string_view digits = "0123456789ABCDEF";
   std::string text;
-  text.reserve((2 + between.size()) * bytes.size());
+  text.reserve(2 * bytes.size());
   for (const char byte : bytes) {
-    text += text.empty() ? "" : between;
     text += digits[static_cast<unsigned char>(byte) >> 4];
     text += digits[byte & 15];
   }
   return text;
-}
-
-// "byte FF", "bytes D0 96"
-inline std::string bytesText(std::string_view bytes) {
-  return (bytes.size() == 1 ? "byte " : "bytes ") + hexOf(bytes, " ");
-}
-
-inline std::string notValidText(std::string_view bytes, int32_t page) {
-  return fmt::format("the {} {} not valid in code page {}", bytesText(bytes),
-                     bytes.size() == 1 ? "is" : "are", page);
 }
 
 } // namespace nls2::tool

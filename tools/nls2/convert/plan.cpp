@@ -69,10 +69,6 @@ std::string nameOf(const FieldPlan &field) {
 
 } // namespace
 
-int64_t fixedLength(const std::string &format) {
-  return format.starts_with("fixed:") ? wholeNumber<int64_t>(format.substr(6)).value_or(0) : 0;
-}
-
 // The first character of a text may come after a signature.
 std::string blankOf(const CodePage &page) {
   const Translator translator = openTranslator(CodePage::utf8(), page, NLS2F_AS_IS);
@@ -183,15 +179,6 @@ std::string emptyRecord(const Plan &plan) {
     }
   }
   return record;
-}
-
-Writer openWriter(const char *option, const std::string &format, const CodePage &page) {
-  auto problem = sized<NLS2F_Problem>();
-  NLS2F_Writer *writer = nullptr;
-  if (!isDone(NLS2F_OpenWriter(format.c_str(), page.get(), &writer, &problem))) {
-    throw usageError("{}: \"{}\": {}", option, printable(format), wordsOf(problem));
-  }
-  return Writer(writer);
 }
 
 } // namespace nls2::tool

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "convert/translate_options.h"
+#include "text/record_source.h"
 
 #include <vector>
 
@@ -55,13 +56,7 @@ private:
 // U+0020 inside a text of the page; empty if the page has none.
 std::string blankOf(const CodePage &page);
 
-// N of "fixed:N"; 0 for other formats.
-int64_t fixedLength(const std::string &format);
-
 // A record without fields, of the page's blanks; empty if no layout is filled. Throws usageError.
 std::string emptyRecord(const Plan &plan);
-
-// Throws usageError.
-Writer openWriter(const char *option, const std::string &format, const CodePage &page);
 
 } // namespace nls2::tool

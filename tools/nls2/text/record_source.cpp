@@ -2,8 +2,6 @@
 
 #include "text/record_source.h"
 
-#include "convert/plan.h"
-
 #include <algorithm>
 
 namespace nls2::tool {
@@ -23,6 +21,19 @@ Reader openReader(const RecordShape &shape, const char *option) {
 }
 
 } // namespace
+
+int64_t fixedLength(const std::string &format) {
+  return format.starts_with("fixed:") ? wholeNumber<int64_t>(format.substr(6)).value_or(0) : 0;
+}
+
+Writer openWriter(const char *option, const std::string &format, const CodePage &page) {
+  auto problem = sized<NLS2F_Problem>();
+  NLS2F_Writer *writer = nullptr;
+  if (!isDone(NLS2F_OpenWriter(format.c_str(), page.get(), &writer, &problem))) {
+    throw usageError("{}: \"{}\": {}", option, printable(format), wordsOf(problem));
+  }
+  return Writer(writer);
+}
 
 RecordSource::RecordSource(InputFile &input, RecordShape shape, const char *option)
     : input_(input), shape_(std::move(shape)),

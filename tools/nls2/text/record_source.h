@@ -82,6 +82,12 @@ struct Record {
   uint64_t offset = 0;
 };
 
+// N of "fixed:N"; 0 for other formats.
+int64_t fixedLength(const std::string &format);
+
+// Throws usageError with `option` if the format or the page does not suit.
+Writer openWriter(const char *option, const std::string &format, const CodePage &page);
+
 // The option --read of commands for lines and fixed records.
 Option linesOrFixed(std::string &format);
 
