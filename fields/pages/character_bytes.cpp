@@ -24,6 +24,9 @@ std::string bytesOf(const NLS2F_Page &page, char16_t character) {
   const std::string two = encode(text + text);
   const icu::UnicodeString back(one.data(), static_cast<int32_t>(one.size()), converter.getAlias(),
                                 error);
+  if (error == U_MEMORY_ALLOCATION_ERROR) {
+    throw std::bad_alloc();
+  }
   return U_FAILURE(error) || back != text || two.size() < one.size() ? "" : two.substr(one.size());
 }
 
