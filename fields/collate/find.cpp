@@ -28,7 +28,8 @@ std::size_t sourceOf(const icu::Edits &edits, std::size_t place, bool isEnd) {
   edit.findDestinationIndex(static_cast<int32_t>(place), error); // or the end
   const int32_t inside = static_cast<int32_t>(place) - edit.destinationIndex();
   const int32_t more = !edit.hasChange() ? inside : inside != 0 && isEnd ? edit.oldLength() : 0;
-  return static_cast<std::size_t>(edit.sourceIndex() + more);
+  const int32_t source = edit.sourceIndex() + more;
+  return static_cast<std::size_t>(source);
 }
 
 // The end of the first `units` units in a page with states, without the shifts after them.

@@ -150,6 +150,7 @@ template <class Source, bool isSafe>
 
 // Cuts blanks and nulls off the end.
 template <class Source>
+// NOLINTNEXTLINE(readability-function-cognitive-complexity): one loop, for speed
 inline const char *Table::trim(const char *begin, const char *end, int64_t &cut) {
   if constexpr (Source::codesAreBytes) {
     constexpr Row cuts = row::blank | row::null;
@@ -207,6 +208,7 @@ template <class Source, bool shifts>
 
 // Translates a text, or finds that the path must.
 template <class Source, bool shifts>
+// NOLINTNEXTLINE(readability-function-cognitive-complexity): one loop, for speed
 bool Table::run(std::string_view field, Room room, Done &done) {
   const char *source = field.data();
   const char *end = source + field.size();
