@@ -14,10 +14,10 @@ namespace {
 
 constexpr const char *notes =
     R"(FORMAT is fixed:N, lines[:lf|:crlf|:nel], prefixed[:data][:little], blocked (read), csv (UTF-8) or
-joined (write). Fixed records are filled with blanks; lines, prefixed records and CSV have none at
-their ends. A layout names the fields of the records; the other side is CSV, or has them, too.
-Nothing is lost silently: text that cannot be translated ends the run, unless --on-error replaces or
-rejects it. An output file appears only when it is complete.
+joined (write). Fixed records are filled with blanks; lines, prefixed records and CSV have no blanks
+at the end. A layout describes the fields of the records; the other side is CSV, or records with the
+same fields. Nothing is lost silently: text that cannot be translated ends the run, unless --on-error
+replaces or rejects it. An output file appears only when it is complete.
 )";
 
 struct Rule {
@@ -60,7 +60,7 @@ std::vector<Option> optionsOf(TranslateOptions &options) {
       pageValue("from", "code page of the input; not needed with --read csv", options.from),
       pageValue("to", "code page of the output; not needed with --write csv", options.to),
       value("layout", "FILE", "the fields of the records, a line each", into(options.layout)),
-      value("fields", "LIST", "the same in short: START-END[=KIND][:OPTION];...",
+      value("fields", "LIST", "the same in brief: START-END[=KIND][:OPTION];...",
             into(options.fields)),
       value("blanks", "keep", "keep the blanks at the ends of texts",
             [&](const std::string &text) {

@@ -171,7 +171,7 @@ std::string emptyRecord(const Plan &plan) {
   for (std::size_t at = isField.find('\0'); at != std::string::npos; at = isField.find('\0', at)) {
     const std::size_t end = std::min(isField.find('\1', at), record.size());
     if (blank.empty() || (end - at) % blank.size() != 0) {
-      throw usageError("blanks of {} cannot fill the bytes {} to {}, which are no field",
+      throw usageError("blanks of {} cannot fill the bytes {} to {}, which belong to no field",
                        plan.to.name(), at + 1, end);
     }
     for (; at < end; at += blank.size()) {
