@@ -131,8 +131,14 @@ void Chunks::finish(bool encodes) {
       return again.getAlias();
     });
   } else {
+    // ICU delimits the bytes as in the whole text if they come in one piece.
+    const icu::LocalUConverterPointer again = copyOf(snapshot_.getAlias());
+    Decoder decoder(again.getAlias(), std::string_view(text).substr(before_));
+    while (!decoder.isDone()) {
+      decoder.decode(units_, true);
+    }
     fail(*problem_, NLS2F_INVALID_BYTES);
-    setPlace(*problem_, text, position_ + decoder_.valid() - begin, decoder_.invalid());
+    setPlace(*problem_, text, static_cast<int64_t>(before_) + decoder.valid(), decoder.invalid());
   }
   problem_->offset += begin;
 }

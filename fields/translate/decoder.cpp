@@ -77,9 +77,13 @@ private:
     }
     Units &units = *static_cast<Units *>(const_cast<void *>(context));
     UErrorCode ignored = U_ZERO_ERROR;
-    units.noted_[arguments->target - units.units_] =
-        arguments->source - units.text_.data() -
-        ucnv_toUCountPending(arguments->converter, &ignored) - std::max(length, 1);
+    const char *const begin = units.text_.data();
+    const std::less_equal<> before; // what ICU reads again is elsewhere
+    if (before(begin, arguments->source) && before(arguments->source, begin + units.text_.size())) {
+      units.noted_[arguments->target - units.units_] =
+          arguments->source - begin - ucnv_toUCountPending(arguments->converter, &ignored) -
+          std::max(length, 1);
+    }
     replaceBytes(arguments, error);
   }
 
@@ -89,8 +93,8 @@ private:
   UConverterToUCallback policy_ = nullptr;
   const void *context_ = nullptr;
   char16_t units_[piece] = {};
-  int32_t offsets_[piece] = {};
-  int64_t noted_[piece + 1]; // -1 for units of valid bytes; the last is left over
+  int32_t offsets_[2 * piece] = {}; // ICU writes past the end of as many as there are units
+  int64_t noted_[piece + 1];        // -1 for units of valid bytes; the last is left over
   std::size_t count_ = 0;
   std::size_t at_ = 0;
   int64_t start_ = 0;

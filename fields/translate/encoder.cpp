@@ -100,7 +100,7 @@ void Encoder::writeWhole(Progress &piece, UErrorCode &error) {
 // that is dropped takes no room.
 void Encoder::count(Progress &piece, UErrorCode &error) {
   char bytes[256];
-  int32_t offsets[256];
+  int32_t offsets[256] = {-1}; // some converters set none
   char *target = bytes;
   const int64_t start = before_ + (piece.source - piece.begin);
   const int64_t before = resolved(piece);

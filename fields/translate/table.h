@@ -30,6 +30,8 @@ public:
     return run_ != nullptr && field.size() <= Path::longestField &&
            (this->*run_)(field, room, done);
   }
+  // From now on the path translates every field.
+  void turnOff() { run_ = nullptr; }
 
 private:
   using Runner = bool (Table::*)(std::string_view field, Room room, Done &done);
