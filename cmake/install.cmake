@@ -61,7 +61,7 @@ install_library(
 install_library(
   zelfields
   HEADER nls2_fields.h
-  OVERVIEW zelnls2.3
+  OVERVIEW zelfields.3
   DESCRIPTION "Fields and records between code pages, over ICU"
   REQUIRES zelnls2)
 
@@ -71,7 +71,8 @@ install(
   DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}
   FILES_MATCHING
   PATTERN *.hpp)
-install(FILES ${PROJECT_SOURCE_DIR}/docs/zelnls2.3 DESTINATION ${CMAKE_INSTALL_MANDIR}/man3)
+install(FILES ${PROJECT_SOURCE_DIR}/docs/zelnls2.3 ${PROJECT_SOURCE_DIR}/docs/zelfields.3
+        DESTINATION ${CMAKE_INSTALL_MANDIR}/man3)
 install(FILES ${PROJECT_SOURCE_DIR}/host/trc1.h ${PROJECT_SOURCE_DIR}/host/sys1.h
         DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/zelnls2)
 if(ZELNLS2_BUILD_TOOL)
