@@ -120,6 +120,9 @@ void Plan::addFields(const TranslateOptions &options) {
       (readsCsv ? made.to : made.from) = CodePage("page", made.field.page);
     }
     made.blank = made.from == from ? fromBlank : blankOf(made.from);
+    if (made.field.page != nullptr && made.blank.size() == 1) { // what a short record lacks
+      made.field.blank = static_cast<uint8_t>(made.blank[0]);
+    }
     made.fillsLater = fillsLayout() && made.to == to && toBlank.size() == 1;
     fields.push_back(made);
   }
