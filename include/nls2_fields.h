@@ -13,7 +13,8 @@
  *  2. NLS2F_ERR_FIELD means that the text is the problem: *problem then holds what, where and why.
  *     No other status changes *problem.
  *  3. Outputs follow inputs. After a failure counts and lengths are 0, handles null, and the bytes
- *     of `out` unspecified, unless "partial output" is noted.
+ *     of `out` unspecified, unless "partial output" is noted. Bytes of `out` after those that were
+ *     written are unspecified in any case.
  *  4. Lengths, offsets and rooms are bytes, as int64_t. Texts carry a length, and a null is a
  *     character like any other; only names are null-terminated. A length below 0 is a failure.
  *  5. A pointer may be null only where its comment says so, and where its length or room is 0; a

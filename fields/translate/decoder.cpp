@@ -12,7 +12,9 @@
 namespace zelfields {
 namespace {
 
-constexpr std::size_t mostUnits = 0x3FFFFFFF; // ICU takes no more at once
+// ICU takes no more at once.
+constexpr std::size_t mostUnits = 0x3FFFFFFF;
+constexpr std::ptrdiff_t mostBytes = 0x7FFFFFFF;
 
 // The bytes at which a converter stopped because they are not valid.
 int64_t invalidBytes(const UConverter *from) {
@@ -153,14 +155,16 @@ int64_t endWithoutShifts(const Character &character, std::string_view text, UCon
 std::size_t Decoder::decode(std::span<char16_t> units, bool last, int32_t *offsets) {
   char16_t *target = units.data();
   const char *source = text_.data() + read_;
+  const char *const end = text_.data() + text_.size();
+  const char *const until = source + std::min(end - source, mostBytes);
   UErrorCode error = U_ZERO_ERROR;
-  ucnv_toUnicode(from_, &target, target + std::min(units.size(), mostUnits), &source,
-                 text_.data() + text_.size(), offsets, static_cast<UBool>(last), &error);
+  ucnv_toUnicode(from_, &target, target + std::min(units.size(), mostUnits), &source, until,
+                 offsets, static_cast<UBool>(last && until == end), &error);
   if (error == U_MEMORY_ALLOCATION_ERROR) {
     throw std::bad_alloc();
   }
   read_ = static_cast<std::size_t>(source - text_.data());
-  isDone_ = error != U_BUFFER_OVERFLOW_ERROR;
+  isDone_ = error != U_BUFFER_OVERFLOW_ERROR && (until == end || U_FAILURE(error));
   valid_ = read();
   if (U_FAILURE(error) && isDone_) {
     UErrorCode ignored = U_ZERO_ERROR;

@@ -74,18 +74,21 @@ void Encoder::write(Progress &piece, UErrorCode &error) {
   size_ += written;
 }
 
-void Encoder::writeWhole(Progress &piece, UErrorCode &error) {
-  const auto units = std::min(piece.end - piece.source, unitsAtOnce);
-  const std::size_t most =
-      static_cast<std::size_t>(units + 10) * static_cast<std::size_t>(ucnv_getMaxCharSize(to_));
-  if (whole_->bytes.size() < most) {
+void Encoder::makeRoomFor(std::size_t units) {
+  const std::size_t most = (units + 10) * static_cast<std::size_t>(ucnv_getMaxCharSize(to_));
+  if (whole_ != nullptr && whole_->bytes.size() < most) {
     whole_->bytes.resize(most);
     whole_->offsets.resize(most);
   }
+}
+
+void Encoder::writeWhole(Progress &piece, UErrorCode &error) {
+  const auto units = std::min(piece.end - piece.source, unitsAtOnce);
+  makeRoomFor(static_cast<std::size_t>(units));
   const int64_t start = before_ + (piece.source - piece.begin);
   char *target = whole_->bytes.data();
-  ucnv_fromUnicode(to_, &target, target + std::min<std::size_t>(most, INT32_MAX), &piece.source,
-                   piece.source + units, whole_->offsets.data(), false, &error);
+  ucnv_fromUnicode(to_, &target, target + std::min<std::size_t>(whole_->bytes.size(), INT32_MAX),
+                   &piece.source, piece.source + units, whole_->offsets.data(), false, &error);
   const int64_t written = target - whole_->bytes.data();
   const int64_t fitting = allFits() ? std::min(written, room_.size) : 0;
   std::memcpy(room_.begin, whole_->bytes.data(), static_cast<std::size_t>(fitting));

@@ -30,6 +30,8 @@ public:
   // Ends the text and closes shift states. A text without units has not even a signature.
   bool finish();
 
+  // Takes the memory for pieces of so many units, if any is needed.
+  void makeRoomFor(std::size_t units);
   // The room for what comes now.
   void into(Room room) { room_ = room; }
   // Whether all units are encoded. Some may be kept back, to see which one follows.

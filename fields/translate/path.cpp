@@ -43,6 +43,7 @@ Path::Path(UConverter *from, UConverter *to, const NLS2F_Policy &policy, UErrorC
     blanks_.learn(to_, replaced_);
     reserve(2 * usualField);
     looksAhead_ = looksAhead(ucnv_getType(to));
+    encoderInto({nullptr, 0}).makeRoomFor(2 * usualField);
   }
 }
 

@@ -12,7 +12,7 @@ namespace zelfields {
 // has is cut to one that no field may have.
 inline std::string_view textOf(const void *bytes, int64_t length) {
   return {length != 0 ? static_cast<const char *>(bytes) : "",
-          static_cast<std::size_t>(std::min<int64_t>(length, PTRDIFF_MAX))};
+          static_cast<std::size_t>(std::min(static_cast<uint64_t>(length), uint64_t{SIZE_MAX}))};
 }
 
 // `size` bytes from `begin` on.
