@@ -38,7 +38,9 @@ LiveLocale::LiveLocale(uint32_t codepage, const char *name) {
 }
 
 Words::Words(const std::string &call, NLS2_Locale *given) : given_(given) {
+#ifdef __SANITIZE_THREAD__
   [[maybe_unused]] static UFILE *const firstFile = u_fopen("/dev/null", "r", nullptr, nullptr);
+#endif
   std::vector<std::string> words = split(call, ' ');
   words.erase(words.begin());
   for (const std::string &word : words) {

@@ -134,8 +134,7 @@ void FieldTranslator::translateAll(const FieldColumn &rows, Translators &open, B
   if (!isText && (!plan_->isNumber() || !writesText_)) {
     return; // one by one
   }
-  thread_local std::vector<int64_t> offsets;
-  offsets.resize(count + 1);
+  std::vector<int64_t> offsets(count + 1);
   NLS2F_Translator *translator =
       !isText ? nullptr
       : plan_->fillsLater
