@@ -236,42 +236,46 @@ Problem RecordTranslator::problemOf(const Found &found) const {
   return problem;
 }
 
+// Notes one thing that was found in a record. False if it ends the run.
+bool RecordTranslator::note(const Found &each, bool isNew, PieceOutput &out) {
+  const bool rejects = options_.onError == OnError::reject;
+  const bool fails = each.replaced == 0;
+  Tally &tally = out.tally;
+  const Problem problem = problemOf(each);
+  ++tally.kinds[kindName(problem.kind)];
+  if (options_.problems && tally.lines++ < options_.problemsLimit) {
+    out.problems.append(lineOf(problem, !fails ? "replaced" : rejects ? "rejected" : "failed"));
+  }
+  if (fails && !rejects) {
+    tally.failure = problem;
+    rows_ = each.row;
+    return false;
+  }
+  tally.first = tally.first ? tally.first : problem;
+  tally.replaced += static_cast<uint64_t>(each.replaced);
+  tally.replacedRecords += !fails && isNew ? 1 : 0;
+  if (dropped_[each.row] == 1) {
+    dropped_[each.row] = 2;
+    out.rejects.append(piece_->wholeOf(each.row));
+    ++tally.rejected;
+  }
+  return true;
+}
+
 // Counts the records, and what was found in them, in the order of the input.
 void RecordTranslator::report(PieceOutput &out) {
-  const bool rejects = options_.onError == OnError::reject;
-  Tally &tally = out.tally;
   std::stable_sort(found_.begin(), found_.end(),
                    [](const Found &a, const Found &b) { return a.row < b.row; });
   std::size_t last = SIZE_MAX; // the row before, if it had a problem
   for (const Found &each : found_) {
-    if (each.row >= rows_) {
+    if (each.row >= rows_ || !note(each, each.row != last, out)) {
       break;
     }
-    const bool isNew = each.row != last;
     last = each.row;
-    const Problem problem = problemOf(each);
-    ++tally.kinds[kindName(problem.kind)];
-    const bool fails = each.replaced == 0;
-    if (options_.problems && tally.lines++ < options_.problemsLimit) {
-      out.problems.append(lineOf(problem, !fails ? "replaced" : rejects ? "rejected" : "failed"));
-    }
-    if (fails && !rejects) {
-      tally.failure = problem;
-      rows_ = each.row;
-      break;
-    }
-    tally.first = tally.first ? tally.first : problem;
-    tally.replaced += static_cast<uint64_t>(each.replaced);
-    tally.replacedRecords += !fails && isNew ? 1 : 0;
-    if (dropped_[each.row] == 1) {
-      dropped_[each.row] = 2;
-      out.rejects.append(piece_->wholeOf(each.row));
-      ++tally.rejected;
-    }
   }
-  tally.records = rows_;
+  out.tally.records = rows_;
   for (std::size_t row = 0; row < rows_; ++row) {
-    tally.bytesIn += static_cast<uint64_t>(piece_->whole[row].length);
+    out.tally.bytesIn += static_cast<uint64_t>(piece_->whole[row].length);
   }
 }
 

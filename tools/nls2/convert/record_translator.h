@@ -46,6 +46,7 @@ private:
   void assemble(std::size_t row);
   void write(PieceOutput &out);
   Problem problemOf(const Found &found) const;
+  bool note(const Found &each, bool isNew, PieceOutput &out);
   void report(PieceOutput &out);
   void reportRest(PieceOutput &out) const;
 
