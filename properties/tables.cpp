@@ -25,7 +25,7 @@ struct Answer {
 };
 
 NLS2F_Page *openPage(property::Input &input, const char *&name) {
-  static std::map<int64_t, NLS2F_Page *> opened;
+  static auto &opened = *new std::map<int64_t, NLS2F_Page *>; // open until the process ends
   int64_t count = 0;
   NLS2F_PageCount(&count);
   const auto index = static_cast<int64_t>(input.below(static_cast<size_t>(count)));
