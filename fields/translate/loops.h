@@ -226,7 +226,9 @@ bool Table::run(std::string_view field, Room room, Done &done) {
   bool mode = false; // the source's
   while (source != end) {
     int singles = runBlocks<Source, shifts>(source, end, output, refused, mode);
-    const auto goesOn = [&] { return singles-- > 0 || Source::isNoBlock(source, mode); };
+    const auto goesOn = [&] {
+      return source != end && (singles-- > 0 || Source::isNoBlock(source, mode));
+    };
     // Eight at a time need no look at the ends.
     while (end - source >= EightRows::count * Source::longest && output.hasRoomForEight() &&
            goesOn()) {
@@ -238,7 +240,7 @@ bool Table::run(std::string_view field, Room room, Done &done) {
         output.template put<true>(next);
       }
     }
-    while (source != end && goesOn()) {
+    while (goesOn()) {
       const Row next = nextRow<Source, false>(rows, source, end, mode);
       if (!row::isKnown(next) || (next & refused) != 0 || !output.template put<false>(next)) {
         return false;
