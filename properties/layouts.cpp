@@ -71,17 +71,14 @@ std::string written(const NLS2F_Layout *layout) {
   return text;
 }
 
-} // namespace
-
-int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
+// A few fields, most of them right.
+std::string textOf(Input &input, uint32_t how) {
   constexpr const char *places[] = {"1", "2", "8", "1-4", "9-16", "17-20", "0", "4-2", "x #"};
   constexpr const char *kinds[] = {"packed.2", "zoned.31", "binary", "packed", "zoned",      "text",
                                    "raw",      "hex",      "text.1", "pack",   "page:ibm-37"};
   constexpr const char *options[] = {
       "unsigned", "blank=empty", "sign=leading", "sign=trailing", "sign=leading-separate", "signed",
       ""};
-  Input input(data, size);
-  const auto how = static_cast<uint32_t>(input.below(4));
   const bool isShort = (how & NLS2F_LAYOUT_SHORT) != 0;
   std::string text = input.below(8) == 0 ? input.bytes(SIZE_MAX) : "";
   for (size_t count = 1 + input.below(4); count > 0; --count) {
@@ -91,6 +88,15 @@ int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
     text += input.below(3) == 0 ? (isShort ? ":" : "\t") + std::string(input.oneOf(options)) : "";
     text += count == 1 ? "" : isShort ? ";" : "\n";
   }
+  return text;
+}
+
+} // namespace
+
+int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
+  Input input(data, size);
+  const auto how = static_cast<uint32_t>(input.below(4));
+  const std::string text = textOf(input, how);
   if (NLS2F_Layout *const layout = open(text, how)) {
     const std::string lines = written(layout);
     NLS2F_CloseLayout(layout);
