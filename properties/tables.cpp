@@ -136,8 +136,11 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size) {
   }
   check(NLS2F_CloneTranslator(fast, &slow) == 0, "what opens can be cloned");
   slow->table.turnOff();
+  // ICU does not reset compound text; of SCSU in its two-byte mode it gives places that depend on
+  // the cuts.
+  const UConverterType type = ucnv_getType(from->converter.getAlias());
   const bool isCut = policy.padding == NLS2F_AS_IS && policy.width == 0 &&
-                     ucnv_getType(from->converter.getAlias()) != UCNV_COMPOUND_TEXT;
+                     type != UCNV_COMPOUND_TEXT && type != UCNV_SCSU;
   const auto length = static_cast<int64_t>(input.below(12));
   const auto less = static_cast<int64_t>(input.below(40));
   const std::string field = input.text({0, name});
