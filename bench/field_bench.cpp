@@ -228,15 +228,18 @@ void add(const char *contender) {
 
 } // namespace
 
-void *operator new(std::size_t size) {
+// Not inlined, or GCC takes them for mismatched pairs.
+[[gnu::noinline]] void *operator new(std::size_t size) {
   ++allocations;
   if (void *block = std::malloc(size)) {
     return block;
   }
   throw std::bad_alloc();
 }
-void operator delete(void *block) noexcept { std::free(block); }
-void operator delete(void *block, std::size_t /*size*/) noexcept { std::free(block); }
+[[gnu::noinline]] void operator delete(void *block) noexcept { std::free(block); }
+[[gnu::noinline]] void operator delete(void *block, std::size_t /*size*/) noexcept {
+  std::free(block);
+}
 
 static int runAll(int argc, char **argv) {
   if (!answersAgree()) {
