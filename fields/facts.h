@@ -37,57 +37,43 @@ inline std::string_view spanOf(const void *bytes, const NLS2F_Span &span) {
 }
 
 // `needed` of a layout, a format or a prefix that is not valid, and what it means.
-#define ZELFIELDS_DETAILS(detail)                                                                                                       \
-  detail(none, "") detail(noBytes, "bytes must follow the name: FIRST-LAST or LENGTH") detail(                                          \
-      notBytes,                                                                                                                         \
-      "bytes are FIRST-LAST or LENGTH") detail(beginsAtZero,                                                                            \
-                                               "bytes are counted from 1") detail(emptyRange,                                           \
-                                                                                  "the range is empty")                                 \
-      detail(tooFar, "the field ends after byte 2147483647") detail(                                                                    \
-          unknownKind, "a kind is text, raw, hex, packed, zoned, binary or page:NAME")                                                  \
-          detail(badScale, "the scale must be a number from 0 to 31") detail(                                                           \
-              unknownOption,                                                                                                            \
-              "the option is unknown") detail(optionOfOtherKind,                                                                        \
-                                              "the option does not belong to this kind")                                                \
-              detail(secondSign, "a field has one sign option, and unsigned has none") detail(                                          \
-                  badLength, "the kind has no numbers of this length")                                                                  \
-                  detail(unknownPage, "the code page is unknown") detail(                                                               \
-                      noDigits,                                                                                                         \
-                      "the code page of the records has no digits and signs for zoned numbers")                                         \
-                      detail(noSingleBlank,                                                                                             \
-                             "blank=empty needs a code page with a blank of one byte")                                                  \
-                          detail(notUtf8, "the name is not valid UTF-8") detail(                                                        \
-                              sameName,                                                                                                 \
-                              "another field has this name") detail(overlap,                                                            \
-                                                                    "the field overlaps another one")                                   \
-                              detail(noField, "there is no field") detail(                                                              \
-                                  unknownFormat,                                                                                        \
-                                  "a format is fixed:N, lines, prefixed, blocked, csv or joined")                                       \
-                                  detail(badRecordLength,                                                                               \
-                                         "the length must be a number from 1 to 2147483647")                                            \
-                                      detail(                                                                                           \
-                                          unknownSuffix,                                                                                \
-                                          "the format does not have this suffix, or has it already")                                    \
-                                          detail(onlyRead, "this format is only read") detail(                                          \
-                                              onlyWritten, "this format is only written")                                               \
-                                              detail(needsPage, "the format needs a code page") detail(                                 \
-                                                  noLineEnd, "the code page has no such line end")                                      \
-                                                  detail(                                                                               \
-                                                      dependentLines,                                                                   \
-                                                      "the line ends of the code page depend on the text before them")                  \
-                                                      detail(                                                                           \
-                                                          signature,                                                                    \
-                                                          "every line would begin with a byte-order mark; use a code page without one") \
-                                                          detail(noBlank,                                                               \
-                                                                 "the code page has no blank")                                          \
-                                                              detail(tryPrefixed, "prefixed") detail(                                   \
-                                                                  tryLittle, "prefixed:little")                                         \
-                                                                  detail(tryData, "prefixed:data")                                      \
-                                                                      detail(                                                           \
-                                                                          tryDataLittle,                                                \
-                                                                          "prefixed:data:little")                                       \
-                                                                          detail(tryBlocked,                                            \
-                                                                                 "blocked")
+// clang-format off
+#define ZELFIELDS_DETAILS(detail) \
+  detail(none, "") \
+  detail(noBytes, "bytes must follow the name: FIRST-LAST or LENGTH") \
+  detail(notBytes, "bytes are FIRST-LAST or LENGTH") \
+  detail(beginsAtZero, "bytes are counted from 1") \
+  detail(emptyRange, "the range is empty") \
+  detail(tooFar, "the field ends after byte 2147483647") \
+  detail(unknownKind, "a kind is text, raw, hex, packed, zoned, binary or page:NAME") \
+  detail(badScale, "the scale must be a number from 0 to 31") \
+  detail(unknownOption, "the option is unknown") \
+  detail(optionOfOtherKind, "the option does not belong to this kind") \
+  detail(secondSign, "a field has one sign option, and unsigned has none") \
+  detail(badLength, "the kind has no numbers of this length") \
+  detail(unknownPage, "the code page is unknown") \
+  detail(noDigits, "the code page of the records has no digits and signs for zoned numbers") \
+  detail(noSingleBlank, "blank=empty needs a code page with a blank of one byte") \
+  detail(notUtf8, "the name is not valid UTF-8") \
+  detail(sameName, "another field has this name") \
+  detail(overlap, "the field overlaps another one") \
+  detail(noField, "there is no field") \
+  detail(unknownFormat, "a format is fixed:N, lines, prefixed, blocked, csv or joined") \
+  detail(badRecordLength, "the length must be a number from 1 to 2147483647") \
+  detail(unknownSuffix, "the format does not have this suffix, or has it already") \
+  detail(onlyRead, "this format is only read") \
+  detail(onlyWritten, "this format is only written") \
+  detail(needsPage, "the format needs a code page") \
+  detail(noLineEnd, "the code page has no such line end") \
+  detail(dependentLines, "the line ends of the code page depend on the text before them") \
+  detail(signature, "every line would begin with a byte-order mark; use a code page without one") \
+  detail(noBlank, "the code page has no blank") \
+  detail(tryPrefixed, "prefixed") \
+  detail(tryLittle, "prefixed:little") \
+  detail(tryData, "prefixed:data") \
+  detail(tryDataLittle, "prefixed:data:little") \
+  detail(tryBlocked, "blocked")
+// clang-format on
 
 #define ZELFIELDS_NAME(name, words) name,
 enum class Detail : int64_t { ZELFIELDS_DETAILS(ZELFIELDS_NAME) };
